@@ -1,0 +1,33 @@
+# SPDX-License-Identifier: Apache-2.0
+# One set of objects, two libraries.
+file(GLOB LEXARO_SOURCES CONFIGURE_DEPENDS
+  host/*.cpp frame/*.cpp objects/*.cpp codepage/*.cpp codepage/text/*.cpp locale/*.cpp)
+
+add_library(lexaro_core OBJECT ${LEXARO_SOURCES})
+target_link_libraries(lexaro_core PRIVATE lexaro_options)
+target_compile_options(lexaro_core PRIVATE -fno-exceptions -fno-rtti -fno-threadsafe-statics)
+
+add_library(lexaro SHARED)
+target_link_libraries(lexaro PRIVATE lexaro_core lexaro_options)
+set_target_properties(lexaro PROPERTIES
+  VERSION ${PROJECT_VERSION}
+  SOVERSION ${PROJECT_VERSION_MAJOR}
+  LINK_DEPENDS ${PROJECT_SOURCE_DIR}/cmake/exports.map)
+target_link_options(lexaro PRIVATE -Wl,--version-script=${PROJECT_SOURCE_DIR}/cmake/exports.map -Wl,--as-needed)
+if(NOT LEXARO_SANITIZE)
+  target_link_options(lexaro PRIVATE -Wl,-z,defs)
+endif()
+
+# The static library also serves the tests that look behind the interface.
+add_library(lexaro_static STATIC)
+target_link_libraries(lexaro_static PRIVATE lexaro_core PUBLIC $<BUILD_INTERFACE:lexaro_options>)
+set_target_properties(lexaro_static PROPERTIES OUTPUT_NAME lexaro)
+
+foreach(target lexaro lexaro_static)
+  target_include_directories(${target} PUBLIC
+    $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>
+    $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
+  find_package(Threads REQUIRED)
+  target_link_libraries(${target} PUBLIC Threads::Threads)
+endforeach()
+add_library(Lexaro::lexaro ALIAS lexaro)
