@@ -13,21 +13,25 @@ set_target_properties(lexaro PROPERTIES
   VERSION ${PROJECT_VERSION}
   SOVERSION ${PROJECT_VERSION_MAJOR}
   LINK_DEPENDS ${PROJECT_SOURCE_DIR}/cmake/exports.map)
-target_link_options(lexaro PRIVATE -Wl,--version-script=${PROJECT_SOURCE_DIR}/cmake/exports.map -Wl,--as-needed)
+# It stays mapped once loaded: threads that end after a dlclose still give their storage back through it.
+target_link_options(lexaro PRIVATE -Wl,--version-script=${PROJECT_SOURCE_DIR}/cmake/exports.map -Wl,--as-needed
+  -Wl,-z,nodelete)
 if(NOT LEXARO_SANITIZE)
   target_link_options(lexaro PRIVATE -Wl,-z,defs)
 endif()
 
 # The static library also serves the tests that look behind the interface.
 add_library(lexaro_static STATIC)
-target_link_libraries(lexaro_static PRIVATE lexaro_core PUBLIC $<BUILD_INTERFACE:lexaro_options>)
+target_link_libraries(lexaro_static
+  PRIVATE $<BUILD_INTERFACE:lexaro_core>
+  PUBLIC $<BUILD_INTERFACE:lexaro_options>)
 set_target_properties(lexaro_static PROPERTIES OUTPUT_NAME lexaro)
 
+find_package(Threads REQUIRED)
 foreach(target lexaro lexaro_static)
   target_include_directories(${target} PUBLIC
     $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>
     $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
-  find_package(Threads REQUIRED)
   target_link_libraries(${target} PUBLIC Threads::Threads)
 endforeach()
 add_library(Lexaro::lexaro ALIAS lexaro)

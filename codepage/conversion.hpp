@@ -1,0 +1,162 @@
+// SPDX-License-Identifier: Apache-2.0
+// The conversion handle, and the watch over what it carries.
+#pragma once
+
+#include "codepage/transcode.hpp"
+#include "frame/records.hpp"
+
+struct LXConversion {
+  LXLocale* source;
+  uint8_t held[5];  // the beginning of a character
+  uint8_t source_state;
+  uint8_t held_count;
+  LXLocale* target;
+  uint8_t pending[16];  // what did not fit: a character with its shift byte, or a line end and one more
+  uint8_t target_state;
+  uint8_t pending_count;
+
+  // Extensions.
+  uint32_t options;
+  LXProblemFn callback;
+  void* context;
+  LXConversionCounts counts;
+  bool held_return;  // a carriage return that may be the first half of a line end
+  bool finishing;
+  const lx::ByteMap* map;  // behind the handle, when both pages are single-byte
+};
+
+namespace lx {
+
+// Sees every character that has no exact counterpart, and every line end when they are to be changed.
+class ConversionWatch {
+ public:
+  static constexpr bool kWatching = true;
+
+  // `text` stands at `offset` of all that the handle was given.
+  ConversionWatch(LXConversion& handle, const uint8_t* text, uint64_t offset)
+      : handle_(handle), text_(text), offset_(offset), lines_(handle.options & LX_CONV_LINES_CRLF) {}
+
+  bool each_character() const { return lines_ != 0; }
+
+  // Writes the character, or what stands for it; false: no room, and nothing has happened.
+  template <class In, class Out>
+  bool carry(const In& in, Out& out, uint16_t character) {
+    if (lines_ != 0 && (handle_.held_return || is_line_character(character))) return carry_line(in, out, character);
+    Kind kind = classify(in, out, character);
+    if (kind != Kind::exact && discards()) {
+      report(in, character, kind);
+      return true;
+    }
+    uint32_t code = out.code(character);
+    if (!out.fits(code)) return false;
+    out.put(code);
+    if (kind != Kind::exact) report(in, character, kind);
+    return true;
+  }
+
+  template <class In>
+  void note_odd_shift(In& in) {
+    if (in.odd_shift == nullptr) return;
+    LXConversionProblem problem = {offset_of(in.odd_shift), LX_PROBLEM_SHIFT, kUnassigned, 1, {*in.odd_shift}};
+    in.odd_shift = nullptr;
+    add(problem);
+  }
+
+  void add(const LXConversionProblem& problem);
+
+ private:
+  enum class Kind : uint8_t { exact, substituted, malformed };
+
+  static constexpr uint16_t kLineFeed = 0x0A;
+  static constexpr uint16_t kReturn = 0x0D;
+  static constexpr uint16_t kNextLine = 0x85;
+
+  static bool is_line_character(uint16_t character) {
+    return character == kLineFeed || character == kReturn || character == kNextLine;
+  }
+  bool discards() const { return (handle_.options & LX_CONV_DISCARD) != 0; }
+  uint64_t offset_of(const uint8_t* place) const { return offset_ + static_cast<uint64_t>(place - text_); }
+
+  template <class In, class Out>
+  static Kind classify(const In& in, const Out& out, uint16_t character) {
+    if (is_malformed(in, character)) return Kind::malformed;
+    if (character == kUnassigned && beyond_ucs2(in)) return Kind::substituted;
+    return out.stands_in(out.code(character), character) ? Kind::substituted : Kind::exact;
+  }
+
+  template <class In>
+  static bool is_malformed(const In& in, uint16_t character) {
+    if constexpr (std::same_as<In, Utf8Reader>) {
+      if (*in.start < 0x80) return character == kUnassigned;
+      Utf8Reader again(*in.page, in.start, static_cast<size_t>(in.at - in.start));
+      again.strict = true;
+      uint16_t same = 0;
+      if (again.next(same) != Got::character || again.at != in.at) return true;
+      return same == kUnassigned && !beyond_ucs2(in) && !is_replacement_character(in);
+    } else {
+      return character == kUnassigned;
+    }
+  }
+  // Well-formed UTF-8 of four bytes. Only strict reading takes it as one character.
+  template <class In>
+  static bool beyond_ucs2(const In& in) {
+    return std::same_as<In, Utf8Reader> && in.at - in.start == 4;
+  }
+  static bool is_replacement_character(const Utf8Reader& in) {
+    return in.at - in.start == 3 && Utf8Reader::decode(in.start) == kUnassigned;
+  }
+
+  template <class In>
+  void report(const In& in, uint16_t character, Kind kind) {
+    LXConversionProblem problem = {offset_of(in.start), LX_PROBLEM_SUBSTITUTED, character,
+                                   static_cast<uint8_t>(in.at - in.start), {}};
+    if (kind == Kind::malformed) {
+      problem.kind = LX_PROBLEM_MALFORMED;
+      problem.unicode = kUnassigned;
+    } else if (beyond_ucs2(in)) {
+      problem.unicode = (in.start[0] & 0x07u) << 18 | (in.start[1] & 0x3Fu) << 12 | (in.start[2] & 0x3Fu) << 6 |
+                        (in.start[3] & 0x3Fu);
+    }
+    for (unsigned i = 0; i < problem.length && i < sizeof problem.bytes; ++i) problem.bytes[i] = in.start[i];
+    add(problem);
+  }
+
+  // Carriage returns wait for the character behind them, because together with a line feed they are one line end.
+  template <class In, class Out>
+  bool carry_line(const In& in, Out& out, uint16_t character) {
+    if (handle_.held_return && character != kLineFeed) {
+      if (!put_all(out, kReturn)) return false;
+      handle_.held_return = false;
+      // Without room for the character itself the reader comes here again, with the return already written.
+      return carry(in, out, character);
+    }
+    if (character == kReturn) {
+      handle_.held_return = true;
+      return true;
+    }
+    bool fits = lines_ == LX_CONV_LINES_CRLF  ? put_all(out, kReturn, kLineFeed)
+                : lines_ == LX_CONV_LINES_NEL ? put_all(out, kNextLine)
+                                              : put_all(out, kLineFeed);
+    if (fits) handle_.held_return = false;
+    return fits;
+  }
+
+  template <class Out, class... Characters>
+  static bool put_all(Out& out, Characters... characters) {
+    Out trial = out;
+    for (uint16_t character : {characters...}) {
+      uint32_t code = trial.code(character);
+      if (!trial.fits(code)) return false;
+      trial.put(code);
+    }
+    out = trial;
+    return true;
+  }
+
+  LXConversion& handle_;
+  const uint8_t* text_;
+  uint64_t offset_;
+  uint32_t lines_;
+};
+
+}  // namespace lx

@@ -1,0 +1,30 @@
+// SPDX-License-Identifier: Apache-2.0
+// Packed characters: the bytes of one character as one big-endian number.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+namespace lx {
+
+inline uint32_t pack(const uint8_t* bytes, size_t length) {
+  uint32_t value = 0;
+  for (size_t i = 0; i < length; ++i) value = value << 8 | bytes[i];
+  return value;
+}
+
+// No character has a zero byte behind its first, so zero middle bytes are not written.
+inline size_t unpack(uint8_t* out, uint32_t value) {
+  uint8_t* at = out;
+  if (value > 0xFFFFFF) *at++ = static_cast<uint8_t>(value >> 24);
+  if ((value & 0xFF0000) != 0) *at++ = static_cast<uint8_t>(value >> 16);
+  if ((value & 0xFF00) != 0) *at++ = static_cast<uint8_t>(value >> 8);
+  *at++ = static_cast<uint8_t>(value);
+  return static_cast<size_t>(at - out);
+}
+
+inline size_t unpacked_length(uint32_t value) {
+  return size_t{1} + (value > 0xFFFFFF) + ((value & 0xFF0000) != 0) + ((value & 0xFF00) != 0);
+}
+
+}  // namespace lx

@@ -1,0 +1,176 @@
+// SPDX-License-Identifier: Apache-2.0
+// Writers put characters together as text of one kind. They never write past their room and never part of a character.
+//
+//   code(character)            what is stored for a UCS-2 character: its packed value in the writer's code page
+//   stands_in(code, character) whether that is only the substitution byte
+//   fits(code)                 room for it, with the shift byte that it may need
+//   put(code)                  stores it; the caller has asked fits, or is within fast_characters
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
+#include "codepage/text/packed.hpp"
+#include "objects/code_page.hpp"
+
+namespace lx {
+
+template <class U>
+struct UnitWriter {
+  using Unit = U;
+  static constexpr bool kShifted = false;
+
+  U* begin;
+  U* at;
+  U* end;
+
+  UnitWriter(U* out, size_t room) : begin(out), at(out), end(out + room) {}
+  size_t room() const { return static_cast<size_t>(end - at); }
+};
+
+struct SingleByteWriter : UnitWriter<uint8_t> {
+  const CodePage* page;
+
+  SingleByteWriter(const CodePage& code_page, uint8_t* out, size_t size) : UnitWriter(out, size), page(&code_page) {}
+  uint32_t code(uint16_t character) const { return page->packed(character); }
+  bool stands_in(uint32_t code, uint16_t character) const { return page->stands_in(code, character); }
+  bool fits(uint32_t) const { return at != end; }
+  void put(uint32_t code) { *at++ = static_cast<uint8_t>(code); }
+  size_t fast_characters() const { return room(); }
+};
+
+// Bytes of packed characters, of any code page.
+struct PackedWriter : UnitWriter<uint8_t> {
+  using UnitWriter::UnitWriter;
+  bool fits(uint32_t code) const { return room() >= unpacked_length(code); }
+  void put(uint32_t code) {
+    if (code < 0x100) {
+      *at++ = static_cast<uint8_t>(code);
+    } else if (code < 0x10000) {
+      *at++ = static_cast<uint8_t>(code >> 8);
+      *at++ = static_cast<uint8_t>(code);
+    } else {
+      at += unpack(at, code);
+    }
+  }
+  size_t fast_characters() const { return room() / kMaxCharacterLength; }
+};
+
+struct MultibyteWriter : PackedWriter {
+  const CodePage* page;
+
+  MultibyteWriter(const CodePage& code_page, uint8_t* out, size_t size) : PackedWriter(out, size), page(&code_page) {}
+  uint32_t code(uint16_t character) const { return page->packed(character); }
+  bool stands_in(uint32_t code, uint16_t character) const { return page->stands_in(code, character); }
+};
+
+// The code of a character is the character: its bytes follow by rule.
+struct Utf8Writer : UnitWriter<uint8_t> {
+  const CodePage* page;
+
+  Utf8Writer(const CodePage& code_page, uint8_t* out, size_t size) : UnitWriter(out, size), page(&code_page) {}
+  uint32_t code(uint16_t character) const { return character; }
+  bool stands_in(uint32_t, uint16_t) const { return false; }
+  bool fits(uint32_t code) const { return room() >= (code < 0x80 ? 1u : code < 0x800 ? 2u : 3u); }
+  void put(uint32_t code) {
+    if (code < 0x80) {
+      *at++ = static_cast<uint8_t>(code);
+    } else if (code < 0x800) {
+      *at++ = static_cast<uint8_t>(0xC0 | code >> 6);
+      *at++ = static_cast<uint8_t>(0x80 | (code & 0x3F));
+    } else {
+      *at++ = static_cast<uint8_t>(0xE0 | code >> 12);
+      *at++ = static_cast<uint8_t>(0x80 | (code >> 6 & 0x3F));
+      *at++ = static_cast<uint8_t>(0x80 | (code & 0x3F));
+    }
+  }
+  size_t fast_characters() const { return room() / 3; }
+};
+
+// Mixed host text: a shift byte goes before each character of the other width.
+struct ShiftedWriter : UnitWriter<uint8_t> {
+  static constexpr bool kShifted = true;
+
+  const CodePage* page;
+  bool double_byte;
+  uint8_t* run = nullptr;  // where the double-byte run begins, behind its enter byte, when that was written here
+
+  ShiftedWriter(const CodePage& code_page, uint8_t* out, size_t size, uint32_t state)
+      : UnitWriter(out, size), page(&code_page), double_byte(state != 0) {}
+  uint32_t code(uint16_t character) const {
+    return page->kind == PageKind::utf8 ? utf8_packed(character) : page->packed(character);
+  }
+  bool stands_in(uint32_t code, uint16_t character) const {
+    return page->kind != PageKind::utf8 && page->stands_in(code, character);
+  }
+  bool needs_shift(uint32_t code) const { return (code > 0xFF) != double_byte; }
+  bool fits(uint32_t code) const { return room() >= unpacked_length(code) + (needs_shift(code) ? 1 : 0); }
+  void put(uint32_t code) {
+    if (needs_shift(code)) {
+      double_byte = code > 0xFF;
+      *at++ = double_byte ? page->enter_byte : page->leave_byte;
+      run = at;
+    }
+    at += put_bytes(code);
+  }
+  // Returns to the single-byte state: takes an enter byte back that has nothing behind it, or writes the leave byte,
+  // for which characters make way until `needed` units are free. False: there is no room even so.
+  bool close(size_t needed) {
+    while (double_byte) {
+      if (run != nullptr && at == run) {
+        --at;
+        double_byte = false;
+      } else if (room() >= needed) {
+        *at++ = page->leave_byte;
+        double_byte = false;
+      } else if (static_cast<size_t>(at - (run != nullptr ? run : begin)) >= page->max_length) {
+        at -= page->max_length;
+      } else {
+        return false;
+      }
+    }
+    return true;
+  }
+  size_t fast_characters() const { return room() / (kMaxCharacterLength + 1); }
+
+  static uint32_t utf8_packed(uint16_t character) {
+    if (character < 0x80) return character;
+    if (character < 0x800) return 0xC080u | (character >> 6 & 0x1Fu) << 8 | (character & 0x3Fu);
+    return 0xE08080u | (character >> 12 & 0x0Fu) << 16 | (character >> 6 & 0x3Fu) << 8 | (character & 0x3Fu);
+  }
+
+ private:
+  size_t put_bytes(uint32_t code) {
+    if (code > 0xFFFF) return unpack(at, code);
+    if (code < 0x100) {
+      at[0] = static_cast<uint8_t>(code);
+      return 1;
+    }
+    at[0] = static_cast<uint8_t>(code >> 8);
+    at[1] = static_cast<uint8_t>(code);
+    return 2;
+  }
+};
+
+struct WideWriter : UnitWriter<uint32_t> {
+  const CodePage* page;
+
+  WideWriter(const CodePage& code_page, uint32_t* out, size_t size) : UnitWriter(out, size), page(&code_page) {}
+  uint32_t code(uint16_t character) const {
+    return page->kind == PageKind::utf8 ? ShiftedWriter::utf8_packed(character) : page->packed(character);
+  }
+  bool fits(uint32_t) const { return at != end; }
+  void put(uint32_t code) { *at++ = code; }
+  size_t fast_characters() const { return room(); }
+};
+
+struct Ucs2Writer : UnitWriter<uint16_t> {
+  using UnitWriter::UnitWriter;
+  uint32_t code(uint16_t character) const { return character; }
+  bool fits(uint32_t) const { return at != end; }
+  void put(uint32_t code) { *at++ = static_cast<uint16_t>(code); }
+  size_t fast_characters() const { return room(); }
+};
+
+}  // namespace lx

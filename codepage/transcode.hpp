@@ -1,0 +1,192 @@
+// SPDX-License-Identifier: Apache-2.0
+// The one loop that carries characters from a reader to a writer, and what lets it go fast.
+#pragma once
+
+#include <algorithm>
+#include <concepts>
+#include <type_traits>
+
+#include "codepage/text/text_kinds.hpp"
+
+namespace lx {
+
+enum class Stop : uint8_t {
+  none,     // one character more was carried over
+  done,     // all of the text was
+  partial,  // the text ends inside a character
+  full,     // the next character does not fit
+};
+
+// Nobody looks at single characters.
+struct NoWatch {
+  static constexpr bool kWatching = false;
+  static constexpr bool each_character() { return false; }
+};
+
+// ---- Runs of ASCII -------------------------------------------------------------------------------------------------
+
+// How ASCII stands in a byte text: as itself, through a table, or not in a way that a run can use.
+struct AsciiForm {
+  enum Way : uint8_t { none, itself, by_table } way;
+  const uint8_t* table;
+};
+
+inline AsciiForm ascii_form(const SingleByteReader& in) {
+  if (in.page->ascii_bytes) return {AsciiForm::itself, nullptr};
+  return {AsciiForm::by_table, in.page->ascii_of_byte};
+}
+inline AsciiForm ascii_form(const MultibyteReader& in) {
+  return {in.page->ascii_bytes ? AsciiForm::itself : AsciiForm::none, nullptr};
+}
+inline AsciiForm ascii_form(const Utf8Reader& in) {
+  return {in.page->standard_utf8 ? AsciiForm::itself : AsciiForm::none, nullptr};
+}
+inline AsciiForm ascii_form(const ShiftedReader& in) {
+  return {in.double_byte || in.past_shift ? AsciiForm::none : AsciiForm::by_table, in.page->ascii_of_byte};
+}
+inline AsciiForm ascii_form_of_target(const CodePage& page) {
+  if (page.ascii_bytes) return {AsciiForm::itself, nullptr};
+  return {page.ascii_complete ? AsciiForm::by_table : AsciiForm::none, page.byte_of_ascii};
+}
+inline AsciiForm ascii_form(const SingleByteWriter& out) { return ascii_form_of_target(*out.page); }
+inline AsciiForm ascii_form(const MultibyteWriter& out) { return ascii_form_of_target(*out.page); }
+inline AsciiForm ascii_form(const Utf8Writer&) { return {AsciiForm::itself, nullptr}; }
+inline AsciiForm ascii_form(const ShiftedWriter& out) {
+  return out.double_byte ? AsciiForm{AsciiForm::none, nullptr} : ascii_form_of_target(*out.page);
+}
+
+template <class In, class Out>
+concept BytesToBytes = std::same_as<typename In::Unit, uint8_t> && std::same_as<typename Out::Unit, uint8_t>;
+
+template <class In, class Out>
+void carry_ascii(In& in, Out& out) {
+  if constexpr (BytesToBytes<In, Out>) {
+    AsciiForm from = ascii_form(in);
+    AsciiForm to = ascii_form(out);
+    if (from.way == AsciiForm::none || to.way == AsciiForm::none) return;
+    size_t room = std::min(in.left(), out.room());
+    size_t done = 0;
+    if (from.way == AsciiForm::itself) {
+      done = to.way == AsciiForm::itself ? copy_ascii(in.at, room, out.at)
+                                         : map_from_ascii(to.table, in.at, room, out.at);
+    } else if (to.way == AsciiForm::itself) {
+      done = map_to_ascii(from.table, in.at, room, out.at);
+    }
+    in.at += done;
+    out.at += done;
+  }
+}
+
+// Two single-byte pages: every byte goes through the map, where there is one.
+template <class Watch>
+bool carry_mapped(SingleByteReader& in, SingleByteWriter& out, const Watch&) {
+  if (in.map == nullptr) return false;
+  size_t room = std::min(in.left(), out.room());
+  if (Watch::kWatching && !in.map->exact) {
+    const bool* inexact = in.map->inexact;
+    room = static_cast<size_t>(std::find_if(in.at, in.at + room, [=](uint8_t byte) { return inexact[byte]; }) - in.at);
+  }
+  map_bytes(in.map->value, in.at, room, out.at);
+  in.at += room;
+  out.at += room;
+  return true;
+}
+template <class In, class Out, class Watch>
+bool carry_mapped(In&, Out&, const Watch&) {
+  return false;
+}
+
+// ---- Single characters ----------------------------------------------------------------------------------------------
+
+// Carries well-formed characters that a watch need not see, as many as surely fit. True: a run of ASCII follows.
+template <class In, class Out, class Watch>
+bool carry_fast(In& in, Out& out, const Watch&) {
+  for (;;) {
+    size_t count = std::min(in.fast_characters(), out.fast_characters());
+    if (count == 0) return false;
+    for (; count != 0; --count) {
+      In mark = in;
+      uint16_t character = 0;
+      if (!in.next_fast(character)) [[unlikely]] {
+        in = mark;
+        return false;
+      }
+      uint32_t code = out.code(character);
+      if constexpr (Watch::kWatching) {
+        if (character == kUnassigned || out.stands_in(code, character)) [[unlikely]] {
+          in = mark;
+          return false;
+        }
+      }
+      out.put(code);
+      if constexpr (BytesToBytes<In, Out>) {
+        if (character < 0x80 && !in.done() && in.page->ascii_of_byte[*in.at] < 0x80) return true;
+      }
+    }
+  }
+}
+
+// Carries one character, however long it takes.
+template <class In, class Out, class Watch>
+Stop carry_one(In& in, Out& out, Watch& watch) {
+  In mark = in;
+  uint16_t character = 0;
+  Got got = in.next(character);
+  if (got == Got::character) {
+    if constexpr (Watch::kWatching) {
+      if (!watch.carry(in, out, character)) {
+        in = mark;
+        return Stop::full;
+      }
+    } else {
+      uint32_t code = out.code(character);
+      if (!out.fits(code)) {
+        in = mark;
+        return Stop::full;
+      }
+      out.put(code);
+    }
+  }
+  if constexpr (Watch::kWatching && In::kShifted) watch.note_odd_shift(in);
+  switch (got) {
+    case Got::end: return Stop::done;
+    case Got::partial: return Stop::partial;
+    default: return Stop::none;
+  }
+}
+
+// Carries all that can be carried.
+template <class In, class Out, class Watch>
+Stop transcode(In& in, Out& out, Watch& watch) {
+  for (;;) {
+    if (!watch.each_character() && !carry_mapped(in, out, watch)) {
+      do {
+        carry_ascii(in, out);
+      } while (carry_fast(in, out, watch));
+    }
+    Stop stop = carry_one(in, out, watch);
+    if (stop != Stop::none) return stop;
+  }
+}
+
+// The same for packed characters, which keep their bytes.
+template <class In, class Out>
+Stop transfer(In& in, Out& out) {
+  for (;;) {
+    In mark = in;
+    uint32_t value = 0;
+    switch (in.next_packed(value)) {
+      case Got::end: return Stop::done;
+      case Got::partial: return Stop::partial;
+      case Got::shift: continue;
+      case Got::character: break;
+    }
+    if (!out.fits(value)) {
+      in = mark;
+      return Stop::full;
+    }
+    out.put(value);
+  }
+}
+
+}  // namespace lx

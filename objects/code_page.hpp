@@ -1,0 +1,92 @@
+// SPDX-License-Identifier: Apache-2.0
+// A code page in use: the checked sections and, beside them, native tables for the inner loops. Built once when the
+// object is loaded, freed with it, read without locks.
+#pragma once
+
+#include <lexaro/lexaro.h>
+
+#include "objects/code_page_format.hpp"
+
+namespace lx {
+
+// How plain text of the page (no shift states) is cut into characters and written.
+enum class PageKind : uint8_t {
+  single,     // every character is one byte; mixed pages count here as long as nobody follows their shift bytes
+  multibyte,  // the first byte tells the length
+  utf8,       // as multibyte, converted by rule
+};
+
+// The sections of a code page after their check. What it proves is what the readers of CodePage rely on.
+struct CheckedCodePage {
+  const CodePageHeader* header;
+  const ToUnicodeState* states;  // null on pages without multibyte characters
+  const uint8_t* to_unicode_array;
+  uint32_t state_count;
+  const uint8_t* values;      // section 3
+  const uint8_t* high_parts;  // section 4
+  const TypeState* type_states;  // null: absent
+  const TypeEntry* type_entries;
+  uint32_t type_entry_count;
+  const BeU32* full_width;  // null: absent
+  const WidthPair* half_to_full;
+  uint32_t half_to_full_count;
+};
+
+struct CodePage {
+  CheckedCodePage raw;
+  uint16_t id;
+  uint8_t max_length;
+  uint8_t substitution;
+  uint8_t enter_byte;  // 0 unless shift-sensitive
+  uint8_t leave_byte;
+  bool shift_sensitive;
+  bool ascii_family;
+  PageKind kind;
+  bool ascii_bytes;     // 00-7F are the ASCII characters, both ways
+  bool ascii_complete;  // every ASCII character is one byte of the page
+  bool standard_utf8;  // UTF-8 whose length table is the usual one
+  uint8_t char_length[256];  // by first byte; never 0, so that every walk ends
+  uint16_t to_unicode[256];  // of one-byte characters
+  uint32_t utf8_of_byte[256];  // the same in UTF-8, first byte lowest; the top byte counts the bytes
+  uint8_t ascii_of_byte[256];  // the same as one byte; 0x80: not an ASCII character, or a shift byte
+  uint8_t byte_of_ascii[128];  // of U+0000-U+007F, the lowest byte of the packed character
+
+  // Multibyte characters to UCS-2: from `root`, a value with kNode set is the number of a node that the next byte
+  // indexes; a value without it is a row of values that the last byte indexes. Row 0 holds only U+FFFD.
+  static constexpr uint16_t kNode = 0x8000;
+  uint16_t root;
+  const uint16_t* nodes;
+  const uint16_t* rows;
+
+  // UCS-2 to packed characters: pages of 256 by high byte. Page 0 holds only the substitution byte. One of the two
+  // arrays is there: the narrow one unless some character has more than two bytes.
+  uint16_t from_page[256];
+  const uint16_t* from_narrow;
+  const uint32_t* from_wide;
+
+  const LXCharType* types;  // native copies of the type entries
+
+  uint32_t packed(uint16_t ucs2) const {
+    size_t at = size_t{from_page[ucs2 >> 8]} << 8 | (ucs2 & 0xFF);
+    return from_narrow != nullptr ? from_narrow[at] : from_wide[at];
+  }
+  // Whether a packed value stands for the wanted character or merely in its place.
+  bool stands_in(uint32_t packed_value, uint16_t ucs2) const {
+    return packed_value == substitution && to_unicode[substitution] != ucs2;
+  }
+
+  // The value of the character at `bytes`, of which the tables never read more than its length.
+  uint16_t decode(const uint8_t* bytes) const {
+    uint16_t at = root;
+    while ((at & kNode) != 0) at = nodes[size_t{at & ~unsigned{kNode}} << 8 | *bytes++];
+    return rows[size_t{at} << 8 | *bytes];
+  }
+};
+
+// One block from the allocation callback, with the tables behind the record; null: no memory.
+CodePage* build_code_page(uint16_t id, const CheckedCodePage& checked);
+
+// US-ASCII as it stands in for a missing page; part of the library.
+const CodePage& built_in_code_page();
+
+}  // namespace lx

@@ -1,0 +1,50 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/lexaro/library_session.hpp"
+
+#include "tools/lexaro/data_directory.hpp"
+#include "tools/lexaro/failure.hpp"
+
+namespace lx::tool {
+
+LibrarySession::LibrarySession(const std::optional<std::string>& locale_directory)
+    : directory_(find_data_directory(locale_directory)) {
+  const uint32_t status = LXInit(directory_.c_str(), nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
+  if (status == LX_OK) return;
+  if (status == LX_E_DEFAULTS) LXTerm();
+  throw Failure(ExitStatus::kCodePage,
+                display_name(directory_) + ": the locale data cannot be used (" + describe_status(status) + ")");
+}
+
+std::string describe_status(uint32_t status) {
+  switch (status) {
+    case LX_E_OPEN:
+      return "a file cannot be opened";
+    case LX_E_DEFAULTS:
+    case LX_E_MANAGER:
+      return "control.nls is damaged or its path is too long";
+    case LX_E_MEMORY:
+      return "out of memory";
+    case LX_E_CODEPAGE:
+      return "code page not found";
+    case LX_E_LANGUAGE:
+      return "language not found";
+    case LX_E_TERRITORY:
+      return "territory not found";
+    case LX_E_SORT:
+      return "sort not found";
+    case LX_E_NOTFOUND:
+      return "object not found";
+    case LX_E_NOFILE:
+      return "its file is missing";
+    case LX_E_ACCESS:
+      return "no permission to read its file";
+    case LX_E_FILE:
+      return "its file cannot be read";
+    case LX_E_HEADER:
+      return "its file is damaged";
+    default:
+      return "status " + std::to_string(status);
+  }
+}
+
+}  // namespace lx::tool

@@ -1,0 +1,42 @@
+// SPDX-License-Identifier: Apache-2.0
+// The library's start and end, and owners of its handles.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "lexaro/lexaro.h"
+
+namespace lx::tool {
+
+// The library runs on the locale data of one directory while this lives, and never on built-in stand-ins: a
+// conversion through the wrong page would be worse than none.
+class LibrarySession {
+ public:
+  explicit LibrarySession(const std::optional<std::string>& locale_directory);
+  LibrarySession(const LibrarySession&) = delete;
+  LibrarySession& operator=(const LibrarySession&) = delete;
+  ~LibrarySession() { LXTerm(); }
+
+  const std::string& directory() const { return directory_; }
+
+ private:
+  std::string directory_;
+};
+
+struct LocaleDeleter {
+  void operator()(LXLocale* locale) const { LXReleaseLocale(locale, 0); }
+};
+using LocalePtr = std::unique_ptr<LXLocale, LocaleDeleter>;
+
+struct ConversionDeleter {
+  void operator()(LXConversion* handle) const { LXCloseConversion(handle); }
+};
+using ConversionPtr = std::unique_ptr<LXConversion, ConversionDeleter>;
+
+// A status code of the library in words.
+std::string describe_status(uint32_t status);
+
+}  // namespace lx::tool

@@ -1,0 +1,142 @@
+// SPDX-License-Identifier: Apache-2.0
+#include <fcntl.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstdio>
+#include <cstdlib>
+#include <exception>
+#include <memory>
+#include <new>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "lexaro/lexaro.h"
+#include "tools/lexaro/command.hpp"
+#include "tools/lexaro/output_file.hpp"
+#include "tools/lexaro/temporary_file.hpp"
+
+namespace lx::tool {
+namespace {
+
+constexpr char kProgramNotes[] = R"(Locale data are taken from --locale-dir, else from the directory that LX_LOCALEDIR
+names, else from the installation that the program belongs to.
+
+Examples:
+  lexaro convert -f IBM-1047 -t UTF-8 report.dat > report.txt
+  lexaro list codepages
+  lexaro help convert
+)";
+
+// A file that is opened must never become the standard output that the caller closed: the gap is filled with a
+// descriptor on which the real use fails.
+void fill_standard_descriptors() {
+  for (int fd : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
+    if (::fcntl(fd, F_GETFD) != -1 || errno != EBADF) continue;
+    if (::open("/dev/null", fd == STDIN_FILENO ? O_WRONLY : O_RDONLY) != fd) std::_Exit(3);
+  }
+}
+
+Command add_help_command(CLI::App& program) {
+  CLI::App* app = program.add_subcommand("help", "Show the help of the program or of a command");
+  auto topic = std::make_shared<std::string>();
+  app->add_option("COMMAND", *topic, "A command of the program")->type_name("");
+  return {app, [&program, topic](const CommonOptions&) {
+            if (topic->empty()) {
+              // help() would answer for the command that was given, which is this one
+              print(program.get_formatter()->make_help(&program, "lexaro", CLI::AppFormatMode::Normal));
+              return ExitStatus::kExact;
+            }
+            const auto named = [&](const CLI::App* command) { return command->get_name() == *topic; };
+            const std::vector<CLI::App*> found = program.get_subcommands(named);
+            if (found.empty()) throw usage_failure("there is no command \"" + display_name(*topic) + "\"");
+            print(found.front()->help("lexaro"));
+            return ExitStatus::kExact;
+          }};
+}
+
+ExitStatus report_parse_error(const CLI::App& program, const CLI::ParseError& error) {
+  if (error.get_exit_code() == 0) {  // --help and --version come as errors too
+    if (dynamic_cast<const CLI::CallForVersion*>(&error)) {
+      print(std::string(error.what()) + "\n");
+    } else {
+      print(program.help());
+    }
+    return ExitStatus::kExact;
+  }
+  std::string command = "lexaro";
+  std::string message = error.what();
+  if (const auto unknown = program.remaining(); program.get_subcommands().empty() && !unknown.empty()) {
+    message = "there is no command or option \"" + display_name(unknown.front()) + "\"";
+  }
+  for (const CLI::App* app : program.get_subcommands()) command += " " + app->get_name();
+  complain(message + "\nTry \"" + command + " --help\".");
+  return ExitStatus::kUsage;
+}
+
+// The arguments in the reversed order that the parser takes them in. It would read [x] as a list of values and treat
+// what follows "--" as options once a file was named: both are file names here, and "./" makes that plain.
+std::vector<std::string> parser_arguments(int argument_count, char** arguments) {
+  std::vector<std::string> all;
+  bool only_files = false;
+  for (int i = 1; i < argument_count; ++i) {
+    std::string argument = arguments[i];
+    if (!only_files && argument == "--") {
+      only_files = true;
+      continue;
+    }
+    const bool like_option = only_files && argument.size() > 1 && argument.front() == '-';
+    const bool like_list = argument.starts_with('[') && argument.ends_with(']');
+    if (like_option || like_list) argument.insert(0, "./");
+    all.push_back(std::move(argument));
+  }
+  std::reverse(all.begin(), all.end());
+  return all;
+}
+
+ExitStatus run(int argument_count, char** arguments) {
+  CLI::App program("Converts text between code pages.", "lexaro");
+  CommonOptions common;
+  program.add_option("--locale-dir", common.locale_directory, "Directory of the locale data")->type_name("DIR");
+  program.set_version_flag("--version", std::string("lexaro ") + LXVersion());
+  program.footer(kProgramNotes);
+
+  const std::vector<Command> commands = {add_convert_command(program), add_list_command(program),
+                                         add_help_command(program)};
+  program.require_subcommand(1);
+  program.fallthrough();
+  for (const Command& command : commands) command.app->fallthrough();
+  try {
+    program.parse(parser_arguments(argument_count, arguments));
+  } catch (const CLI::ParseError& error) {
+    return report_parse_error(program, error);
+  }
+  for (const Command& command : commands) {
+    if (command.app->parsed()) return command.run(common);
+  }
+  return ExitStatus::kUsage;
+}
+
+ExitStatus guarded_run(int argument_count, char** arguments) {
+  try {
+    return run(argument_count, arguments);
+  } catch (const Failure& failure) {
+    if (!failure.quiet()) complain(failure.what());
+    return failure.status();
+  } catch (const std::bad_alloc&) {
+    complain("out of memory");
+  } catch (const std::exception& error) {
+    complain(error.what());
+  }
+  return ExitStatus::kInputOutput;
+}
+
+}  // namespace
+}  // namespace lx::tool
+
+int main(int argc, char** argv) {
+  lx::tool::fill_standard_descriptors();
+  lx::tool::install_signal_handling();
+  return static_cast<int>(lx::tool::guarded_run(argc, argv));
+}

@@ -1,0 +1,120 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "tools/lexaro/problem_log.hpp"
+
+#include <langinfo.h>
+#include <locale.h>
+#include <wctype.h>
+
+#include <algorithm>
+#include <cstring>
+
+namespace lx::tool {
+namespace {
+
+constexpr char kDigits[] = "0123456789ABCDEF";
+
+// The character itself, where the user's terminal expects UTF-8 and can show it.
+std::string quoted_character(uint32_t unicode) {
+  static const locale_t user = newlocale(LC_CTYPE_MASK, "", nullptr);
+  if (user == nullptr || std::strcmp(nl_langinfo_l(CODESET, user), "UTF-8") != 0) return "";
+  const bool invisible = unicode < 0x80 || (unicode >= 0xD800 && unicode <= 0xF8FF) ||
+                         (unicode >= 0x200B && unicode <= 0x200F) || (unicode >= 0x2028 && unicode <= 0x202E) ||
+                         (unicode >= 0x2060 && unicode <= 0x206F) || unicode == 0xFEFF;
+  if (invisible || !iswprint_l(static_cast<wint_t>(unicode), user)) return "";
+  std::string text = " \"";
+  if (unicode < 0x800) {
+    text += static_cast<char>(0xC0 | unicode >> 6);
+  } else {
+    if (unicode < 0x10000) {
+      text += static_cast<char>(0xE0 | unicode >> 12);
+    } else {
+      text += static_cast<char>(0xF0 | unicode >> 18);
+      text += static_cast<char>(0x80 | (unicode >> 12 & 0x3F));
+    }
+    text += static_cast<char>(0x80 | (unicode >> 6 & 0x3F));
+  }
+  text += static_cast<char>(0x80 | (unicode & 0x3F));
+  return text + '"';
+}
+
+std::string source_bytes(const LXConversionProblem& problem) {
+  if (problem.length == 0) return "the end";  // where a double-byte run was left open
+  return "X'" + hexadecimal(problem.bytes, std::min<std::size_t>(problem.length, sizeof problem.bytes)) + "'";
+}
+
+}  // namespace
+
+void Histogram::add(uint64_t key) {
+  const auto known = counts_.find(key);
+  if (known != counts_.end()) {
+    ++known->second;
+  } else if (counts_.size() < kMostKeys) {
+    counts_.emplace(key, 1);
+  } else {
+    ++other_;
+  }
+}
+
+void ProblemLog::add(const LXConversionProblem& problem) {
+  if (first_.size() < kMostPositions) first_.push_back(problem);
+  if (problem.kind < kKinds && first_of_kind_[problem.kind].kind == 0) first_of_kind_[problem.kind] = problem;
+  if (problem.kind == LX_PROBLEM_SUBSTITUTED) substituted_.add(problem.unicode);
+  if (problem.kind == LX_PROBLEM_MALFORMED) malformed_.add(sequence_key(problem));
+}
+
+uint64_t ProblemLog::sequence_key(const LXConversionProblem& problem) {
+  uint64_t key = 1;
+  const std::size_t length = std::min<std::size_t>(problem.length, sizeof problem.bytes);
+  for (std::size_t i = 0; i < length; ++i) key = key << 8 | problem.bytes[i];
+  return key;
+}
+
+std::string ProblemLog::summary(const LXConversionCounts& counts, bool discarded) const {
+  std::string text;
+  const auto tell = [&](uint64_t count, uint32_t kind, const char* one, const char* many, const std::string& what) {
+    if (count == 0) return;
+    const LXConversionProblem& first = first_of_kind_[kind];
+    if (!text.empty()) text += ", ";
+    text += std::to_string(count) + " " + (count == 1 ? one : many) + (count == 1 ? " (at byte " : " (first at byte ") +
+            std::to_string(first.offset) + ": " + what + ")";
+  };
+  const LXConversionProblem& lacking = first_of_kind_[LX_PROBLEM_SUBSTITUTED];
+  tell(counts.substituted, LX_PROBLEM_SUBSTITUTED, discarded ? "character left out" : "character replaced",
+       discarded ? "characters left out" : "characters replaced",
+       code_point(lacking.unicode) + quoted_character(lacking.unicode));
+  tell(counts.malformed, LX_PROBLEM_MALFORMED, "malformed sequence", "malformed sequences",
+       source_bytes(first_of_kind_[LX_PROBLEM_MALFORMED]));
+  tell(counts.shifts, LX_PROBLEM_SHIFT, "unbalanced shift", "unbalanced shifts",
+       source_bytes(first_of_kind_[LX_PROBLEM_SHIFT]));
+  tell(counts.cut, LX_PROBLEM_CUT, "character cut off by the end", "characters cut off by the end",
+       source_bytes(first_of_kind_[LX_PROBLEM_CUT]));
+  return text;
+}
+
+std::string code_point(uint32_t unicode) {
+  std::string text;
+  for (uint32_t rest = unicode; rest != 0 || text.size() < 4; rest >>= 4) text += kDigits[rest & 0xF];
+  std::reverse(text.begin(), text.end());
+  return "U+" + text;
+}
+
+std::string hexadecimal(const uint8_t* bytes, std::size_t count) {
+  std::string text;
+  for (std::size_t i = 0; i < count; ++i) {
+    text += kDigits[bytes[i] >> 4];
+    text += kDigits[bytes[i] & 0xF];
+  }
+  return text;
+}
+
+std::string hexadecimal(uint64_t sequence_key) {
+  std::string text;
+  for (uint64_t rest = sequence_key; rest > 1; rest >>= 8) {
+    text += kDigits[rest & 0xF];
+    text += kDigits[rest >> 4 & 0xF];
+  }
+  std::reverse(text.begin(), text.end());
+  return text;
+}
+
+}  // namespace lx::tool

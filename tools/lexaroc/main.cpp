@@ -1,0 +1,116 @@
+// SPDX-License-Identifier: Apache-2.0
+// lexaroc: compiles, prints and checks locale data.
+#include <CLI/CLI.hpp>
+#include <iostream>
+#include <set>
+
+#include "builtin.hpp"
+#include "check.hpp"
+#include "compile.hpp"
+#include "dump.hpp"
+#include "object_file.hpp"
+
+namespace {
+
+using namespace lx::compiler;
+
+enum ExitCode { kDone = 0, kBadData = 1, kBadUsage = 2, kIoFailure = 3 };
+
+int run_data(const fs::path& sources, const fs::path& output, Layout layout, const std::set<uint16_t>& only) {
+  Report report;
+  SourceTree tree = read_source_tree(sources, only, report);
+  if (report.clean()) {
+    std::vector<CompiledFile> files = compile(tree, layout, report);
+    if (report.clean()) {
+      make_directory(output);
+      for (const CompiledFile& file : files) write_file(output / file.name, file.bytes);
+    }
+  }
+  report.print(std::cerr);
+  return report.clean() ? kDone : kBadData;
+}
+
+int run_dump(const fs::path& file, const fs::path& output) {
+  try {
+    std::string source = dump_file(file);
+    if (output.empty()) {
+      std::cout << source << std::flush;
+      return std::cout ? kDone : kIoFailure;
+    }
+    write_file(output, source);
+    return kDone;
+  } catch (const StructureError& error) {
+    std::cerr << file.string() << ": " << error.what() << '\n';
+    return kBadData;
+  }
+}
+
+int run_check(const std::vector<fs::path>& paths) {
+  Report report;
+  for (const fs::path& path : paths) check_path(path, report);
+  report.print(std::cerr);
+  return report.clean() ? kDone : kBadData;
+}
+
+int run_builtin(const fs::path& sources, const fs::path& output) {
+  Report report;
+  BuiltinSources made = make_builtin_sources(sources, report);
+  report.print(std::cerr);
+  if (!report.clean()) return kBadData;
+  write_file(output / "builtin_images.hpp", made.images);
+  write_file(output / "builtin_objects.cpp", made.objects);
+  return kDone;
+}
+
+int run(int argc, char** argv) {
+  CLI::App app("Compiler of locale data");
+  app.require_subcommand(1);
+  int result = kDone;
+  fs::path sources, output;
+
+  CLI::App* data = app.add_subcommand("data", "Compile a directory of sources into a data directory");
+  unsigned layout = 2;
+  std::set<uint16_t> only;
+  data->add_option("SOURCE_DIR", sources, "Directory of the sources")->required();
+  data->add_option("OUTPUT_DIR", output, "Data directory, created when it is not there")->required();
+  data->add_option("--layout", layout, "Layout version of the code pages: 2, or 1 for tests")->check(CLI::Range(1, 2));
+  data->add_option("--only", only, "Compile only these code pages")->delimiter(',');
+  data->callback([&] { result = run_data(sources, output, layout == 1 ? Layout::version1 : Layout::current, only); });
+
+  CLI::App* dump = app.add_subcommand("dump", "Print a compiled file as its readable source");
+  fs::path compiled;
+  dump->add_option("FILE", compiled, "control.nls or an object file")->required();
+  dump->add_option("-o,--output", output, "Write to this file instead of standard output");
+  dump->callback([&] { result = run_dump(compiled, output); });
+
+  CLI::App* check = app.add_subcommand("check", "Check sources or compiled files");
+  std::vector<fs::path> paths;
+  check->add_option("PATH", paths, "Directories or files")->required();
+  check->callback([&] { result = run_check(paths); });
+
+  CLI::App* builtin = app.add_subcommand("builtin", "Make the C++ source of the built-in objects");
+  builtin->add_option("SOURCE_DIR", sources, "Directory of the sources")->required();
+  builtin->add_option("OUTPUT_DIR", output, "Where builtin_images.hpp and builtin_objects.cpp are written")->required();
+  builtin->callback([&] { result = run_builtin(sources, output); });
+
+  try {
+    app.parse(argc, argv);
+  } catch (const CLI::ParseError& error) {
+    return app.exit(error) == 0 ? kDone : kBadUsage;
+  }
+  return result;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  try {
+    return run(argc, argv);
+  } catch (const IoError& error) {
+    std::cerr << "lexaroc: " << error.what() << '\n';
+    return kIoFailure;
+  } catch (const std::exception& error) {
+    std::cerr << "lexaroc: " << error.what() << '\n';
+    return kBadData;
+  }
+}

@@ -1,0 +1,135 @@
+// SPDX-License-Identifier: Apache-2.0
+#include "territory.hpp"
+
+#include "field_file.hpp"
+#include "text_pool.hpp"
+
+namespace lx::compiler {
+
+namespace {
+
+// "precedes 1 space 0 sign 3"
+AmountForm read_amount_form(Cursor& cursor) {
+  AmountForm form;
+  auto field = [&cursor](const char* name, unsigned largest) {
+    std::string prefix = std::string(name) + " ";
+    if (!cursor.accept(prefix)) cursor.fail("expected \"" + prefix + "N\"");
+    return cursor.decimal(largest);
+  };
+  form.symbol_precedes = field("precedes", 1) != 0;
+  cursor.expect(U' ');
+  form.symbol_spaced = field("space", 1) != 0;
+  cursor.expect(U' ');
+  form.sign_position = static_cast<uint8_t>(field("sign", 4));
+  cursor.end();
+  return form;
+}
+
+std::string write_amount_form(const char* key, const AmountForm& form) {
+  return std::string(key) + " = precedes " + std::to_string(form.symbol_precedes) + " space " +
+         std::to_string(form.symbol_spaced) + " sign " + std::to_string(form.sign_position) + "\n";
+}
+
+bool is_sign(TerritoryText text) { return text == TerritoryText::positive_sign || text == TerritoryText::negative_sign; }
+
+uint16_t flag(bool set, uint16_t bit) { return set ? bit : 0; }
+
+}  // namespace
+
+std::optional<Territory> read_territory(const SourceFile& source, Report& report) {
+  size_t errors = report.count();
+  FieldFile fields(source, {}, report);
+  Territory territory;
+  territory.file = source.name();
+  territory.spots = fields.spots();
+  territory.id = fields.number("id");
+  territory.name = fields.name("name");
+  for (unsigned i = 0; i < kSeparators; ++i) {
+    fields.read(kSeparatorKeys[i], [&](Cursor& cursor) {
+      Spot spot = cursor.spot();
+      std::u16string text = read_text(cursor);
+      if (text.size() > 1) throw SourceError(spot, "a separator is one character, or \"\" for none");
+      territory.separators[i] = text.empty() ? u'\0' : text[0];
+    });
+  }
+  for (unsigned i = 0; i < kTerritoryTexts; ++i) territory.texts[i] = fields.text(kTerritoryTextKeys[i]);
+  territory.fraction_digits = fields.number("fraction-digits");
+  territory.currency_digits = fields.number("mon-digits");
+  territory.currency_intl_digits = fields.number("mon-digits-intl");
+  fields.read("positive", [&](Cursor& cursor) { territory.positive = read_amount_form(cursor); });
+  fields.read("negative", [&](Cursor& cursor) { territory.negative = read_amount_form(cursor); });
+  territory.item58 = fields.number("item58", 1) != 0;
+  territory.item82 = fields.number("item82", 1) != 0;
+  territory.item83 = fields.number("item83", 1) != 0;
+  territory.item84 = fields.number("item84");
+  fields.end();
+  if (report.count() != errors) return std::nullopt;
+  return territory;
+}
+
+std::string write_territory(const Territory& territory) {
+  std::string out = "id = " + std::to_string(territory.id) + "\nname = " + territory.name + "\n";
+  for (unsigned i = 0; i < kSeparators; ++i) {
+    char16_t separator = territory.separators[i];
+    std::u16string text(separator == 0 ? 0 : 1, separator);
+    out += std::string(kSeparatorKeys[i]) + " = " + write_text(text, true) + "\n";
+  }
+  for (unsigned i = 0; i < kTerritoryTexts; ++i) {
+    bool quoted = is_sign(static_cast<TerritoryText>(i));
+    out += std::string(kTerritoryTextKeys[i]) + " = " + write_text(territory.texts[i], quoted) + "\n";
+  }
+  auto number = [&out](const char* key, unsigned value) {
+    out += std::string(key) + " = " + std::to_string(value) + "\n";
+  };
+  number("fraction-digits", territory.fraction_digits);
+  number("mon-digits", territory.currency_digits);
+  number("mon-digits-intl", territory.currency_intl_digits);
+  out += write_amount_form("positive", territory.positive);
+  out += write_amount_form("negative", territory.negative);
+  number("item58", territory.item58);
+  number("item82", territory.item82);
+  number("item83", territory.item83);
+  number("item84", territory.item84);
+  return out;
+}
+
+std::string pack_territory(const Territory& territory) {
+  TerritoryHeader header{};
+  for (unsigned i = 0; i < kSeparators; ++i) header.separators[i] = territory.separators[i];
+  header.fraction_digits = territory.fraction_digits;
+  header.currency_digits = territory.currency_digits;
+  header.currency_intl_digits = territory.currency_intl_digits;
+  header.positive_sign_position = territory.positive.sign_position;
+  header.negative_sign_position = territory.negative.sign_position;
+  header.value84 = territory.item84;
+  header.flags = static_cast<uint16_t>(
+      flag(territory.item58, kTerritoryYesNo) | flag(territory.positive.symbol_precedes, kPositiveSymbolPrecedes) |
+      flag(territory.positive.symbol_spaced, kPositiveSymbolSpaced) |
+      flag(territory.negative.symbol_precedes, kNegativeSymbolPrecedes) |
+      flag(territory.negative.symbol_spaced, kNegativeSymbolSpaced) | flag(territory.item82, kYesNo82) |
+      flag(territory.item83, kYesNo83));
+  TextPool texts(sizeof header);
+  for (unsigned i = 0; i < kTerritoryTexts; ++i) header.text_offsets[i] = texts.place(territory.texts[i]);
+  return std::string(bytes_of(header)) + texts.bytes();
+}
+
+Territory unpack_territory(std::string_view section) {
+  auto header = record_at<TerritoryHeader>(section, 0);
+  Territory territory;
+  for (unsigned i = 0; i < kSeparators; ++i) territory.separators[i] = header.separators[i];
+  territory.fraction_digits = header.fraction_digits;
+  territory.currency_digits = header.currency_digits;
+  territory.currency_intl_digits = header.currency_intl_digits;
+  unsigned flags = header.flags;
+  auto set = [flags](uint16_t bit) { return (flags & bit) != 0; };
+  territory.positive = {set(kPositiveSymbolPrecedes), set(kPositiveSymbolSpaced), header.positive_sign_position};
+  territory.negative = {set(kNegativeSymbolPrecedes), set(kNegativeSymbolSpaced), header.negative_sign_position};
+  territory.item58 = set(kTerritoryYesNo);
+  territory.item82 = set(kYesNo82);
+  territory.item83 = set(kYesNo83);
+  territory.item84 = header.value84;
+  for (unsigned i = 0; i < kTerritoryTexts; ++i) territory.texts[i] = text_at(section, header.text_offsets[i]);
+  return territory;
+}
+
+}  // namespace lx::compiler
