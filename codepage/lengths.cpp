@@ -3,11 +3,13 @@
 #include "codepage/lengths.hpp"
 
 #include "codepage/text/text_kinds.hpp"
-#include "frame/records.hpp"
+#include "frame/call.hpp"
 #include "objects/entry.hpp"
 
 namespace lx {
 namespace {
+
+TRC1_Unit trace_unit = {"Lexaro", "lengths", 0};
 
 // Walks over mixed host text without converting it.
 struct ShiftWalk {
@@ -23,11 +25,27 @@ struct ShiftWalk {
   size_t length_here() const { return double_byte ? page.max_length : size_t{1}; }
 };
 
+size_t characters_of_bytes(const CodePage& page, const uint8_t* text, uint32_t state, size_t bytes) {
+  if (!page.shift_sensitive && page.kind == PageKind::single) return bytes;
+  const uint8_t* end = text + bytes;
+  size_t count = 0;
+  ShiftWalk walk = {page, text, state != 0};
+  while (walk.at != end) {
+    if (page.shift_sensitive && walk.take_shift()) continue;
+    size_t length = page.shift_sensitive ? walk.length_here() : page.char_length[*walk.at];
+    if (length > static_cast<size_t>(end - walk.at)) break;
+    walk.at += length;
+    ++count;
+  }
+  return count;
+}
+
 int32_t clamped(size_t length) { return length > INT32_MAX ? INT32_MAX : static_cast<int32_t>(length); }
 
 }  // namespace
 
-size_t bytes_of_characters(const CodePage& page, const uint8_t* text, uint32_t state, size_t characters) {
+size_t bytes_of_characters(const CodePage& page, const uint8_t* text, uint32_t state, size_t characters,
+                           bool look_behind) {
   const uint8_t* at = text;
   if (!page.shift_sensitive) {
     if (page.kind == PageKind::single) return characters;
@@ -38,7 +56,7 @@ size_t bytes_of_characters(const CodePage& page, const uint8_t* text, uint32_t s
   for (; characters != 0; --characters) {
     walk.take_shift();
     walk.at += walk.length_here();
-    if (characters > 1 || walk.double_byte) walk.take_shift();
+    if (characters > 1 || walk.double_byte || look_behind) walk.take_shift();
   }
   return static_cast<size_t>(walk.at - text);
 }
@@ -51,34 +69,21 @@ extern "C" {
 
 int32_t LXCpStrCharToByteLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                              int32_t chars) noexcept {
-  if (record == nullptr || string == nullptr || chars <= 0) return 0;
-  const CodePage& page = code_page_of(*record);
-  size_t bytes = bytes_of_characters(page, bytes_of(string), shift_state, static_cast<size_t>(chars));
-  // A run that begins right behind the last character counts as begun.
-  if (page.shift_sensitive && static_cast<uint8_t>(string[bytes]) == page.enter_byte) {
-    bool ended_run = bytes > 0 && static_cast<uint8_t>(string[bytes - 1]) == page.leave_byte;
-    if (!ended_run) ++bytes;
-  }
-  return clamped(bytes);
+  return exported(trace_unit, __func__, [&]() -> int32_t {
+    if (record == nullptr || string == nullptr || chars <= 0) return 0;
+    return clamped(
+        bytes_of_characters(code_page_of(*record), bytes_of(string), shift_state, static_cast<size_t>(chars), true));
+  });
 }
 
 int32_t LXCpStrByteToCharLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                              int32_t bytes) noexcept {
-  if (record == nullptr || string == nullptr) return 0;
-  const CodePage& page = code_page_of(*record);
-  const uint8_t* text = bytes_of(string);
-  const uint8_t* end = text + (bytes < 0 ? measured_length(text) : static_cast<size_t>(bytes));
-  if (!page.shift_sensitive && page.kind == PageKind::single) return clamped(static_cast<size_t>(end - text));
-  size_t count = 0;
-  ShiftWalk walk = {page, text, shift_state != 0};
-  while (walk.at != end) {
-    if (page.shift_sensitive && walk.take_shift()) continue;
-    size_t length = page.shift_sensitive ? walk.length_here() : page.char_length[*walk.at];
-    if (length > static_cast<size_t>(end - walk.at)) break;
-    walk.at += length;
-    ++count;
-  }
-  return clamped(count);
+  return exported(trace_unit, __func__, [&]() -> int32_t {
+    if (record == nullptr || string == nullptr) return 0;
+    const uint8_t* text = bytes_of(string);
+    size_t length = bytes < 0 ? measured_length(text) : static_cast<size_t>(bytes);
+    return clamped(characters_of_bytes(code_page_of(*record), text, shift_state, length));
+  });
 }
 
 }  // extern "C"

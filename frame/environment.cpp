@@ -28,6 +28,15 @@ bool room_for(const char* text, int32_t more, int32_t buffer_size) {
   return buffer_size >= 0 && std::strlen(text) + static_cast<size_t>(more) <= static_cast<size_t>(buffer_size);
 }
 
+int compare_ignoring_case(const void* a, const void* b, size_t count) {
+  const auto* left = static_cast<const uint8_t*>(a);
+  const auto* right = static_cast<const uint8_t*>(b);
+  for (size_t i = 0; i < count; ++i) {
+    if (int difference = to_lower(left[i]) - to_lower(right[i])) return difference;
+  }
+  return 0;
+}
+
 void complain_about_room(int32_t provided, size_t needed) {
   std::fprintf(stderr, "Buffer provided = %d, needed = %d\n", provided, static_cast<int>(needed));
 }
@@ -91,12 +100,7 @@ char* LXGetDataFileName(const char* directory, uint8_t object_type, uint16_t obj
 }
 
 int LXmemicmp(const void* a, const void* b, size_t count) noexcept {
-  const auto* left = static_cast<const uint8_t*>(a);
-  const auto* right = static_cast<const uint8_t*>(b);
-  for (size_t i = 0; i < count; ++i) {
-    if (int difference = to_lower(left[i]) - to_lower(right[i])) return difference;
-  }
-  return 0;
+  return exported(trace_unit, __func__, [&] { return compare_ignoring_case(a, b, count); });
 }
 
 }  // extern "C"

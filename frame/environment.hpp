@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-// Room checks of the functions that build file names.
+// What the functions that build and look up names share.
 #pragma once
 
 #include <cstddef>
@@ -12,5 +12,8 @@ bool room_for(const char* text, int32_t more, int32_t buffer_size);
 
 // Tells a developer on standard error that a name buffer is too small: the status alone says nothing about sizes.
 void complain_about_room(int32_t provided, size_t needed);
+
+// ASCII letters count as equal in either case; zero bytes are bytes like any other.
+int compare_ignoring_case(const void* a, const void* b, size_t count);
 
 }  // namespace lx

@@ -120,8 +120,10 @@ uint32_t LXTerm(void) noexcept {
 }
 
 uint32_t LXGetError(const LXLocale* locale) noexcept {
-  if (locale == nullptr) locale = lxglocale;
-  return locale != nullptr ? locale->last_error : LX_E_ARGUMENT;
+  return exported(trace_unit, __func__, [&]() -> uint32_t {
+    if (locale == nullptr) locale = lxglocale;
+    return locale != nullptr ? locale->last_error : LX_E_ARGUMENT;
+  });
 }
 
 const char* LXVersion(void) noexcept { return "1.0.0"; }

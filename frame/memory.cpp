@@ -3,11 +3,15 @@
 
 #include <cstdlib>
 
+#include "frame/call.hpp"
+
 LXAllocFn lxalloc_cbk = LXDefAlloc;
 LXFreeFn lxfree_cbk = LXDefFree;
 
 namespace lx {
 namespace {
+
+TRC1_Unit trace_unit = {"Lexaro", "memory", 0};
 
 void* allocation_context = nullptr;
 
@@ -25,13 +29,19 @@ bool release(const void* block) { return lxfree_cbk(allocation_context, const_ca
 
 }  // namespace lx
 
+using namespace lx;
+
 extern "C" {
 
-void* LXDefAlloc(void* /*context*/, size_t size) noexcept { return std::malloc(size); }
+void* LXDefAlloc(void* /*context*/, size_t size) noexcept {
+  return exported(trace_unit, __func__, [&] { return std::malloc(size); });
+}
 
 int LXDefFree(void* /*context*/, void* block) noexcept {
-  std::free(block);
-  return 1;
+  return exported(trace_unit, __func__, [&] {
+    std::free(block);
+    return 1;
+  });
 }
 
 }  // extern "C"

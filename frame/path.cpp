@@ -40,31 +40,39 @@ using namespace lx;
 extern "C" {
 
 int32_t SplitDrive(const char* path, char* drive) noexcept {
-  std::string_view text = path;
-  size_t colon = text.find(':');
-  return deliver(colon == text.npos ? std::string_view() : head(text, colon + 1), kMaxDrive, drive);
+  return exported(trace_unit, __func__, [&]() -> int32_t {
+    std::string_view text = path;
+    size_t colon = text.find(':');
+    return deliver(colon == text.npos ? std::string_view() : head(text, colon + 1), kMaxDrive, drive);
+  });
 }
 
 int32_t SplitDir(const char* path, char* directory) noexcept {
-  std::string_view text = after_drive(path);
-  size_t slash = text.rfind('/');
-  if (slash == text.npos) return deliver({}, kMaxDirectory, directory);
-  if (!is_dots(tail(text, slash + 1))) text = head(text, slash + 1);
-  return deliver(text, kMaxDirectory, directory);
+  return exported(trace_unit, __func__, [&]() -> int32_t {
+    std::string_view text = after_drive(path);
+    size_t slash = text.rfind('/');
+    if (slash == text.npos) return deliver({}, kMaxDirectory, directory);
+    if (!is_dots(tail(text, slash + 1))) text = head(text, slash + 1);
+    return deliver(text, kMaxDirectory, directory);
+  });
 }
 
 int32_t SplitFile(const char* path, char* file) noexcept {
-  std::string_view text = after_drive(path);
-  size_t slash = text.rfind('/');
-  if (slash != text.npos) text = tail(text, slash + 1);
-  if (is_dots(text)) return deliver({}, kMaxFile, file);
-  return deliver(head(text, text.rfind('.')), kMaxFile, file);
+  return exported(trace_unit, __func__, [&]() -> int32_t {
+    std::string_view text = after_drive(path);
+    size_t slash = text.rfind('/');
+    if (slash != text.npos) text = tail(text, slash + 1);
+    if (is_dots(text)) return deliver({}, kMaxFile, file);
+    return deliver(head(text, text.rfind('.')), kMaxFile, file);
+  });
 }
 
 int32_t SplitExtent(const char* path, char* extension) noexcept {
-  std::string_view text = path;
-  size_t dot = text.rfind('.');
-  return deliver(dot == text.npos ? std::string_view() : tail(text, dot), kMaxExtension, extension);
+  return exported(trace_unit, __func__, [&]() -> int32_t {
+    std::string_view text = path;
+    size_t dot = text.rfind('.');
+    return deliver(dot == text.npos ? std::string_view() : tail(text, dot), kMaxExtension, extension);
+  });
 }
 
 void SplitPath(const char* path, char* drive, char* directory, char* file, char* extension) noexcept {

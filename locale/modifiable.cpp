@@ -104,6 +104,18 @@ uint32_t fill_text(LXLocale& locale, unsigned index) {
   return LX_OK;
 }
 
+uint32_t refill(LXLocale& locale) {
+  const TerritoryHeader& territory = territory_of(*locale.territory);
+  fill_numbers(locale, territory);
+  fill_separators(locale, territory);
+  for (unsigned i = 0; i < kLocaleStrings; ++i) {
+    if ((locale.set_mask & kSetFirstText << i) != 0) continue;
+    uint32_t status = fill_text(locale, i);
+    if (status != LX_OK) return status;
+  }
+  return LX_OK;
+}
+
 }  // namespace
 
 void note_code_page(LXLocale& locale) {
@@ -147,14 +159,6 @@ extern "C" uint32_t LXLocaleSetModifiable(LXLocale* locale) noexcept {
   return exported(trace_unit, __func__, [&]() -> uint32_t {
     if (locale == nullptr) locale = lxglocale;
     if (locale == nullptr) return LX_E_ARGUMENT;
-    const TerritoryHeader& territory = territory_of(*locale->territory);
-    fill_numbers(*locale, territory);
-    fill_separators(*locale, territory);
-    for (unsigned i = 0; i < kLocaleStrings; ++i) {
-      if ((locale->set_mask & kSetFirstText << i) != 0) continue;
-      uint32_t status = fill_text(*locale, i);
-      if (status != LX_OK) return status;
-    }
-    return LX_OK;
+    return locale->last_error = refill(*locale);
   });
 }

@@ -28,7 +28,7 @@ int printed(std::string_view text) { return static_cast<int>(text.size()); }
 
 class AliasReader {
  public:
-  explicit AliasReader(LXObjMgr& manager) : manager_(manager), tail_(&manager.aliases) {
+  explicit AliasReader(LXObjMgr& manager) : tail_(&manager.aliases) {
     while (*tail_ != nullptr) tail_ = &(*tail_)->next;
   }
 
@@ -105,7 +105,6 @@ class AliasReader {
     return true;
   }
 
-  LXObjMgr& manager_;
   Alias** tail_;
   std::string_view code_page_;
 };
@@ -175,7 +174,7 @@ const char* LXGetCodepageFromAlias(LXObjMgr* manager, const char* name) noexcept
     LX_TRACE(TRC1_LEVEL_PARAMETER, "Searching for %s.", name);
     size_t length = std::strlen(name);
     for (const Alias* alias = manager->aliases; alias != nullptr; alias = alias->next) {
-      if (alias->alias_length != length || LXmemicmp(alias->alias, name, length) != 0) continue;
+      if (alias->alias_length != length || compare_ignoring_case(alias->alias, name, length) != 0) continue;
       LX_TRACE(TRC1_LEVEL_PARAMETER, "%s -> %s", alias->alias, alias->code_page);
       return alias->code_page;
     }

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "frame/call.hpp"
+#include "frame/environment.hpp"
 #include "frame/memory.hpp"
 #include "objects/control_file.hpp"
 
@@ -19,7 +20,7 @@ bool length_matches(size_t wanted, size_t length) { return wanted == length || w
 
 bool is_binary_sort(uint8_t type, const char* name, size_t length) {
   constexpr size_t kLength = sizeof kBinarySort - 1;
-  return type == LX_SORT && length_matches(length, kLength) && LXmemicmp(name, kBinarySort, kLength) == 0;
+  return type == LX_SORT && length_matches(length, kLength) && compare_ignoring_case(name, kBinarySort, length) == 0;
 }
 
 // An entry as a lookup delivers it.
@@ -30,7 +31,7 @@ LXObjEntry* deliver(LXObjMgr& manager, LXObjEntry& entry, bool no_load, uint32_t
 LXObjEntry* find_by_name(LXObjMgr& manager, uint8_t type, const char* name, size_t length) {
   for (uint16_t i = manager.first[type]; i < manager.first[type + 1]; ++i) {
     LXObjEntry& entry = manager.entries[i];
-    if (length_matches(length, std::strlen(entry.name)) && LXmemicmp(name, entry.name, length) == 0) return &entry;
+    if (length_matches(length, std::strlen(entry.name)) && compare_ignoring_case(name, entry.name, length) == 0) return &entry;
   }
   return nullptr;
 }

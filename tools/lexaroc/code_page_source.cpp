@@ -246,7 +246,7 @@ void write_characters(std::string& out, const std::vector<uint16_t>& row) {
     }
     bool literal = is_literal(row[i]);
     while (end < row.size() && row[end] != kUnassigned && row[end] == row[end - 1] + 1) {
-      literal = literal && is_literal(row[end++]);
+      literal &= is_literal(row[end++]);
     }
     constexpr size_t kShortestRange = 4;
     constexpr size_t kLongestLiteralRun = 23;

@@ -25,9 +25,9 @@ AmountForm read_amount_form(Cursor& cursor) {
   return form;
 }
 
-std::string write_amount_form(const char* key, const AmountForm& form) {
-  return std::string(key) + " = precedes " + std::to_string(form.symbol_precedes) + " space " +
-         std::to_string(form.symbol_spaced) + " sign " + std::to_string(form.sign_position) + "\n";
+std::string write_amount_form(const AmountForm& form) {
+  return "precedes " + std::to_string(form.symbol_precedes) + " space " + std::to_string(form.symbol_spaced) +
+         " sign " + std::to_string(form.sign_position);
 }
 
 bool is_sign(TerritoryText text) { return text == TerritoryText::positive_sign || text == TerritoryText::negative_sign; }
@@ -68,24 +68,36 @@ std::optional<Territory> read_territory(const SourceFile& source, Report& report
 }
 
 std::string write_territory(const Territory& territory) {
-  std::string out = "id = " + std::to_string(territory.id) + "\nname = " + territory.name + "\n";
-  for (unsigned i = 0; i < kSeparators; ++i) {
-    char16_t separator = territory.separators[i];
-    std::u16string text(separator == 0 ? 0 : 1, separator);
-    out += std::string(kSeparatorKeys[i]) + " = " + write_text(text, true) + "\n";
-  }
-  for (unsigned i = 0; i < kTerritoryTexts; ++i) {
-    bool quoted = is_sign(static_cast<TerritoryText>(i));
-    out += std::string(kTerritoryTextKeys[i]) + " = " + write_text(territory.texts[i], quoted) + "\n";
-  }
-  auto number = [&out](const char* key, unsigned value) {
-    out += std::string(key) + " = " + std::to_string(value) + "\n";
+  std::string out;
+  auto line = [&out](const char* key, const std::string& value) { out += std::string(key) + " = " + value + "\n"; };
+  auto number = [&line](const char* key, unsigned value) { line(key, std::to_string(value)); };
+  auto text = [&](TerritoryText which) {
+    line(kTerritoryTextKeys[static_cast<unsigned>(which)], write_text(territory.text(which), is_sign(which)));
   };
+  auto separator = [&](unsigned index) {
+    char16_t c = territory.separators[index];
+    line(kSeparatorKeys[index], write_text(std::u16string(c == 0 ? 0 : 1, c), true));
+  };
+  number("id", territory.id);
+  line("name", territory.name);
+  text(TerritoryText::abbreviation);
+  text(TerritoryText::own_name);
+  for (unsigned i : {0u, 1u, 2u}) separator(i);
+  text(TerritoryText::grouping);
   number("fraction-digits", territory.fraction_digits);
+  text(TerritoryText::currency);
+  text(TerritoryText::currency_intl);
+  for (unsigned i : {3u, 4u}) separator(i);
+  text(TerritoryText::monetary_grouping);
   number("mon-digits", territory.currency_digits);
   number("mon-digits-intl", territory.currency_intl_digits);
-  out += write_amount_form("positive", territory.positive);
-  out += write_amount_form("negative", territory.negative);
+  text(TerritoryText::positive_sign);
+  text(TerritoryText::negative_sign);
+  line("positive", write_amount_form(territory.positive));
+  line("negative", write_amount_form(territory.negative));
+  text(TerritoryText::time_format);
+  text(TerritoryText::short_date);
+  text(TerritoryText::long_date);
   number("item58", territory.item58);
   number("item82", territory.item82);
   number("item83", territory.item83);
