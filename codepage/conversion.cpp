@@ -184,20 +184,21 @@ uint32_t convert(LXConversion& handle, Input& input, Output& output) {
 // cut off, and the way back to the single-byte state.
 void finish_text(LXConversion& handle) {
   ConversionWatch watch(handle, nullptr, 0);
-  with_writer(page_of(handle.target), {true, handle.target_state}, handle.pending, sizeof handle.pending, [&](auto out) {
-    if (handle.held_return) out.put(out.code(0x0D));
-    if (handle.held_count != 0) {
-      LXConversionProblem problem = {handle.counts.bytes_in - handle.held_count, LX_PROBLEM_CUT, kUnassigned,
-                                     handle.held_count, {}};
-      std::memcpy(problem.bytes, handle.held, handle.held_count);
-      watch.add(problem);
-      if ((handle.options & LX_CONV_DISCARD) == 0) out.put(out.code(kUnassigned));
-    }
-    if constexpr (decltype(out)::kShifted) {
-      if (out.double_byte) *out.at++ = out.page->leave_byte;
-    }
-    handle.pending_count = static_cast<uint8_t>(out.at - out.begin);
-  });
+  with_writer(page_of(handle.target), {true, handle.target_state}, handle.pending, sizeof handle.pending,
+              [&](auto out) {
+                if (handle.held_return) out.put(out.code(0x0D));
+                if (handle.held_count != 0) {
+                  LXConversionProblem problem = {
+                      handle.counts.bytes_in - handle.held_count, LX_PROBLEM_CUT, kUnassigned, handle.held_count, {}};
+                  std::memcpy(problem.bytes, handle.held, handle.held_count);
+                  watch.add(problem);
+                  if ((handle.options & LX_CONV_DISCARD) == 0) out.put(out.code(kUnassigned));
+                }
+                if constexpr (decltype(out)::kShifted) {
+                  if (out.double_byte) *out.at++ = out.page->leave_byte;
+                }
+                handle.pending_count = static_cast<uint8_t>(out.at - out.begin);
+              });
   if (handle.source_state != 0) watch.add({handle.counts.bytes_in, LX_PROBLEM_SHIFT, kUnassigned, 0, {}});
   handle.held_return = false;
   handle.held_count = 0;
@@ -228,10 +229,17 @@ LXConversion* make_handle(LXLocale& target, LXLocale& source) {
 void ConversionWatch::add(const LXConversionProblem& problem) {
   LXConversionCounts& counts = handle_.counts;
   switch (problem.kind) {
-    case LX_PROBLEM_SUBSTITUTED: ++counts.substituted; break;
-    case LX_PROBLEM_MALFORMED: ++counts.malformed; break;
-    case LX_PROBLEM_SHIFT: ++counts.shifts; break;
-    default: ++counts.cut;
+    case LX_PROBLEM_SUBSTITUTED:
+      ++counts.substituted;
+      break;
+    case LX_PROBLEM_MALFORMED:
+      ++counts.malformed;
+      break;
+    case LX_PROBLEM_SHIFT:
+      ++counts.shifts;
+      break;
+    default:
+      ++counts.cut;
   }
   if (handle_.callback != nullptr) handle_.callback(handle_.context, &problem);
 }

@@ -108,8 +108,8 @@ class ConversionWatch {
 
   template <class In>
   void report(const In& in, uint16_t character, Kind kind) {
-    LXConversionProblem problem = {offset_of(in.start), LX_PROBLEM_SUBSTITUTED, character,
-                                   static_cast<uint8_t>(in.at - in.start), {}};
+    LXConversionProblem problem = {
+        offset_of(in.start), LX_PROBLEM_SUBSTITUTED, character, static_cast<uint8_t>(in.at - in.start), {}};
     if (kind == Kind::malformed) {
       problem.kind = LX_PROBLEM_MALFORMED;
       problem.unicode = kUnassigned;

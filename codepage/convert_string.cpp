@@ -35,18 +35,16 @@ OneShotResult convert_bytes(const CodePage& to, Shifts to_shifts, uint8_t* out, 
 }
 
 int32_t convert_string(const char* function, LXLocale* target_locale, char* out, Shifts to_shifts, int32_t out_size,
-                       LXLocale* source_locale, const char* in, Shifts from_shifts, int32_t in_length,
-                       uint32_t flags) {
-  return locale_call(trace_unit, function, target_locale, flags, kStringOptions, int32_t{-1},
-                     [&](LocaleCall& call) -> int32_t {
-                       const LXLocale* source = locale_or_default(source_locale);
-                       if (source == nullptr) return -1;
-                       const CodePage& from = page_of(*source);
-                       return convert_bytes(page_of(call.locale), to_shifts, bytes_of(out),
-                                            Target(out, out_size, flags), from, from_shifts,
-                                            byte_source(from, in, from_shifts.state, in_length, flags))
-                           .count;
-                     });
+                       LXLocale* source_locale, const char* in, Shifts from_shifts, int32_t in_length, uint32_t flags) {
+  return locale_call(
+      trace_unit, function, target_locale, flags, kStringOptions, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
+        const LXLocale* source = locale_or_default(source_locale);
+        if (source == nullptr) return -1;
+        const CodePage& from = page_of(*source);
+        return convert_bytes(page_of(call.locale), to_shifts, bytes_of(out), Target(out, out_size, flags), from,
+                             from_shifts, byte_source(from, in, from_shifts.state, in_length, flags))
+            .count;
+      });
 }
 
 }  // namespace

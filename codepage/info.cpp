@@ -12,8 +12,8 @@ extern "C" uint32_t LXGetCodePageInfo(const LXObjEntry* code_page, LXCodePageInf
     return LX_E_ARGUMENT;
   }
   const CodePage& page = code_page_of(*code_page);
-  *info = {code_page->id, page.max_length, page.substitution, {}, page.ascii_family, page.shift_sensitive,
-           page.enter_byte, page.leave_byte};
+  *info = {code_page->id,     page.max_length,      page.substitution, {},
+           page.ascii_family, page.shift_sensitive, page.enter_byte,   page.leave_byte};
   std::memcpy(info->line_bytes, page.raw.header->line_bytes, sizeof info->line_bytes);
   return LX_OK;
 }

@@ -54,8 +54,8 @@ struct Target {
 };
 
 struct OneShotResult {
-  int32_t count;      // units or characters written, the terminator included
-  size_t consumed;    // units of the source
+  int32_t count;    // units or characters written, the terminator included
+  size_t consumed;  // units of the source
 };
 
 // Cuts the text behind its first `limit` characters; returns how many it has. `all`: nothing was cut off.

@@ -23,7 +23,7 @@ struct NoWatch {
   static constexpr bool each_character() { return false; }
 };
 
-// ---- Runs of ASCII -------------------------------------------------------------------------------------------------
+// ---- Runs of ASCII ----
 
 // How ASCII stands in a byte text: as itself, through a table, or not in a way that a run can use.
 struct AsciiForm {
@@ -67,8 +67,8 @@ void carry_ascii(In& in, Out& out) {
     size_t room = std::min(in.left(), out.room());
     size_t done = 0;
     if (from.way == AsciiForm::itself) {
-      done = to.way == AsciiForm::itself ? copy_ascii(in.at, room, out.at)
-                                         : map_from_ascii(to.table, in.at, room, out.at);
+      done =
+          to.way == AsciiForm::itself ? copy_ascii(in.at, room, out.at) : map_from_ascii(to.table, in.at, room, out.at);
     } else if (to.way == AsciiForm::itself) {
       done = map_to_ascii(from.table, in.at, room, out.at);
     }
@@ -96,7 +96,7 @@ bool carry_mapped(In&, Out&, const Watch&) {
   return false;
 }
 
-// ---- Single characters ----------------------------------------------------------------------------------------------
+// ---- Single characters ----
 
 // Carries well-formed characters that a watch need not see, as many as surely fit. True: a run of ASCII follows.
 template <class In, class Out, class Watch>
@@ -149,9 +149,12 @@ Stop carry_one(In& in, Out& out, Watch& watch) {
   }
   if constexpr (Watch::kWatching && In::kShifted) watch.note_odd_shift(in);
   switch (got) {
-    case Got::end: return Stop::done;
-    case Got::partial: return Stop::partial;
-    default: return Stop::none;
+    case Got::end:
+      return Stop::done;
+    case Got::partial:
+      return Stop::partial;
+    default:
+      return Stop::none;
   }
 }
 
@@ -176,10 +179,14 @@ Stop transfer(In& in, Out& out) {
     In mark = in;
     uint32_t value = 0;
     switch (in.next_packed(value)) {
-      case Got::end: return Stop::done;
-      case Got::partial: return Stop::partial;
-      case Got::shift: continue;
-      case Got::character: break;
+      case Got::end:
+        return Stop::done;
+      case Got::partial:
+        return Stop::partial;
+      case Got::shift:
+        continue;
+      case Got::character:
+        break;
     }
     if (!out.fits(value)) {
       in = mark;

@@ -55,9 +55,8 @@ extern "C" {
 
 int32_t LXStringToUnicode(LXLocale* locale, LXUChar* out, int32_t out_size, const char* in, int32_t in_length,
                           uint32_t flags) noexcept {
-  return string_call(__func__, locale, flags, [&](const CodePage& page) {
-    return to_unicode(page, out, out_size, in, {}, in_length, flags);
-  });
+  return string_call(__func__, locale, flags,
+                     [&](const CodePage& page) { return to_unicode(page, out, out_size, in, {}, in_length, flags); });
 }
 
 int32_t LXStringToUnicodeEx(LXLocale* locale, LXUChar* out, int32_t out_size, const char* in, uint32_t shift_state,
@@ -79,9 +78,8 @@ int32_t LXStringToUnicodeW(LXLocale* locale, LXUChar* out, int32_t out_size, con
 
 int32_t LXUnicodeToString(LXLocale* locale, char* out, int32_t out_size, const LXUChar* in, int32_t in_length,
                           uint32_t flags) noexcept {
-  return string_call(__func__, locale, flags, [&](const CodePage& page) {
-    return from_unicode(page, out, {}, out_size, in, in_length, flags);
-  });
+  return string_call(__func__, locale, flags,
+                     [&](const CodePage& page) { return from_unicode(page, out, {}, out_size, in, in_length, flags); });
 }
 
 int32_t LXUnicodeToStringEx(LXLocale* locale, char* out, uint32_t shift_state, int32_t out_size, const LXUChar* in,

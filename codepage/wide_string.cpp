@@ -41,9 +41,8 @@ OneShotResult unpack_text(const CodePage& page, char* out, Shifts shifts, int32_
 
 template <class Body>
 int32_t wide_call(const char* function, LXLocale* locale, uint32_t flags, Body body) {
-  return locale_call(
-      trace_unit, function, locale, flags, kStringOptions, int32_t{-1},
-      [&](LocaleCall& call) -> int32_t { return body(code_page_of(*call.locale.code_page)).count; });
+  return locale_call(trace_unit, function, locale, flags, kStringOptions, int32_t{-1},
+                     [&](LocaleCall& call) -> int32_t { return body(code_page_of(*call.locale.code_page)).count; });
 }
 
 }  // namespace
@@ -55,9 +54,8 @@ extern "C" {
 
 int32_t LXMbToWide(LXLocale* locale, LXWChar* out, int32_t out_size, const char* in, int32_t in_length,
                    uint32_t flags) noexcept {
-  return wide_call(__func__, locale, flags, [&](const CodePage& page) {
-    return pack_text(page, out, out_size, in, {}, in_length, flags);
-  });
+  return wide_call(__func__, locale, flags,
+                   [&](const CodePage& page) { return pack_text(page, out, out_size, in, {}, in_length, flags); });
 }
 
 int32_t LXMbToWideEx(LXLocale* locale, LXWChar* out, int32_t out_size, const char* in, uint32_t shift_state,
@@ -69,9 +67,8 @@ int32_t LXMbToWideEx(LXLocale* locale, LXWChar* out, int32_t out_size, const cha
 
 int32_t LXWideToMb(LXLocale* locale, char* out, int32_t out_size, const LXWChar* in, int32_t in_length,
                    uint32_t flags) noexcept {
-  return wide_call(__func__, locale, flags, [&](const CodePage& page) {
-    return unpack_text(page, out, {}, out_size, in, in_length, flags);
-  });
+  return wide_call(__func__, locale, flags,
+                   [&](const CodePage& page) { return unpack_text(page, out, {}, out_size, in, in_length, flags); });
 }
 
 int32_t LXWideToMbEx(LXLocale* locale, char* out, uint32_t shift_state, int32_t out_size, const LXWChar* in,

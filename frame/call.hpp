@@ -13,9 +13,10 @@ inline bool traces(const TRC1_Unit& unit, uint32_t levels) {
 }
 
 // Messages of the module whose unit is called trace_unit; arguments are evaluated only when the level is on.
-#define LX_TRACE(level, ...)                                                                      \
-  do {                                                                                            \
-    if (lx::traces(trace_unit, (level))) [[unlikely]] TRC1_Printf(&trace_unit, __LINE__, __VA_ARGS__); \
+#define LX_TRACE(level, ...)                           \
+  do {                                                 \
+    if (lx::traces(trace_unit, (level))) [[unlikely]]  \
+      TRC1_Printf(&trace_unit, __LINE__, __VA_ARGS__); \
   } while (false)
 
 template <class Result>
@@ -31,10 +32,12 @@ intptr_t trace_value(Result result) {
 template <class Body>
 auto exported(TRC1_Unit& unit, const char* function, Body body, int32_t line = __builtin_LINE()) {
   TRC1_Sync(&unit);
-  if (traces(unit, TRC1_LEVEL_FLOW)) [[unlikely]] TRC1_Event(&unit, line, TRC1_ENTRY, function, 0);
+  if (traces(unit, TRC1_LEVEL_FLOW)) [[unlikely]]
+    TRC1_Event(&unit, line, TRC1_ENTRY, function, 0);
   if constexpr (std::is_void_v<decltype(body())>) {
     body();
-    if (traces(unit, TRC1_LEVEL_FLOW)) [[unlikely]] TRC1_Event(&unit, line, TRC1_EXIT, function, 0);
+    if (traces(unit, TRC1_LEVEL_FLOW)) [[unlikely]]
+      TRC1_Event(&unit, line, TRC1_EXIT, function, 0);
   } else {
     auto result = body();
     if (traces(unit, TRC1_LEVEL_FLOW)) [[unlikely]] {

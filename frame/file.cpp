@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 // Data files: the operating system's descriptor calls with the library's status codes, and safe replacement of a file.
-#include <cerrno>
-#include <cstring>
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <cerrno>
+#include <cstring>
 
 #include "frame/call.hpp"
 #include "frame/memory.hpp"
@@ -46,9 +46,12 @@ namespace {
 
 uint32_t open_error(int error) {
   switch (error) {
-    case ENOENT: return LX_E_NOFILE;
-    case EACCES: return LX_E_ACCESS;
-    default: return LX_E_OPEN;
+    case ENOENT:
+      return LX_E_NOFILE;
+    case EACCES:
+      return LX_E_ACCESS;
+    default:
+      return LX_E_OPEN;
   }
 }
 
@@ -92,10 +95,14 @@ uint32_t open_existing(LXFile& file, const char* path, int how) {
 
 uint32_t open_by_mode(LXFile& file, const char* path, bool no_temporary) {
   switch (file.mode) {
-    case kRead: return open_existing(file, path, O_RDONLY);
-    case kReadWrite: return open_existing(file, path, O_RDWR);
-    case kCreate: return create_file(file, path, no_temporary);
-    default: return LX_OK;
+    case kRead:
+      return open_existing(file, path, O_RDONLY);
+    case kReadWrite:
+      return open_existing(file, path, O_RDWR);
+    case kCreate:
+      return create_file(file, path, no_temporary);
+    default:
+      return LX_OK;
   }
 }
 
@@ -187,10 +194,14 @@ uint32_t LXSeekFile(LXFile* handle, int32_t offset, uint32_t origin) noexcept {
     if (handle == nullptr) return 1;
     handle->at_end = 0;
     switch (origin) {
-      case LX_SEEK_SET: return lseek(handle->descriptor, offset, SEEK_SET) < 0 ? 1 : 0;
-      case LX_SEEK_CUR: return lseek(handle->descriptor, offset, SEEK_CUR) < 0 ? 1 : 0;
-      case LX_SEEK_END: return lseek(handle->descriptor, offset, SEEK_END) < 0 ? 1 : 0;
-      default: return 1;
+      case LX_SEEK_SET:
+        return lseek(handle->descriptor, offset, SEEK_SET) < 0 ? 1 : 0;
+      case LX_SEEK_CUR:
+        return lseek(handle->descriptor, offset, SEEK_CUR) < 0 ? 1 : 0;
+      case LX_SEEK_END:
+        return lseek(handle->descriptor, offset, SEEK_END) < 0 ? 1 : 0;
+      default:
+        return 1;
     }
   });
 }

@@ -86,9 +86,7 @@ uint32_t stop() {
 
 }  // namespace
 
-LXGlobals* live_globals() {
-  return life.load(std::memory_order_acquire) == Life::running ? lxglobals : nullptr;
-}
+LXGlobals* live_globals() { return life.load(std::memory_order_acquire) == Life::running ? lxglobals : nullptr; }
 
 }  // namespace lx
 

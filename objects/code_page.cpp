@@ -120,7 +120,8 @@ void fill_to_unicode(CodePage& page, const StateNumbers& numbers, uint16_t* node
     if ((number & CodePage::kNode) != 0) {
       uint16_t* node = nodes + (number & ~unsigned{CodePage::kNode}) * kPageSize;
       std::memset(node, 0, kPageSize * sizeof *node);
-      for (unsigned byte = step.low; byte <= step.high; ++byte) node[byte] = numbers.at(step.index + (byte & step.mask));
+      for (unsigned byte = step.low; byte <= step.high; ++byte)
+        node[byte] = numbers.at(step.index + (byte & step.mask));
     } else {
       uint16_t* row = rows + number * kPageSize;
       for (unsigned byte = 0; byte < 256; ++byte) {

@@ -22,8 +22,8 @@ struct CheckedCodePage {
   const ToUnicodeState* states;  // null on pages without multibyte characters
   const uint8_t* to_unicode_array;
   uint32_t state_count;
-  const uint8_t* values;      // section 3
-  const uint8_t* high_parts;  // section 4
+  const uint8_t* values;         // section 3
+  const uint8_t* high_parts;     // section 4
   const TypeState* type_states;  // null: absent
   const TypeEntry* type_entries;
   uint32_t type_entry_count;
@@ -42,11 +42,11 @@ struct CodePage {
   bool shift_sensitive;
   bool ascii_family;
   PageKind kind;
-  bool ascii_bytes;     // 00-7F are the ASCII characters, both ways
-  bool ascii_complete;  // every ASCII character is one byte of the page
-  bool standard_utf8;  // UTF-8 whose length table is the usual one
-  uint8_t char_length[256];  // by first byte; never 0, so that every walk ends
-  uint16_t to_unicode[256];  // of one-byte characters
+  bool ascii_bytes;            // 00-7F are the ASCII characters, both ways
+  bool ascii_complete;         // every ASCII character is one byte of the page
+  bool standard_utf8;          // UTF-8 whose length table is the usual one
+  uint8_t char_length[256];    // by first byte; never 0, so that every walk ends
+  uint16_t to_unicode[256];    // of one-byte characters
   uint32_t utf8_of_byte[256];  // the same in UTF-8, first byte lowest; the top byte counts the bytes
   uint8_t ascii_of_byte[256];  // the same as one byte; 0x80: not an ASCII character, or a shift byte
   uint8_t byte_of_ascii[128];  // of U+0000-U+007F, the lowest byte of the packed character

@@ -10,8 +10,8 @@ namespace lx {
 
 inline constexpr uint16_t kUcs2Id = 1200;
 inline constexpr uint16_t kUtf8Id = 57352;
-inline constexpr uint16_t kUnassigned = 0xFFFD;        // to-Unicode value of bytes that are no character
-inline constexpr uint32_t kUnassignedType = 1024;      // character-type word of the same
+inline constexpr uint16_t kUnassigned = 0xFFFD;    // to-Unicode value of bytes that are no character
+inline constexpr uint32_t kUnassignedType = 1024;  // character-type word of the same
 inline constexpr unsigned kMaxCharacterLength = 4;
 
 inline constexpr uint16_t kAsciiFamily = 1;  // flags of section 1
@@ -36,7 +36,8 @@ struct FromUnicodeKind {
   uint8_t high_part_shift;
   uint8_t character_length;
 };
-inline constexpr FromUnicodeKind kFromUnicodeKinds[] = {{1, 0, 0, 1}, {2, 0, 0, 2}, {2, 1, 16, 3}, {2, 2, 16, 4}, {1, 1, 8, 2}};
+inline constexpr FromUnicodeKind kFromUnicodeKinds[] = {
+    {1, 0, 0, 1}, {2, 0, 0, 2}, {2, 1, 16, 3}, {2, 2, 16, 4}, {1, 1, 8, 2}};
 inline constexpr unsigned kFromUnicodeKindCount = sizeof kFromUnicodeKinds / sizeof kFromUnicodeKinds[0];
 
 // What both layouts of section 1 share, in one piece of the current one.
@@ -45,8 +46,8 @@ struct CodePageHeader {
   uint8_t line_bytes[4];
   uint8_t max_length;
   BeU16 half_to_full_count;
-  uint8_t enter_byte;  // begins a double-byte run of a shift-sensitive page,
-  uint8_t leave_byte;  // and ends it
+  uint8_t enter_byte;        // begins a double-byte run of a shift-sensitive page,
+  uint8_t leave_byte;        // and ends it
   uint8_t char_length[256];  // by first byte; 0: begins no character
   uint8_t upper[256];        // other case of one-byte characters
   uint8_t lower[256];
@@ -55,7 +56,7 @@ struct CodePageHeader {
   BeU32 types[256];
   FromUnicodePage from_unicode[256];  // by high byte
   BeU16 flags;
-  BeU16 full_width;    // offsets from the start of the section; 0 on single-byte pages
+  BeU16 full_width;  // offsets from the start of the section; 0 on single-byte pages
   BeU16 half_to_full;
   BeU16 type_states;
   BeU16 type_entries;

@@ -94,10 +94,17 @@ uint32_t check_code_page_object(const LXObjEntry& entry, const FileHeader& heade
 uint32_t check_object(const LXObjEntry& entry, const FileHeader& header, Loading& loading) {
   const char* wrong = nullptr;
   switch (entry.type) {
-    case LX_LANGUAGE: wrong = check_language(loading.bytes(0)); break;
-    case LX_TERRITORY: wrong = check_territory(loading.bytes(0)); break;
-    case LX_CODEPAGE: return check_code_page_object(entry, header, loading);
-    default: wrong = loading.sizes[0] >= kSortHeaderSize ? nullptr : "section 1 size"; break;
+    case LX_LANGUAGE:
+      wrong = check_language(loading.bytes(0));
+      break;
+    case LX_TERRITORY:
+      wrong = check_territory(loading.bytes(0));
+      break;
+    case LX_CODEPAGE:
+      return check_code_page_object(entry, header, loading);
+    default:
+      wrong = loading.sizes[0] >= kSortHeaderSize ? nullptr : "section 1 size";
+      break;
   }
   return wrong == nullptr ? LX_OK : corrupted(entry, wrong);
 }

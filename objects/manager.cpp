@@ -31,7 +31,8 @@ LXObjEntry* deliver(LXObjMgr& manager, LXObjEntry& entry, bool no_load, uint32_t
 LXObjEntry* find_by_name(LXObjMgr& manager, uint8_t type, const char* name, size_t length) {
   for (uint16_t i = manager.first[type]; i < manager.first[type + 1]; ++i) {
     LXObjEntry& entry = manager.entries[i];
-    if (length_matches(length, std::strlen(entry.name)) && compare_ignoring_case(name, entry.name, length) == 0) return &entry;
+    if (length_matches(length, std::strlen(entry.name)) && compare_ignoring_case(name, entry.name, length) == 0)
+      return &entry;
   }
   return nullptr;
 }
@@ -73,8 +74,7 @@ LXObjMgr* LXInitObjManager(const char* directory, uint32_t options, uint32_t* rc
     set_status(rc, LX_OK);
     auto manager = Owned<LXObjMgr>::zeroed();
     if (!manager) {
-      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for object manager",
-               static_cast<int>(sizeof(LXObjMgr)));
+      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for object manager", static_cast<int>(sizeof(LXObjMgr)));
       set_status(rc, LX_E_MEMORY);
       return nullptr;
     }

@@ -33,11 +33,11 @@ struct SpecialPair {
 static_assert(sizeof(SpecialPair) == 8);
 
 // Flag word of a territory.
-inline constexpr uint16_t kTerritoryYesNo = 0x01;              // item 58
-inline constexpr uint16_t kPositiveSymbolPrecedes = 0x02;      // 73
-inline constexpr uint16_t kPositiveSymbolSpaced = 0x04;        // 74
-inline constexpr uint16_t kNegativeSymbolPrecedes = 0x08;      // 75
-inline constexpr uint16_t kNegativeSymbolSpaced = 0x10;        // 76
+inline constexpr uint16_t kTerritoryYesNo = 0x01;          // item 58
+inline constexpr uint16_t kPositiveSymbolPrecedes = 0x02;  // 73
+inline constexpr uint16_t kPositiveSymbolSpaced = 0x04;    // 74
+inline constexpr uint16_t kNegativeSymbolPrecedes = 0x08;  // 75
+inline constexpr uint16_t kNegativeSymbolSpaced = 0x10;    // 76
 inline constexpr uint16_t kYesNo82 = 0x20;
 inline constexpr uint16_t kYesNo83 = 0x40;
 
@@ -58,10 +58,10 @@ enum class TerritoryText : unsigned {
 inline constexpr unsigned kTerritoryTexts = 11;
 
 struct TerritoryHeader {
-  BeU16 separators[5];  // items 59, 60, 61, 66, 67: decimal, thousands, third, monetary decimal, monetary thousands
-  BeU16 fraction_digits;       // item 63
-  BeU16 currency_digits;       // 69
-  BeU16 currency_intl_digits;  // 70
+  BeU16 separators[5];    // items 59, 60, 61, 66, 67: decimal, thousands, third, monetary decimal, monetary thousands
+  BeU16 fraction_digits;  // item 63
+  BeU16 currency_digits;  // 69
+  BeU16 currency_intl_digits;      // 70
   uint8_t positive_sign_position;  // 77
   uint8_t negative_sign_position;  // 78
   BeU16 value84;

@@ -108,7 +108,8 @@ constexpr size_t kWorthwhile = 64;
 
 #define LX_BLOCKS(call) (count >= kWorthwhile && has_avx2() ? (call) : 0)
 #else
-#define LX_BLOCKS(call) size_t{0}
+#define LX_BLOCKS(call) \
+  size_t { 0 }
 #endif
 
 }  // namespace

@@ -89,7 +89,8 @@ struct MultibyteReader : ByteReader {
     size_t length = page->char_length[*at];
     if (!take(length)) return Got::partial;
     character = length == 1 ? page->to_unicode[*start] : page->decode(start);
-    if (character == kUnassigned && strict && length > 1) [[unlikely]] at = start + well_formed_prefix();
+    if (character == kUnassigned && strict && length > 1) [[unlikely]]
+      at = start + well_formed_prefix();
     return Got::character;
   }
   Got next_packed(uint32_t& value) {

@@ -22,9 +22,12 @@ template <class Use>
 auto with_reader(const CodePage& page, Shifts shifts, const uint8_t* text, size_t length, Use use) {
   if (shifts.followed && page.shift_sensitive) return use(ShiftedReader(page, text, length, shifts.state));
   switch (page.kind) {
-    case PageKind::single: return use(SingleByteReader(page, text, length));
-    case PageKind::utf8: return use(Utf8Reader(page, text, length));
-    default: return use(MultibyteReader(page, text, length));
+    case PageKind::single:
+      return use(SingleByteReader(page, text, length));
+    case PageKind::utf8:
+      return use(Utf8Reader(page, text, length));
+    default:
+      return use(MultibyteReader(page, text, length));
   }
 }
 

@@ -19,8 +19,10 @@
 
 #if defined(__GNUC__)
 #define LX_API __attribute__((visibility("default")))
+#define LX_PRINTF(text, first) __attribute__((format(printf, text, first)))
 #else
 #define LX_API
+#define LX_PRINTF(text, first)
 #endif
 
 #ifdef __cplusplus
@@ -30,7 +32,7 @@ extern "C" {
 #define LX_NOEXCEPT
 #endif
 
-/* ---- Types ---------------------------------------------------------------------------------------------------- */
+/* ---- Types ---- */
 
 typedef uint16_t LXUChar; /* U text: one UCS-2 unit, machine order */
 typedef uint32_t LXWChar; /* W text: the bytes of one character of the locale's code page, packed big-endian */
@@ -47,38 +49,38 @@ typedef struct LXCharType {
   int32_t delta;  /* added to the character's packed value it gives the other case */
 } LXCharType;
 
-typedef void *(*LXAllocFn)(void *context, size_t size); /* null: no memory */
-typedef int (*LXFreeFn)(void *context, void *block);    /* non-zero: success */
-typedef int32_t (*LXEnumFn)(void *context, uint8_t type, const char *name); /* 0 stops the enumeration */
-typedef int32_t (*LXEnumWFn)(void *context, uint8_t type, const LXWChar *name);
-typedef int32_t (*LXEnumUFn)(void *context, uint8_t type, const LXUChar *name);
+typedef void* (*LXAllocFn)(void* context, size_t size);                     /* null: no memory */
+typedef int (*LXFreeFn)(void* context, void* block);                        /* non-zero: success */
+typedef int32_t (*LXEnumFn)(void* context, uint8_t type, const char* name); /* 0 stops the enumeration */
+typedef int32_t (*LXEnumWFn)(void* context, uint8_t type, const LXWChar* name);
+typedef int32_t (*LXEnumUFn)(void* context, uint8_t type, const LXUChar* name);
 
-/* ---- Status codes --------------------------------------------------------------------------------------------- */
+/* ---- Status codes ---- */
 
-#define LX_OK 0u             /* success */
-#define LX_E_OPEN 1u         /* a file could not be opened or closed */
-#define LX_E_ARGUMENT 2u     /* invalid argument or option bits */
-#define LX_E_DEFAULTS 10u    /* initialised, but running on the built-in objects */
-#define LX_E_MANAGER 11u     /* the object manager could not be created, or a lookup failed */
-#define LX_E_MEMORY 20u      /* out of memory */
-#define LX_E_FREE 21u        /* the free callback reported failure */
-#define LX_E_CODEPAGE 30u    /* code page not found */
-#define LX_E_LANGUAGE 31u    /* language not found */
-#define LX_E_NATIVE 32u      /* the locale has no native name */
-#define LX_E_SORT 33u        /* sort not found */
-#define LX_E_TERRITORY 34u   /* territory not found */
-#define LX_E_ITEM 35u        /* unknown item number */
-#define LX_E_NOTFOUND 37u    /* object not found, or a value out of range */
-#define LX_E_BUFFER 40u      /* output buffer too small */
-#define LX_E_FULL 52u        /* conversion: output full, input pending */
-#define LX_E_PARTIAL 53u     /* conversion: the input ends inside a character */
-#define LX_E_NOFILE 1000u    /* file not found */
-#define LX_E_ACCESS 1001u    /* permission denied */
-#define LX_E_READMODE 1002u  /* read from a file opened for writing */
-#define LX_E_FILE 1003u      /* file name too long, or seek or read failure */
-#define LX_E_HEADER 2000u    /* data file corrupted */
+#define LX_OK 0u            /* success */
+#define LX_E_OPEN 1u        /* a file could not be opened or closed */
+#define LX_E_ARGUMENT 2u    /* invalid argument or option bits */
+#define LX_E_DEFAULTS 10u   /* initialised, but running on the built-in objects */
+#define LX_E_MANAGER 11u    /* the object manager could not be created, or a lookup failed */
+#define LX_E_MEMORY 20u     /* out of memory */
+#define LX_E_FREE 21u       /* the free callback reported failure */
+#define LX_E_CODEPAGE 30u   /* code page not found */
+#define LX_E_LANGUAGE 31u   /* language not found */
+#define LX_E_NATIVE 32u     /* the locale has no native name */
+#define LX_E_SORT 33u       /* sort not found */
+#define LX_E_TERRITORY 34u  /* territory not found */
+#define LX_E_ITEM 35u       /* unknown item number */
+#define LX_E_NOTFOUND 37u   /* object not found, or a value out of range */
+#define LX_E_BUFFER 40u     /* output buffer too small */
+#define LX_E_FULL 52u       /* conversion: output full, input pending */
+#define LX_E_PARTIAL 53u    /* conversion: the input ends inside a character */
+#define LX_E_NOFILE 1000u   /* file not found */
+#define LX_E_ACCESS 1001u   /* permission denied */
+#define LX_E_READMODE 1002u /* read from a file opened for writing */
+#define LX_E_FILE 1003u     /* file name too long, or seek or read failure */
+#define LX_E_HEADER 2000u   /* data file corrupted */
 
-/* ---- Object types, identifiers, option bits --------------------------------------------------------------------- */
+/* ---- Object types, identifiers, option bits ---- */
 
 #define LX_LANGUAGE 0u
 #define LX_TERRITORY 1u
@@ -110,11 +112,11 @@ typedef int32_t (*LXEnumUFn)(void *context, uint8_t type, const LXUChar *name);
 #define LX_CT_CNTRL 0x100u
 #define LX_CT_ASCII 0x200u
 
-/* ---- Library state ---------------------------------------------------------------------------------------------- */
+/* ---- Library state ---- */
 
 /* Read-only for callers. lxglobals keeps its value after the last LXTerm, though the area is gone. */
-extern LX_API LXGlobals *lxglobals;
-extern LX_API LXLocale *lxglocale;
+extern LX_API LXGlobals* lxglobals;
+extern LX_API LXLocale* lxglocale;
 extern LX_API LXAllocFn lxalloc_cbk;
 extern LX_API LXFreeFn lxfree_cbk;
 
@@ -125,39 +127,39 @@ extern LX_API LXFreeFn lxfree_cbk;
  * callbacks count. `options`: LX_INIT_NO_DEFAULTS or 0. The first call of a process must not race with another.
  * Returns 0, LX_E_DEFAULTS (usable, on built-in English/UnitedStates/US-ASCII), LX_E_MANAGER or LX_E_MEMORY.
  */
-LX_API uint32_t LXInit(const char *directory, LXAllocFn alloc_cbk, LXFreeFn free_cbk, void *alloc_context,
+LX_API uint32_t LXInit(const char* directory, LXAllocFn alloc_cbk, LXFreeFn free_cbk, void* alloc_context,
                        uint32_t options) LX_NOEXCEPT;
 /* Ends one use; the last one releases the default locale and every loaded object. Returns 0 or the first error. */
 LX_API uint32_t LXTerm(void) LX_NOEXCEPT;
 /* The status of the last operation on the locale; LX_E_ARGUMENT when there is neither locale nor default. */
-LX_API uint32_t LXGetError(const LXLocale *locale) LX_NOEXCEPT;
+LX_API uint32_t LXGetError(const LXLocale* locale) LX_NOEXCEPT;
 /* The default allocation callbacks: malloc and free. */
-LX_API void *LXDefAlloc(void *context, size_t size) LX_NOEXCEPT;
-LX_API int LXDefFree(void *context, void *block) LX_NOEXCEPT;
+LX_API void* LXDefAlloc(void* context, size_t size) LX_NOEXCEPT;
+LX_API int LXDefFree(void* context, void* block) LX_NOEXCEPT;
 /* Bytes that the variable's value needs with its terminator, 0 when it is not set; copied only when it fits. */
-LX_API int32_t LXGetEnv(const char *name, char *buffer, int32_t buffer_size) LX_NOEXCEPT;
+LX_API int32_t LXGetEnv(const char* name, char* buffer, int32_t buffer_size) LX_NOEXCEPT;
 /* The data directory from LX_LOCALEDIR (use_default 0: length with terminator, 0 does not fit, -1 not set) or the
    built-in one (17 when 17 bytes fit, else 0). */
-LX_API int32_t LXGetDataLocation(char *buffer, int32_t buffer_size, int32_t use_default) LX_NOEXCEPT;
+LX_API int32_t LXGetDataLocation(char* buffer, int32_t buffer_size, int32_t use_default) LX_NOEXCEPT;
 /* "DIRECTORY/control.nls" in the buffer, or null when it does not fit. */
-LX_API char *LXGetControlFileName(const char *directory, char *buffer, int32_t buffer_size) LX_NOEXCEPT;
+LX_API char* LXGetControlFileName(const char* directory, char* buffer, int32_t buffer_size) LX_NOEXCEPT;
 /* "DIRECTORY/cp_00037.nls" and the like in the buffer, or null when it does not fit or the type is unknown. */
-LX_API char *LXGetDataFileName(const char *directory, uint8_t object_type, uint16_t object_id, char *buffer,
+LX_API char* LXGetDataFileName(const char* directory, uint8_t object_type, uint16_t object_id, char* buffer,
                                int32_t buffer_size) LX_NOEXCEPT;
 /* Compares bytes without regard to ASCII case; does not stop at a zero byte. */
-LX_API int LXmemicmp(const void *a, const void *b, size_t count) LX_NOEXCEPT;
+LX_API int LXmemicmp(const void* a, const void* b, size_t count) LX_NOEXCEPT;
 
-/* ---- Paths and files -------------------------------------------------------------------------------------------- */
+/* ---- Paths and files ---- */
 
 /* Parts of a path, terminated; absent or too long parts are empty. Each returns the length copied. */
-LX_API int32_t SplitDrive(const char *path, char *drive) LX_NOEXCEPT;        /* drive[4] */
-LX_API int32_t SplitDir(const char *path, char *directory) LX_NOEXCEPT;      /* directory[256], with its last "/" */
-LX_API int32_t SplitFile(const char *path, char *file) LX_NOEXCEPT;          /* file[15], without extension */
-LX_API int32_t SplitExtent(const char *path, char *extension) LX_NOEXCEPT;   /* extension[5], with its dot */
-LX_API void SplitPath(const char *path, char *drive, char *directory, char *file, char *extension) LX_NOEXCEPT;
+LX_API int32_t SplitDrive(const char* path, char* drive) LX_NOEXCEPT;      /* drive[4] */
+LX_API int32_t SplitDir(const char* path, char* directory) LX_NOEXCEPT;    /* directory[256], with its last "/" */
+LX_API int32_t SplitFile(const char* path, char* file) LX_NOEXCEPT;        /* file[15], without extension */
+LX_API int32_t SplitExtent(const char* path, char* extension) LX_NOEXCEPT; /* extension[5], with its dot */
+LX_API void SplitPath(const char* path, char* drive, char* directory, char* file, char* extension) LX_NOEXCEPT;
 /* Joins the parts as they are: no separator or dot is added. `result` must have room for all of them. */
-LX_API void MakePath(char *result, const char *drive, const char *directory, const char *file,
-                     const char *extension) LX_NOEXCEPT;
+LX_API void MakePath(char* result, const char* drive, const char* directory, const char* file,
+                     const char* extension) LX_NOEXCEPT;
 
 /*
  * Opens a file: open_mode 0 reads, 1 creates or replaces, 2 reads and writes. Mode 1 on an existing file writes
@@ -165,21 +167,21 @@ LX_API void MakePath(char *result, const char *drive, const char *directory, con
  * Null with rc LX_E_MEMORY, LX_E_NOFILE, LX_E_ACCESS, LX_E_OPEN or LX_E_FILE. A mode-1 file that cannot be created
  * still yields a handle: its failure shows when it is closed.
  */
-LX_API LXFile *LXOpenFile(uint32_t access_mode, const char *path, uint8_t open_mode, int32_t no_temporary,
-                          uint32_t *rc) LX_NOEXCEPT;
+LX_API LXFile* LXOpenFile(uint32_t access_mode, const char* path, uint8_t open_mode, int32_t no_temporary,
+                          uint32_t* rc) LX_NOEXCEPT;
 /* Closes and frees the handle; `discard` drops the temporary. 1 on failure; a failed close keeps the handle. */
-LX_API uint32_t LXCloseFile(LXFile *handle, int32_t discard) LX_NOEXCEPT;
+LX_API uint32_t LXCloseFile(LXFile* handle, int32_t discard) LX_NOEXCEPT;
 /* Bytes read; 0 with rc 0 at the end of the file. */
-LX_API uint32_t LXReadFile(LXFile *handle, void *buffer, uint32_t count, uint32_t *rc) LX_NOEXCEPT;
+LX_API uint32_t LXReadFile(LXFile* handle, void* buffer, uint32_t count, uint32_t* rc) LX_NOEXCEPT;
 /* 0 or 1; origin is LX_SEEK_SET, LX_SEEK_CUR or LX_SEEK_END. */
-LX_API uint32_t LXSeekFile(LXFile *handle, int32_t offset, uint32_t origin) LX_NOEXCEPT;
+LX_API uint32_t LXSeekFile(LXFile* handle, int32_t offset, uint32_t origin) LX_NOEXCEPT;
 /* A new block with `size` bytes of the file, freed with LXUnloadFile; null for size 0 (rc 0) and on failure. */
-LX_API void *LXLoadFile(LXFile *handle, uint32_t offset, uint32_t size, uint32_t *rc) LX_NOEXCEPT;
-LX_API uint32_t LXUnloadFile(void *buffer) LX_NOEXCEPT; /* always 0 */
+LX_API void* LXLoadFile(LXFile* handle, uint32_t offset, uint32_t size, uint32_t* rc) LX_NOEXCEPT;
+LX_API uint32_t LXUnloadFile(void* buffer) LX_NOEXCEPT; /* always 0 */
 /* Size in bytes; -1 when unknown or above 2 GiB - 1. */
-LX_API int32_t LXFileSize(LXFile *handle) LX_NOEXCEPT;
+LX_API int32_t LXFileSize(LXFile* handle) LX_NOEXCEPT;
 
-/* ---- Locale data objects ---------------------------------------------------------------------------------------- */
+/* ---- Locale data objects ---- */
 
 /* Images of section 1 (LXDefCP3: section 3) of the built-in objects, in file order (big-endian). */
 extern LX_API const uint8_t LXDefaultLanguage[];
@@ -188,40 +190,40 @@ extern LX_API const uint8_t LXDefaultCodePage[4376];
 extern LX_API const uint8_t LXDefCP3[128];
 
 /* Finds and reads the control file as LXInit does. rc: 0 or the last error; null only when nothing can be allocated. */
-LX_API LXObjMgr *LXInitObjManager(const char *directory, uint32_t options, uint32_t *rc) LX_NOEXCEPT;
+LX_API LXObjMgr* LXInitObjManager(const char* directory, uint32_t options, uint32_t* rc) LX_NOEXCEPT;
 /* Unloads all objects and frees the manager: 0, or 1 when a free callback failed. */
-LX_API uint32_t LXTermObjManager(LXObjMgr *manager) LX_NOEXCEPT;
+LX_API uint32_t LXTermObjManager(LXObjMgr* manager) LX_NOEXCEPT;
 /*
  * The entry of that type and name (case is ignored; name_length may include the terminator; negative: strlen),
  * loaded unless no_load is 1. Null with rc LX_E_NOTFOUND, or rc 0 for the binary sort. An entry whose file cannot be
  * read is served with built-in data: the entry comes together with the error in rc.
  */
-LX_API LXObjEntry *LXGetObjFromName(LXObjMgr *manager, uint8_t type, const char *name, int32_t name_length,
-                                    int32_t no_load, uint32_t *rc) LX_NOEXCEPT;
-LX_API LXObjEntry *LXGetObjFromNameW(LXObjMgr *manager, uint8_t type, const LXWChar *name, int32_t name_length,
-                                     int32_t no_load, uint32_t *rc) LX_NOEXCEPT;
-LX_API LXObjEntry *LXGetObjFromID(LXObjMgr *manager, uint8_t type, uint16_t id, int32_t no_load,
-                                  uint32_t *rc) LX_NOEXCEPT;
+LX_API LXObjEntry* LXGetObjFromName(LXObjMgr* manager, uint8_t type, const char* name, int32_t name_length,
+                                    int32_t no_load, uint32_t* rc) LX_NOEXCEPT;
+LX_API LXObjEntry* LXGetObjFromNameW(LXObjMgr* manager, uint8_t type, const LXWChar* name, int32_t name_length,
+                                     int32_t no_load, uint32_t* rc) LX_NOEXCEPT;
+LX_API LXObjEntry* LXGetObjFromID(LXObjMgr* manager, uint8_t type, uint16_t id, int32_t no_load,
+                                  uint32_t* rc) LX_NOEXCEPT;
 /* Loads an entry under the global lock; null when neither its file nor built-in data can serve. */
-LX_API LXObjEntry *LXLoadObj(LXObjMgr *manager, LXObjEntry *entry, uint32_t *rc) LX_NOEXCEPT;
-LX_API uint32_t LXUnloadObj(LXObjMgr *manager, LXObjEntry *entry) LX_NOEXCEPT;      /* 0 or LX_E_FREE */
-LX_API uint32_t LXLoadDefaultObj(LXObjMgr *manager, LXObjEntry *entry) LX_NOEXCEPT; /* 0; 1: type without built-in */
-LX_API uint32_t LXLoadDefaults(LXObjMgr *manager) LX_NOEXCEPT;                      /* 1; 0: no memory */
+LX_API LXObjEntry* LXLoadObj(LXObjMgr* manager, LXObjEntry* entry, uint32_t* rc) LX_NOEXCEPT;
+LX_API uint32_t LXUnloadObj(LXObjMgr* manager, LXObjEntry* entry) LX_NOEXCEPT;      /* 0 or LX_E_FREE */
+LX_API uint32_t LXLoadDefaultObj(LXObjMgr* manager, LXObjEntry* entry) LX_NOEXCEPT; /* 0; 1: type without built-in */
+LX_API uint32_t LXLoadDefaults(LXObjMgr* manager) LX_NOEXCEPT;                      /* 1; 0: no memory */
 
 /* The aliases of alias.txt: 0, or 1 when the file could not be used completely (what was read stays usable). */
-LX_API uint32_t LXBuildAliasList(LXObjMgr *manager) LX_NOEXCEPT;
+LX_API uint32_t LXBuildAliasList(LXObjMgr* manager) LX_NOEXCEPT;
 /* Name of the code page that has the alias (case is ignored; owned by the manager), or null. */
-LX_API const char *LXGetCodepageFromAlias(LXObjMgr *manager, const char *name) LX_NOEXCEPT;
-LX_API uint32_t LXDestroyAliasList(LXObjMgr *manager) LX_NOEXCEPT; /* 0 */
-LX_API char *LXGetAliasFileName(const char *directory, char *buffer, int32_t buffer_size) LX_NOEXCEPT;
+LX_API const char* LXGetCodepageFromAlias(LXObjMgr* manager, const char* name) LX_NOEXCEPT;
+LX_API uint32_t LXDestroyAliasList(LXObjMgr* manager) LX_NOEXCEPT; /* 0 */
+LX_API char* LXGetAliasFileName(const char* directory, char* buffer, int32_t buffer_size) LX_NOEXCEPT;
 /*
  * Looks a pair of UCS-2 characters up in a language's upper-case (item 44) or lower-case (item 45) special list.
  * Returns 0 not found, 1 found with one value, 2 found with two.
  */
-LX_API int32_t LXLangGetSpecial(const LXObjEntry *language, uint16_t key1, uint16_t key2, uint16_t *value1,
-                                uint16_t *value2, uint32_t item) LX_NOEXCEPT;
+LX_API int32_t LXLangGetSpecial(const LXObjEntry* language, uint16_t key1, uint16_t key2, uint16_t* value1,
+                                uint16_t* value2, uint32_t item) LX_NOEXCEPT;
 
-/* ---- Locales ---------------------------------------------------------------------------------------------------- */
+/* ---- Locales ---- */
 
 /*
  * A new locale from "Language_Territory.CodePage@Sort"; every part but the language may be left out (the language's
@@ -230,59 +232,59 @@ LX_API int32_t LXLangGetSpecial(const LXObjEntry *language, uint16_t key1, uint1
  * LX_E_CODEPAGE, LX_E_SORT or LX_E_MANAGER. Free it with LXReleaseLocale.
  * With LX_GET_USER the process's setlocale state is switched and restored: for use while a program sets itself up.
  */
-LX_API LXLocale *LXGetLocale(const char *name, uint32_t options, uint32_t *rc) LX_NOEXCEPT;
-LX_API LXLocale *LXGetLocaleW(const LXWChar *name, uint32_t options, uint32_t *rc) LX_NOEXCEPT;
-LX_API LXLocale *LXGetLocaleU(const LXUChar *name, uint32_t options, uint32_t *rc) LX_NOEXCEPT;
+LX_API LXLocale* LXGetLocale(const char* name, uint32_t options, uint32_t* rc) LX_NOEXCEPT;
+LX_API LXLocale* LXGetLocaleW(const LXWChar* name, uint32_t options, uint32_t* rc) LX_NOEXCEPT;
+LX_API LXLocale* LXGetLocaleU(const LXUChar* name, uint32_t options, uint32_t* rc) LX_NOEXCEPT;
 /* Frees the locale (null: nothing): 0, or 1 when a free callback failed. `reserved` is 0. */
-LX_API uint32_t LXReleaseLocale(LXLocale *locale, uint32_t reserved) LX_NOEXCEPT;
+LX_API uint32_t LXReleaseLocale(LXLocale* locale, uint32_t reserved) LX_NOEXCEPT;
 /* Makes a new locale the process default and releases the former one: 0 or the status of LXGetLocale. */
-LX_API uint32_t LXSetLocale(const char *name, uint32_t options) LX_NOEXCEPT;
-LX_API uint32_t LXSetLocaleW(const LXWChar *name, uint32_t options) LX_NOEXCEPT;
-LX_API uint32_t LXSetLocaleU(const LXUChar *name, uint32_t options) LX_NOEXCEPT;
+LX_API uint32_t LXSetLocale(const char* name, uint32_t options) LX_NOEXCEPT;
+LX_API uint32_t LXSetLocaleW(const LXWChar* name, uint32_t options) LX_NOEXCEPT;
+LX_API uint32_t LXSetLocaleU(const LXUChar* name, uint32_t options) LX_NOEXCEPT;
 /* Name of the user's locale: 1 from LX_LANG (cut, perhaps unterminated, when it does not fit), 2 from the system's
    locale, 0 on failure. Set-up time only, as LX_GET_USER. */
-LX_API int32_t LXGetUserLocale(char *buffer, int32_t buffer_size) LX_NOEXCEPT;
+LX_API int32_t LXGetUserLocale(char* buffer, int32_t buffer_size) LX_NOEXCEPT;
 /* Fills every value of the locale that was not set explicitly from its territory: 0 or LX_E_MEMORY. */
-LX_API uint32_t LXLocaleSetModifiable(LXLocale *locale) LX_NOEXCEPT;
+LX_API uint32_t LXLocaleSetModifiable(LXLocale* locale) LX_NOEXCEPT;
 /* Locale name for a system locale name such as "de_CH"; unknown parts read "Unknown". Returns buffer. */
-LX_API char *LXMapNativeLocale(const char *native_name, char *buffer, int32_t size) LX_NOEXCEPT;
+LX_API char* LXMapNativeLocale(const char* native_name, char* buffer, int32_t size) LX_NOEXCEPT;
 /* Calls back for every object of the directory, in its order, until the callback returns 0. Returns 0. */
-LX_API int32_t LXEnumLocales(LXEnumFn callback, void *context, uint32_t reserved) LX_NOEXCEPT;
-LX_API int32_t LXEnumLocalesW(LXEnumWFn callback, void *context, uint32_t reserved) LX_NOEXCEPT;
-LX_API int32_t LXEnumLocalesU(LXEnumUFn callback, void *context, uint32_t reserved) LX_NOEXCEPT;
+LX_API int32_t LXEnumLocales(LXEnumFn callback, void* context, uint32_t reserved) LX_NOEXCEPT;
+LX_API int32_t LXEnumLocalesW(LXEnumWFn callback, void* context, uint32_t reserved) LX_NOEXCEPT;
+LX_API int32_t LXEnumLocalesU(LXEnumUFn callback, void* context, uint32_t reserved) LX_NOEXCEPT;
 
-/* ---- Characters of a code page ---------------------------------------------------------------------------------- */
+/* ---- Characters of a code page ---- */
 /*
  * Primitives for inner loops: the record must be a loaded code page, the bytes a whole character; nothing is checked
  * or traced. "Packed" is the character's bytes as one big-endian number.
  */
 
 /* UCS-2 value of a multibyte character; 65533 when a byte fits no character. UTF-8: always two or three bytes. */
-LX_API int32_t LXCpMbToUnicode(const LXObjEntry *record, const char *bytes) LX_NOEXCEPT;
-LX_API int32_t LXCpMbToUnicodeW(const LXObjEntry *record, LXWChar packed) LX_NOEXCEPT;
+LX_API int32_t LXCpMbToUnicode(const LXObjEntry* record, const char* bytes) LX_NOEXCEPT;
+LX_API int32_t LXCpMbToUnicodeW(const LXObjEntry* record, LXWChar packed) LX_NOEXCEPT;
 /* Writes the character for a UCS-2 value (out[4]) and returns its length; the substitution byte when there is none. */
-LX_API int32_t LXCpUnicodeToChar(const LXObjEntry *record, LXUChar ucs2, char *out) LX_NOEXCEPT;
-LX_API LXWChar LXCpUnicodeToCharW(const LXObjEntry *record, LXUChar ucs2) LX_NOEXCEPT;
+LX_API int32_t LXCpUnicodeToChar(const LXObjEntry* record, LXUChar ucs2, char* out) LX_NOEXCEPT;
+LX_API LXWChar LXCpUnicodeToCharW(const LXObjEntry* record, LXUChar ucs2) LX_NOEXCEPT;
 /* The other width of a character; 0 when there is none. */
-LX_API LXWChar LXCpMbHalfToFullW(const LXObjEntry *record, LXWChar packed) LX_NOEXCEPT;
-LX_API LXWChar LXCpFullToHalfW(const LXObjEntry *record, LXWChar packed) LX_NOEXCEPT;
+LX_API LXWChar LXCpMbHalfToFullW(const LXObjEntry* record, LXWChar packed) LX_NOEXCEPT;
+LX_API LXWChar LXCpFullToHalfW(const LXObjEntry* record, LXWChar packed) LX_NOEXCEPT;
 /* Converts the older code page layout; both results come from the allocation callback. Null: no memory. */
-LX_API uint8_t *LXCpV1toV2(const uint8_t *v1_section1, uint16_t v1_section1_size, const uint8_t *v1_section2,
-                           uint16_t v1_section2_size, uint8_t **out_section2) LX_NOEXCEPT;
-LX_API LXWChar LXMbToW(const LXObjEntry *record, const char *bytes) LX_NOEXCEPT;
+LX_API uint8_t* LXCpV1toV2(const uint8_t* v1_section1, uint16_t v1_section1_size, const uint8_t* v1_section2,
+                           uint16_t v1_section2_size, uint8_t** out_section2) LX_NOEXCEPT;
+LX_API LXWChar LXMbToW(const LXObjEntry* record, const char* bytes) LX_NOEXCEPT;
 /* Packs the page's longest character (whole) or one byte. */
-LX_API LXWChar LXMbToWS(const LXObjEntry *record, const char *bytes, uint32_t whole) LX_NOEXCEPT;
+LX_API LXWChar LXMbToWS(const LXObjEntry* record, const char* bytes, uint32_t whole) LX_NOEXCEPT;
 /* Unpacks into out[4] and returns the count. Zero middle bytes are skipped. */
-LX_API uint16_t LXWToMb(char *out, LXWChar packed) LX_NOEXCEPT;
+LX_API uint16_t LXWToMb(char* out, LXWChar packed) LX_NOEXCEPT;
 /* Type and case entry of a multibyte character; owned by the object. */
-LX_API const LXCharType *LXGetMbCtype(const LXObjEntry *record, const char *bytes) LX_NOEXCEPT;
-LX_API const LXCharType *LXGetMbCtypeW(const LXObjEntry *record, LXWChar packed) LX_NOEXCEPT;
+LX_API const LXCharType* LXGetMbCtype(const LXObjEntry* record, const char* bytes) LX_NOEXCEPT;
+LX_API const LXCharType* LXGetMbCtypeW(const LXObjEntry* record, LXWChar packed) LX_NOEXCEPT;
 /* The other case of a multibyte character whose type has a bit of `mask`, else a copy (dst[4]). */
-LX_API void LXCpMbCaseConv(const LXObjEntry *record, const char *src, char *dst, uint32_t mask) LX_NOEXCEPT;
-LX_API int32_t LXCpMbCaseConvS(const LXObjEntry *record, const char *src, char *dst, uint32_t mask) LX_NOEXCEPT;
-LX_API LXWChar LXCpMbCaseConvW(const LXObjEntry *record, LXWChar packed, uint32_t mask) LX_NOEXCEPT;
+LX_API void LXCpMbCaseConv(const LXObjEntry* record, const char* src, char* dst, uint32_t mask) LX_NOEXCEPT;
+LX_API int32_t LXCpMbCaseConvS(const LXObjEntry* record, const char* src, char* dst, uint32_t mask) LX_NOEXCEPT;
+LX_API LXWChar LXCpMbCaseConvW(const LXObjEntry* record, LXWChar packed, uint32_t mask) LX_NOEXCEPT;
 
-/* ---- Conversion ------------------------------------------------------------------------------------------------- */
+/* ---- Conversion ---- */
 /*
  * Plain text is bytes of the locale's code page, W text packed characters of it, U text UCS-2. The Ex forms read and
  * write shift bytes of mixed host pages: a shift state is 0 (single-byte) or 1 (double-byte), and finished output
@@ -293,79 +295,79 @@ LX_API LXWChar LXCpMbCaseConvW(const LXObjEntry *record, LXWChar packed, uint32_
 
 /* A handle for text of any length from the source's into the target's code page; the locales must outlive it.
    Null: LX_E_MEMORY in the target locale. `reserved` is 0. */
-LX_API LXConversion *LXOpenConversion(LXLocale *target_locale, LXLocale *source_locale, uint32_t reserved) LX_NOEXCEPT;
-LX_API uint32_t LXCloseConversion(LXConversion *handle) LX_NOEXCEPT; /* 0 or LX_E_FREE */
+LX_API LXConversion* LXOpenConversion(LXLocale* target_locale, LXLocale* source_locale, uint32_t reserved) LX_NOEXCEPT;
+LX_API uint32_t LXCloseConversion(LXConversion* handle) LX_NOEXCEPT; /* 0 or LX_E_FREE */
 /*
  * Converts from *in to *out and advances both pointers and both byte counts. Returns 0 when all input is consumed,
  * LX_E_FULL when the output is full (call again with room), LX_E_PARTIAL when the input ends inside a character
  * (call again with more). Up to five bytes of either side wait inside the handle. A mixed host target is left in the
  * state of the last character: LXFinishConversion closes it.
  */
-LX_API uint32_t LXConvertBuffer(LXConversion *handle, char **out, int32_t *out_room, const char **in, int32_t *in_left,
+LX_API uint32_t LXConvertBuffer(LXConversion* handle, char** out, int32_t* out_room, const char** in, int32_t* in_left,
                                 uint32_t reserved) LX_NOEXCEPT;
 /* Most target bytes for one source byte. */
-LX_API int32_t LXConversionRatio(LXLocale *target_locale, LXLocale *source_locale, uint32_t reserved) LX_NOEXCEPT;
+LX_API int32_t LXConversionRatio(LXLocale* target_locale, LXLocale* source_locale, uint32_t reserved) LX_NOEXCEPT;
 
-LX_API int32_t LXConvertString(LXLocale *target_locale, char *out, int32_t out_size, LXLocale *source_locale,
-                               const char *in, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXConvertStringW(LXLocale *target_locale, LXWChar *out, int32_t out_size, LXLocale *source_locale,
-                                const LXWChar *in, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXConvertStringEx(LXLocale *target_locale, char *out, uint32_t target_shift_state, int32_t out_size,
-                                 LXLocale *source_locale, const char *in, uint32_t source_shift_state,
+LX_API int32_t LXConvertString(LXLocale* target_locale, char* out, int32_t out_size, LXLocale* source_locale,
+                               const char* in, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXConvertStringW(LXLocale* target_locale, LXWChar* out, int32_t out_size, LXLocale* source_locale,
+                                const LXWChar* in, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXConvertStringEx(LXLocale* target_locale, char* out, uint32_t target_shift_state, int32_t out_size,
+                                 LXLocale* source_locale, const char* in, uint32_t source_shift_state,
                                  int32_t in_length, uint32_t flags) LX_NOEXCEPT;
 
 /* Bytes that `chars` characters occupy, and whole characters in `bytes` bytes; shift bytes are no characters. */
-LX_API int32_t LXCpStrCharToByteLen(const LXObjEntry *record, const char *string, uint32_t shift_state,
+LX_API int32_t LXCpStrCharToByteLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                                     int32_t chars) LX_NOEXCEPT;
-LX_API int32_t LXCpStrByteToCharLen(const LXObjEntry *record, const char *string, uint32_t shift_state,
+LX_API int32_t LXCpStrByteToCharLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                                     int32_t bytes) LX_NOEXCEPT;
 
-LX_API int32_t LXStringToUnicode(LXLocale *locale, LXUChar *out, int32_t out_size, const char *in, int32_t in_length,
+LX_API int32_t LXStringToUnicode(LXLocale* locale, LXUChar* out, int32_t out_size, const char* in, int32_t in_length,
                                  uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXStringToUnicodeW(LXLocale *locale, LXUChar *out, int32_t out_size, const LXWChar *in,
+LX_API int32_t LXStringToUnicodeW(LXLocale* locale, LXUChar* out, int32_t out_size, const LXWChar* in,
                                   int32_t in_length, uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXStringToUnicodeEx(LXLocale *locale, LXUChar *out, int32_t out_size, const char *in,
+LX_API int32_t LXStringToUnicodeEx(LXLocale* locale, LXUChar* out, int32_t out_size, const char* in,
                                    uint32_t shift_state, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXUnicodeToString(LXLocale *locale, char *out, int32_t out_size, const LXUChar *in, int32_t in_length,
+LX_API int32_t LXUnicodeToString(LXLocale* locale, char* out, int32_t out_size, const LXUChar* in, int32_t in_length,
                                  uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXUnicodeToStringW(LXLocale *locale, LXWChar *out, int32_t out_size, const LXUChar *in,
+LX_API int32_t LXUnicodeToStringW(LXLocale* locale, LXWChar* out, int32_t out_size, const LXUChar* in,
                                   int32_t in_length, uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXUnicodeToStringEx(LXLocale *locale, char *out, uint32_t shift_state, int32_t out_size,
-                                   const LXUChar *in, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXUnicodeToStringEx(LXLocale* locale, char* out, uint32_t shift_state, int32_t out_size,
+                                   const LXUChar* in, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
 /* Packs characters. A measured length includes the terminator, which is then packed and counted like any character. */
-LX_API int32_t LXMbToWide(LXLocale *locale, LXWChar *out, int32_t out_size, const char *in, int32_t in_length,
+LX_API int32_t LXMbToWide(LXLocale* locale, LXWChar* out, int32_t out_size, const char* in, int32_t in_length,
                           uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXMbToWideEx(LXLocale *locale, LXWChar *out, int32_t out_size, const char *in, uint32_t shift_state,
+LX_API int32_t LXMbToWideEx(LXLocale* locale, LXWChar* out, int32_t out_size, const char* in, uint32_t shift_state,
                             int32_t in_length, uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXWideToMb(LXLocale *locale, char *out, int32_t out_size, const LXWChar *in, int32_t in_length,
+LX_API int32_t LXWideToMb(LXLocale* locale, char* out, int32_t out_size, const LXWChar* in, int32_t in_length,
                           uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXWideToMbEx(LXLocale *locale, char *out, uint32_t shift_state, int32_t out_size, const LXWChar *in,
+LX_API int32_t LXWideToMbEx(LXLocale* locale, char* out, uint32_t shift_state, int32_t out_size, const LXWChar* in,
                             int32_t in_length, uint32_t flags) LX_NOEXCEPT;
 /* By code page record instead of locale; -1 for a null record or bad flags. */
-LX_API int32_t LXCpStrToUnicode(const LXObjEntry *record, LXUChar *out, int32_t out_size, const char *in,
+LX_API int32_t LXCpStrToUnicode(const LXObjEntry* record, LXUChar* out, int32_t out_size, const char* in,
                                 int32_t in_length, uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXCpUnicodeToStr(const LXObjEntry *record, char *out, int32_t out_size, const LXUChar *in,
+LX_API int32_t LXCpUnicodeToStr(const LXObjEntry* record, char* out, int32_t out_size, const LXUChar* in,
                                 int32_t in_length, uint32_t flags) LX_NOEXCEPT;
 /* Between ASCII (code page 367) and UCS-2: source bytes consumed, or bytes written; -1 when 367 is missing or the
    input is empty. */
-LX_API int32_t LXComStrToUnicode(LXUChar *out, int32_t out_size, const char *in, int32_t in_length,
+LX_API int32_t LXComStrToUnicode(LXUChar* out, int32_t out_size, const char* in, int32_t in_length,
                                  uint32_t flags) LX_NOEXCEPT;
-LX_API int32_t LXComUnicodeToStr(char *out, int32_t out_size, const LXUChar *in, int32_t in_length,
+LX_API int32_t LXComUnicodeToStr(char* out, int32_t out_size, const LXUChar* in, int32_t in_length,
                                  uint32_t flags) LX_NOEXCEPT;
 
-/* ---- Extensions ------------------------------------------------------------------------------------------------- */
+/* ---- Extensions ---- */
 
-LX_API const char *LXVersion(void) LX_NOEXCEPT; /* "1.0.0" */
+LX_API const char* LXVersion(void) LX_NOEXCEPT; /* "1.0.0" */
 /* The running library's object manager; null before LXInit and after the last LXTerm. */
-LX_API LXObjMgr *LXGetObjManager(void) LX_NOEXCEPT;
+LX_API LXObjMgr* LXGetObjManager(void) LX_NOEXCEPT;
 /* The locale's object of a type; null for the binary sort and for a bad type. */
-LX_API LXObjEntry *LXGetLocaleObject(LXLocale *locale, uint8_t type) LX_NOEXCEPT;
-LX_API uint16_t LXGetObjId(const LXObjEntry *entry) LX_NOEXCEPT;
-LX_API uint8_t LXGetObjType(const LXObjEntry *entry) LX_NOEXCEPT;
-LX_API const char *LXGetObjName(const LXObjEntry *entry) LX_NOEXCEPT;
+LX_API LXObjEntry* LXGetLocaleObject(LXLocale* locale, uint8_t type) LX_NOEXCEPT;
+LX_API uint16_t LXGetObjId(const LXObjEntry* entry) LX_NOEXCEPT;
+LX_API uint8_t LXGetObjType(const LXObjEntry* entry) LX_NOEXCEPT;
+LX_API const char* LXGetObjName(const LXObjEntry* entry) LX_NOEXCEPT;
 /* Calls back with every alias and its code page, in the order of alias.txt, until the callback returns 0. Returns 0. */
-typedef int32_t (*LXEnumAliasFn)(void *context, const char *alias, const char *code_page);
-LX_API int32_t LXEnumAliases(LXObjMgr *manager, LXEnumAliasFn callback, void *context) LX_NOEXCEPT;
+typedef int32_t (*LXEnumAliasFn)(void* context, const char* alias, const char* code_page);
+LX_API int32_t LXEnumAliases(LXObjMgr* manager, LXEnumAliasFn callback, void* context) LX_NOEXCEPT;
 
 typedef struct LXCodePageInfo {
   uint16_t id;
@@ -378,15 +380,16 @@ typedef struct LXCodePageInfo {
   uint8_t leave_byte;      /* ends it */
 } LXCodePageInfo;
 /* 0, or LX_E_ARGUMENT when the entry is not a loaded code page. */
-LX_API uint32_t LXGetCodePageInfo(const LXObjEntry *code_page, LXCodePageInfo *info) LX_NOEXCEPT;
+LX_API uint32_t LXGetCodePageInfo(const LXObjEntry* code_page, LXCodePageInfo* info) LX_NOEXCEPT;
 
 /* How a conversion handle treats what has no exact counterpart. Set before the first LXConvertBuffer. */
 #define LX_CONV_LINES_LF 0x01u   /* next line, line feed and carriage return + line feed all become a line feed */
 #define LX_CONV_LINES_NEL 0x02u  /* ... a next line (X'15' in EBCDIC, X'85' in Latin1) */
 #define LX_CONV_LINES_CRLF 0x03u /* ... carriage return + line feed */
-#define LX_CONV_STRICT 0x10u     /* source sequences that are not well-formed become one U+FFFD and end before the
-                                    first byte that does not belong to them; repeated shift bytes are not text */
-#define LX_CONV_DISCARD 0x20u    /* characters that the target lacks, and malformed ones, are left out */
+#define LX_CONV_STRICT                                                                                          \
+  0x10u                       /* source sequences that are not well-formed become one U+FFFD and end before the \
+                                 first byte that does not belong to them; repeated shift bytes are not text */
+#define LX_CONV_DISCARD 0x20u /* characters that the target lacks, and malformed ones, are left out */
 
 #define LX_PROBLEM_SUBSTITUTED 1u /* the target lacks the character */
 #define LX_PROBLEM_MALFORMED 2u   /* the source bytes are no character of the source page */
@@ -400,7 +403,7 @@ typedef struct LXConversionProblem {
   uint8_t length;   /* of the source character */
   uint8_t bytes[5]; /* the source character */
 } LXConversionProblem;
-typedef void (*LXProblemFn)(void *context, const LXConversionProblem *problem);
+typedef void (*LXProblemFn)(void* context, const LXConversionProblem* problem);
 
 typedef struct LXConversionCounts {
   uint64_t bytes_in;    /* consumed, held bytes included */
@@ -413,15 +416,15 @@ typedef struct LXConversionCounts {
 
 /* LX_CONV_ bits, and an optional callback for each problem as it is met: 0, or LX_E_ARGUMENT for other bits, a null
    handle, or a handle already in use. The callback must not use the handle. */
-LX_API uint32_t LXSetConversionOptions(LXConversion *handle, uint32_t options, LXProblemFn callback,
-                                       void *context) LX_NOEXCEPT;
+LX_API uint32_t LXSetConversionOptions(LXConversion* handle, uint32_t options, LXProblemFn callback,
+                                       void* context) LX_NOEXCEPT;
 /*
  * Ends a text: writes what is pending, turns an incomplete last character into one malformed character (problem
  * "cut"), and returns a mixed host target to the single-byte state. 0, or LX_E_FULL: call again with more room.
  * Afterwards the handle is as newly opened but for its counts.
  */
-LX_API uint32_t LXFinishConversion(LXConversion *handle, char **out, int32_t *out_room) LX_NOEXCEPT;
-LX_API uint32_t LXGetConversionCounts(const LXConversion *handle, LXConversionCounts *counts) LX_NOEXCEPT;
+LX_API uint32_t LXFinishConversion(LXConversion* handle, char** out, int32_t* out_room) LX_NOEXCEPT;
+LX_API uint32_t LXGetConversionCounts(const LXConversion* handle, LXConversionCounts* counts) LX_NOEXCEPT;
 
 #ifdef __cplusplus
 }

@@ -109,6 +109,9 @@ int main(int argc, char** argv) {
   } catch (const IoError& error) {
     std::cerr << "lexaroc: " << error.what() << '\n';
     return kIoFailure;
+  } catch (const fs::filesystem_error& error) {
+    std::cerr << "lexaroc: " << error.what() << '\n';
+    return kIoFailure;
   } catch (const std::exception& error) {
     std::cerr << "lexaroc: " << error.what() << '\n';
     return kBadData;
