@@ -16,6 +16,11 @@ TRC1_Unit trace_unit = {"Lexaro", "conversion", 0};
 
 constexpr uint32_t kOptions = LX_CONV_LINES_CRLF | LX_CONV_STRICT | LX_CONV_DISCARD;
 
+// Either side of a call may be absent when it is empty, and then there is no pointer to copy from.
+void copy_bytes(uint8_t* to, const uint8_t* from, size_t count) {
+  if (count != 0) std::memcpy(to, from, count);
+}
+
 struct Input {
   const uint8_t* at;
   size_t left;
@@ -31,7 +36,7 @@ struct Output {
   size_t room;
 
   void write(const uint8_t* bytes, size_t count) {
-    std::memcpy(at, bytes, count);
+    copy_bytes(at, bytes, count);
     at += count;
     room -= count;
   }
@@ -101,7 +106,7 @@ class BufferCall {
     handle_.counts.bytes_in += count;
   }
   void hold(size_t count) {
-    std::memcpy(handle_.held + handle_.held_count, input_.at, count);
+    copy_bytes(handle_.held + handle_.held_count, input_.at, count);
     handle_.held_count = static_cast<uint8_t>(handle_.held_count + count);
     consume(count);
   }
@@ -123,7 +128,7 @@ class BufferCall {
     size_t held = handle_.held_count;
     size_t added = std::min(input_.left, sizeof handle_.held);
     std::memcpy(assembly, handle_.held, held);
-    std::memcpy(assembly + held, input_.at, added);
+    copy_bytes(assembly + held, input_.at, added);
     In in = in_;
     in.at = in.start = assembly;
     in.end = assembly + held + added;
