@@ -159,6 +159,7 @@ uint32_t read_directory(LXObjMgr& manager, LXFile* file) {
 }  // namespace
 
 uint32_t read_control_file(LXObjMgr& manager, const char* directory) {
+  TRC1_Sync(&trace_unit);  // no exported function of this module has done it
   Search search{manager};
   if (directory != nullptr) search.try_directory(directory);
   if (!search.ended) search.try_environment();

@@ -58,7 +58,9 @@ struct Pipe {
   std::vector<std::string> settings = {"PATH=/usr/bin:/bin"};
   for (const auto& [name, value] : input.environment) settings.push_back(name + "=" + value);
   for (const char* name : {"ASAN_OPTIONS", "UBSAN_OPTIONS", "TSAN_OPTIONS", "LSAN_OPTIONS"}) {
-    if (const char* value = std::getenv(name)) settings.push_back(std::string(name) + "=" + value);
+    const char* value = std::getenv(name);
+    const std::string given = value ? std::string(value) + ":" : "";
+    settings.push_back(std::string(name) + "=" + given + "exitcode=99");  // no exit code of the program's own
   }
   std::vector<char*> envp;
   for (std::string& setting : settings) envp.push_back(setting.data());

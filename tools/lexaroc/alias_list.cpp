@@ -33,7 +33,8 @@ std::vector<Alias> read_aliases(const SourceFile& source, Report& report) {
       Alias alias{code_page, "", cursor.spot()};
       alias.alias = cursor.word("an alias");
       if (alias.alias.size() > kLongestAlias) throw SourceError(alias.spot, "the alias is longer than 64 characters");
-      if (!seen.insert(folded(alias.alias)).second) throw SourceError(alias.spot, "\"" + alias.alias + "\" is given twice");
+      if (!seen.insert(folded(alias.alias)).second)
+        throw SourceError(alias.spot, "\"" + alias.alias + "\" is given twice");
       aliases.push_back(std::move(alias));
     }
   });

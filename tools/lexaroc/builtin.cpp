@@ -15,8 +15,7 @@ constexpr const char* kTerritory = "builtin/territory.txt";
 constexpr const char* kCodePage = "codepage/cp_00367.txt";
 
 struct Image {
-  const char* constant;
-  const char* exported;
+  const char* name;
   std::string bytes;
 };
 
@@ -32,7 +31,7 @@ std::string array_text(const std::string& declaration, const std::string& bytes)
 
 }  // namespace
 
-BuiltinSources make_builtin_sources(const fs::path& sources, Report& report) {
+std::string make_builtin_source(const fs::path& sources, Report& report) {
   auto read = [&](const char* name, auto reader) {
     return reader(SourceFile((sources / name).string(), read_file(sources / name), report), report);
   };
@@ -42,25 +41,17 @@ BuiltinSources make_builtin_sources(const fs::path& sources, Report& report) {
   UnicodeTables unicode = UnicodeTables::read(sources / "unicode", report);
   if (!report.clean()) return {};
   Sections ascii = pack_code_page(*code_page, unicode, Layout::current);
-  const Image images[] = {{"kBuiltInLanguageImage", "LXDefaultLanguage", pack_language(*language)},
-                          {"kBuiltInTerritoryImage", "LXDefaultTerritory", pack_territory(*territory)},
-                          {"kBuiltInCodePageImage", "LXDefaultCodePage", ascii[0]},
-                          {"kBuiltInCodePageValuesImage", "LXDefCP3", ascii[2]}};
-  std::string first_lines =
+  const Image images[] = {{"LXDefaultLanguage", pack_language(*language)},
+                          {"LXDefaultTerritory", pack_territory(*territory)},
+                          {"LXDefaultCodePage", ascii[0]},
+                          {"LXDefCP3", ascii[2]}};
+  std::string text =
       "// SPDX-License-Identifier: Apache-2.0\n"
       "// Made by \"lexaroc builtin data objects\" from data/" +
       std::string(kLanguage) + ", data/" + kTerritory + ",\n// data/" + kCodePage + " and data/unicode.\n" +
-      "// clang-format off\n";
-  BuiltinSources result;
-  result.images = first_lines + "#pragma once\n\n#include <cstdint>\n\nnamespace lx {\n\n";
-  result.objects = first_lines + "#include \"lexaro/lexaro.h\"\n\nextern \"C\" {\n\n";
-  for (const Image& image : images) {
-    result.images += array_text(std::string("inline constexpr uint8_t ") + image.constant, image.bytes) + "\n";
-    result.objects += array_text(std::string("const uint8_t ") + image.exported, image.bytes) + "\n";
-  }
-  result.images += "}  // namespace lx\n";
-  result.objects += "}  // extern \"C\"\n";
-  return result;
+      "// clang-format off\n#include \"lexaro/lexaro.h\"\n\nextern \"C\" {\n\n";
+  for (const Image& image : images) text += array_text(std::string("const uint8_t ") + image.name, image.bytes) + "\n";
+  return text + "}  // extern \"C\"\n";
 }
 
 }  // namespace lx::compiler

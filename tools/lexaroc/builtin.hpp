@@ -9,12 +9,7 @@
 
 namespace lx::compiler {
 
-struct BuiltinSources {
-  std::string images;   // builtin_images.hpp: the bytes, for use at compile time
-  std::string objects;  // builtin_objects.cpp: the exported arrays
-};
-
-// Of no use when the report has errors.
-BuiltinSources make_builtin_sources(const fs::path& sources, Report& report);
+// builtin_objects.cpp: the exported arrays. Of no use when the report has errors.
+std::string make_builtin_source(const fs::path& sources, Report& report);
 
 }  // namespace lx::compiler

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "code_page.hpp"
 
-#include <algorithm>
-
 namespace lx::compiler {
 
 unsigned CodePage::max_length() const {

@@ -169,8 +169,8 @@ CodePageImage read_code_page_image(const ObjectFile& file, uint16_t id) {
   image.values = file.sections[2];
   image.high_parts = file.sections[3];
   image.bounded = file.layout_version != kCodePageLayoutV1;
-  image.header = image.bounded ? record_at<CodePageHeader>(image.section1, 0)
-                               : current_header(read_header_v1(image.section1));
+  image.header =
+      image.bounded ? record_at<CodePageHeader>(image.section1, 0) : current_header(read_header_v1(image.section1));
   unsigned length = image.header.max_length;
   if (length < 1 || length > kMaxCharacterLength) throw StructureError("the maximum character length is not 1 to 4");
   if (image.by_rule() && length < 3) throw StructureError("UTF-8 needs characters of three bytes");

@@ -23,7 +23,7 @@ struct CodePageImage {
   bool bounded = true;    // the states of the to-Unicode walk have bounds
   CodePageHeader header;  // offsets are those of the file
   std::string_view section1, values, high_parts;
-  std::vector<Step> states;         // to-Unicode walk
+  std::vector<Step> states;  // to-Unicode walk
   std::vector<uint16_t> to_unicode;
   std::vector<Step> type_states;
   std::vector<TypeEntry> type_entries;  // all that lies behind the start of the table

@@ -228,10 +228,8 @@ std::optional<CodePage> CodePageReader::read() {
   return std::move(page_);
 }
 
-// Characters that are written as they are: plain letters, signs and ideographs of one column direction.
-bool is_literal(uint16_t c) {
-  return c > U' ' && c != U'\\' && !must_be_escaped(c) && c != kUnassigned;
-}
+// Whether a row shows the character itself.
+bool is_literal(uint16_t c) { return c > U' ' && c != U'\\' && !must_be_escaped(c) && c != kUnassigned; }
 
 // A run of characters in one row; holes are kUnassigned.
 void write_characters(std::string& out, const std::vector<uint16_t>& row) {

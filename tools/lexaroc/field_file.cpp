@@ -8,13 +8,15 @@ std::string object_name(Cursor& cursor) {
   std::string name = cursor.word("a name");
   cursor.end();
   if (name.size() > 32) throw SourceError(start, "the name is longer than 32 characters");
-  if (name.find_first_of("_.@") != std::string::npos) throw SourceError(start, "a name cannot contain \"_\", \".\" or \"@\"");
+  if (name.find_first_of("_.@") != std::string::npos)
+    throw SourceError(start, "a name cannot contain \"_\", \".\" or \"@\"");
   return name;
 }
 
 std::u16string read_text(Cursor& cursor) {
   bool quoted = cursor.accept("\"");
-  if (!quoted && (cursor.done() || cursor.peek() == U' ')) cursor.fail("text that is empty or begins with a blank needs quotes");
+  if (!quoted && (cursor.done() || cursor.peek() == U' '))
+    cursor.fail("text that is empty or begins with a blank needs quotes");
   std::u16string text;
   while (!cursor.done() && !(quoted && cursor.peek() == U'"')) {
     Spot spot = cursor.spot();
@@ -102,7 +104,8 @@ uint16_t FieldFile::number(const std::string& key, unsigned largest) {
 
 std::u16string FieldFile::text(const std::string& key, bool optional) {
   std::u16string text;
-  read(key, [&](Cursor& cursor) { text = read_text(cursor); }, optional);
+  read(
+      key, [&](Cursor& cursor) { text = read_text(cursor); }, optional);
   return text;
 }
 

@@ -20,8 +20,8 @@ class FieldFile {
   // `repeatable` keys may stand on several lines.
   FieldFile(const SourceFile& source, const std::set<std::string>& repeatable, Report& report);
 
-  // Each value is read once, at a cursor behind "key = "; what `read` throws goes to the report. A key that is not there
-  // is reported unless it is optional or repeatable.
+  // Each value is read once, at a cursor behind "key = "; what `read` throws goes to the report. A key that is not
+  // there is reported unless it is optional or repeatable.
   void read(const std::string& key, const std::function<void(Cursor&)>& read, bool optional = false);
   uint16_t number(const std::string& key, unsigned largest = 65535);
   std::u16string text(const std::string& key, bool optional = false);
@@ -43,7 +43,8 @@ class FieldFile {
   std::map<std::string, Spot> spots_;
 };
 
-// The rest of the line: plain text, or text in quotes when it is empty or has blanks at its ends. Escapes: \\ \" \uXXXX.
+// The rest of the line: plain text, or text in quotes when it is empty or has blanks at its ends. Escapes: \\ \"
+// \uXXXX.
 std::u16string read_text(Cursor& cursor);
 std::string write_text(const std::u16string& text, bool quoted = false);
 

@@ -55,7 +55,7 @@ SpecialRow read_special(Cursor& cursor) {
 }
 
 std::string write_special(const char* key, const SpecialRow& row) {
-  auto side = [](const uint16_t (&c)[2]) { return hex_text(c[0], 4) + (c[1] == 0 ? "" : " " + hex_text(c[1], 4)); };
+  auto side = [](const uint16_t(&c)[2]) { return hex_text(c[0], 4) + (c[1] == 0 ? "" : " " + hex_text(c[1], 4)); };
   return std::string(key) + " = " + side(row.key) + " = " + side(row.value) + "\n";
 }
 

@@ -50,7 +50,8 @@ class PageLint {
   void control_bytes() {
     for (unsigned i = 0; i < page_.line_bytes.size(); ++i) {
       uint8_t byte = page_.line_bytes[i];
-      if (byte == 0 || page_.unicode_of(byte) == kUnassigned) error("line end " + hex_text(byte, 2) + " is no character");
+      if (byte == 0 || page_.unicode_of(byte) == kUnassigned)
+        error("line end " + hex_text(byte, 2) + " is no character");
       for (unsigned j = 0; j < i; ++j) {
         if (page_.line_bytes[j] == byte) error("line end " + hex_text(byte, 2) + " is given twice");
       }
@@ -67,7 +68,8 @@ class PageLint {
     for (auto at = page_.to_unicode.lower_bound(0x100); at != page_.to_unicode.end(); ++at) {
       for (unsigned i = 0, length = code_length(at->first); i < length; ++i) {
         if (code_byte(at->first, length, i) != byte) continue;
-        error(std::string(what) + " " + hex_text(byte, 2) + " is part of the character " + hex_text(at->first, 2 * length));
+        error(std::string(what) + " " + hex_text(byte, 2) + " is part of the character " +
+              hex_text(at->first, 2 * length));
         return;
       }
     }

@@ -51,8 +51,8 @@ constexpr Home kHomes[] = {
 };
 
 // Where the host page of the country has "#" at another byte, which the formatting code would not recognise.
-constexpr uint16_t kMovedNumberSign[] = {32,  57,  68,  125, 152, 170, 188, 208, 218, 222, 246, 250, 320, 380,
-                                         484, 558, 578, 591, 600, 604, 724, 752, 757, 792, 858, 862};
+constexpr uint16_t kMovedNumberSign[] = {32,  57,  68,  125, 152, 170, 188, 208, 218, 222, 246, 250, 320,
+                                         380, 484, 558, 578, 591, 600, 604, 724, 752, 757, 792, 858, 862};
 
 std::vector<std::string> words(const char* text) {
   std::istringstream stream(text);
@@ -160,8 +160,8 @@ void lint_territory(const Territory& territory, Report& report) {
   };
   pair(0, 1);
   pair(3, 4);
-  bool number_sign = std::find(std::begin(kMovedNumberSign), std::end(kMovedNumberSign), territory.id) ==
-                     std::end(kMovedNumberSign);
+  bool number_sign =
+      std::find(std::begin(kMovedNumberSign), std::end(kMovedNumberSign), territory.id) == std::end(kMovedNumberSign);
   for (TerritoryText which : {TerritoryText::time_format, TerritoryText::short_date, TerritoryText::long_date}) {
     std::string fault = format_fault(territory.text(which), number_sign);
     if (!fault.empty()) error(kTerritoryTextKeys[static_cast<unsigned>(which)], fault);
@@ -211,22 +211,23 @@ class TreeLint {
     }
   }
 
-  // A missing object is reported at the file that it would have: there is no line to name.
   template <class T>
-  const T* need_named(const std::vector<T>& objects, const std::string& name) {
+  const T* need_named(ObjectType type, const std::vector<T>& objects, const std::string& name) {
     const T* object = find_named(objects, name);
-    if (object == nullptr) report_.error(tree_.alias_file, Spot{}, "no object has the name \"" + name + "\"");
+    // There is no line to name, only the place where the object is missing.
+    if (object == nullptr) report_.error(tree_.folder(type), "no object has the name \"" + name + "\"");
     return object;
   }
 
   void home_locale(const Home& home) {
-    const Language* language = need_named(tree_.languages, home.language);
+    const Language* language = need_named(ObjectType::language, tree_.languages, home.language);
     std::vector<const Territory*> territories;
     for (const std::string& name : words(home.territories)) {
-      if (const Territory* territory = need_named(tree_.territories, name)) territories.push_back(territory);
+      if (const Territory* territory = need_named(ObjectType::territory, tree_.territories, name))
+        territories.push_back(territory);
     }
     for (const std::string& name : words(home.code_pages)) {
-      const CodePage* page = need_named(tree_.code_pages, name);
+      const CodePage* page = need_named(ObjectType::code_page, tree_.code_pages, name);
       if (page == nullptr) continue;
       if (language != nullptr) representable(*language, *page);
       for (const Territory* territory : territories) representable(*territory, *page);
@@ -254,7 +255,8 @@ class TreeLint {
       }
       for (const CodePage& other : tree_.code_pages) {
         if (&other == page) continue;
-        if (folded(other.name) == folded(alias.alias)) error("\"" + alias.alias + "\" is the name of another code page");
+        if (folded(other.name) == folded(alias.alias))
+          error("\"" + alias.alias + "\" is the name of another code page");
         if (std::to_string(other.id) == alias.alias) error(alias.alias + " is the number of another code page");
       }
     }

@@ -54,11 +54,10 @@ int run_check(const std::vector<fs::path>& paths) {
 
 int run_builtin(const fs::path& sources, const fs::path& output) {
   Report report;
-  BuiltinSources made = make_builtin_sources(sources, report);
+  std::string made = make_builtin_source(sources, report);
   report.print(std::cerr);
   if (!report.clean()) return kBadData;
-  write_file(output / "builtin_images.hpp", made.images);
-  write_file(output / "builtin_objects.cpp", made.objects);
+  write_file(output / "builtin_objects.cpp", made);
   return kDone;
 }
 
@@ -90,7 +89,7 @@ int run(int argc, char** argv) {
 
   CLI::App* builtin = app.add_subcommand("builtin", "Make the C++ source of the built-in objects");
   builtin->add_option("SOURCE_DIR", sources, "Directory of the sources")->required();
-  builtin->add_option("OUTPUT_DIR", output, "Where builtin_images.hpp and builtin_objects.cpp are written")->required();
+  builtin->add_option("OUTPUT_DIR", output, "Where builtin_objects.cpp is written")->required();
   builtin->callback([&] { result = run_builtin(sources, output); });
 
   try {

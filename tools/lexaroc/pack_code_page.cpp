@@ -52,8 +52,8 @@ void fill_header(Header& header, const CodePage& page, const UnicodeTables& unic
       header.char_length[code_byte(code, length, 0)] = static_cast<uint8_t>(length);
     }
   }
-  header.flags = static_cast<uint16_t>((page.family == Family::ascii ? kAsciiFamily : 0) |
-                                       (page.mixed() ? kShiftSensitive : 0));
+  header.flags =
+      static_cast<uint16_t>((page.family == Family::ascii ? kAsciiFamily : 0) | (page.mixed() ? kShiftSensitive : 0));
 }
 
 // The tables behind the header of a multibyte page.

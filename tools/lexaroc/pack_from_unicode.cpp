@@ -62,7 +62,9 @@ std::string pool_bytes(Pool& pool) {
 FromUnicodeSections pack(std::vector<Page> pages) {
   // Pages that need nothing before them come first, so that the rest can begin after them.
   std::stable_sort(pages.begin(), pages.end(), [](const Page& a, const Page& b) {
-    auto rank = [](const Page& page) { return std::pair(page.low & page.mask(), -static_cast<int>(page.values.size())); };
+    auto rank = [](const Page& page) {
+      return std::pair(page.low & page.mask(), -static_cast<int>(page.values.size()));
+    };
     return rank(a) < rank(b);
   });
   FromUnicodeSections result{};
@@ -71,9 +73,14 @@ FromUnicodeSections pack(std::vector<Page> pages) {
   for (const Page& page : pages) {
     const FromUnicodeKind& kind = kFromUnicodeKinds[page.kind];
     size_t value_offset = place(values, page, kind.value_width, 0);
-    size_t high_offset = kind.high_part_width == 0 ? 0 : place(high_parts, page, kind.high_part_width, kind.high_part_shift);
+    size_t high_offset =
+        kind.high_part_width == 0 ? 0 : place(high_parts, page, kind.high_part_width, kind.high_part_shift);
     // An offset that does not fit belongs to a section that is too large, which the caller sees.
-    result.pages[page.number] = {page.kind,   page.mask(), page.low, page.high(), static_cast<uint16_t>(value_offset),
+    result.pages[page.number] = {page.kind,
+                                 page.mask(),
+                                 page.low,
+                                 page.high(),
+                                 static_cast<uint16_t>(value_offset),
                                  static_cast<uint16_t>(high_offset)};
   }
   result.values = pool_bytes(values);

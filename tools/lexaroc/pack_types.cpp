@@ -41,7 +41,8 @@ class TypeWalk {
     TypeTables result;
     for (const TypeState& state : states_) {
       result.states += bytes_of(state);
-      if (state.final != 0) result.reach = std::max(result.reach, (size_t{state.index} + state.mask + 1) * sizeof(TypeEntry));
+      if (state.final != 0)
+        result.reach = std::max(result.reach, (size_t{state.index} + state.mask + 1) * sizeof(TypeEntry));
     }
     for (uint64_t entry : pool_.take(kNothing)) {
       TypeEntry record{static_cast<uint32_t>(entry >> 32), static_cast<int32_t>(static_cast<uint32_t>(entry))};
@@ -119,7 +120,9 @@ uint64_t type_entry(const CodePage& page, const UnicodeTables& unicode, Code cod
   uint32_t flags = unicode.type(value);
   // A titlecase letter is both; one entry has one partner, and comparison folds to upper case.
   if ((flags & kUpper) != 0 && (flags & kLower) != 0) flags &= ~kUpper;
-  uint16_t partner = (flags & kLower) != 0 ? unicode.upper(value) : (flags & kUpper) != 0 ? unicode.lower(value) : value;
+  uint16_t partner = (flags & kLower) != 0   ? unicode.upper(value)
+                     : (flags & kUpper) != 0 ? unicode.lower(value)
+                                             : value;
   Code partner_code = partner == value ? kNoCode : page.exact_code(partner);
   return packed(flags, partner_code == kNoCode ? 0 : int64_t{partner_code} - int64_t{code});
 }

@@ -51,6 +51,7 @@ std::vector<DirectoryEntry> SourceTree::entries() const {
 
 SourceTree read_source_tree(const fs::path& directory, const std::set<uint16_t>& only, Report& report) {
   SourceTree tree;
+  tree.directory = directory;
   tree.unicode = UnicodeTables::read(directory / "unicode", report);
   tree.languages = read_objects<Language>(directory, ObjectType::language, {}, report, read_language);
   tree.territories = read_objects<Territory>(directory, ObjectType::territory, {}, report, read_territory);

@@ -23,6 +23,7 @@ inline constexpr const char* kAliasFile = "alias.txt";
 const char* source_folder(ObjectType type);
 
 struct SourceTree {
+  fs::path directory;
   std::optional<UnicodeTables> unicode;
   std::vector<Language> languages;
   std::vector<Territory> territories;
@@ -33,6 +34,8 @@ struct SourceTree {
 
   // All objects in the order of the control file.
   std::vector<DirectoryEntry> entries() const;
+  // Where the sources of a type stand.
+  std::string folder(ObjectType type) const { return (directory / source_folder(type)).string(); }
 };
 
 // Reads everything; what is wrong goes to the report, and the object is left out. `only` limits the code pages by id

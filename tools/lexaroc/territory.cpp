@@ -30,7 +30,9 @@ std::string write_amount_form(const AmountForm& form) {
          " sign " + std::to_string(form.sign_position);
 }
 
-bool is_sign(TerritoryText text) { return text == TerritoryText::positive_sign || text == TerritoryText::negative_sign; }
+bool is_sign(TerritoryText text) {
+  return text == TerritoryText::positive_sign || text == TerritoryText::negative_sign;
+}
 
 uint16_t flag(bool set, uint16_t bit) { return set ? bit : 0; }
 
@@ -114,12 +116,12 @@ std::string pack_territory(const Territory& territory) {
   header.positive_sign_position = territory.positive.sign_position;
   header.negative_sign_position = territory.negative.sign_position;
   header.value84 = territory.item84;
-  header.flags = static_cast<uint16_t>(
-      flag(territory.item58, kTerritoryYesNo) | flag(territory.positive.symbol_precedes, kPositiveSymbolPrecedes) |
-      flag(territory.positive.symbol_spaced, kPositiveSymbolSpaced) |
-      flag(territory.negative.symbol_precedes, kNegativeSymbolPrecedes) |
-      flag(territory.negative.symbol_spaced, kNegativeSymbolSpaced) | flag(territory.item82, kYesNo82) |
-      flag(territory.item83, kYesNo83));
+  header.flags = static_cast<uint16_t>(flag(territory.item58, kTerritoryYesNo) |
+                                       flag(territory.positive.symbol_precedes, kPositiveSymbolPrecedes) |
+                                       flag(territory.positive.symbol_spaced, kPositiveSymbolSpaced) |
+                                       flag(territory.negative.symbol_precedes, kNegativeSymbolPrecedes) |
+                                       flag(territory.negative.symbol_spaced, kNegativeSymbolSpaced) |
+                                       flag(territory.item82, kYesNo82) | flag(territory.item83, kYesNo83));
   TextPool texts(sizeof header);
   for (unsigned i = 0; i < kTerritoryTexts; ++i) header.text_offsets[i] = texts.place(territory.texts[i]);
   return std::string(bytes_of(header)) + texts.bytes();

@@ -22,8 +22,8 @@ inline constexpr unsigned kSeparators = 5;
 inline constexpr const char* kSeparatorKeys[kSeparators] = {"decimal", "thousands", "list", "mon-decimal",
                                                             "mon-thousands"};
 inline constexpr const char* kTerritoryTextKeys[kTerritoryTexts] = {
-    "abbreviation", "own-name",      "grouping", "mon-grouping", "currency", "currency-intl", "positive-sign",
-    "negative-sign", "time", "short-date", "long-date"};
+    "abbreviation",  "own-name",      "grouping", "mon-grouping", "currency", "currency-intl",
+    "positive-sign", "negative-sign", "time",     "short-date",   "long-date"};
 
 struct Territory {
   uint16_t id = 0;

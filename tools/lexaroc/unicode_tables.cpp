@@ -20,15 +20,15 @@ struct Block {
 constexpr Block kTypeBlocks[] = {{"1", 0x0000, 0x06F9}, {"2", 0x0901, 0x0EDD}, {"3", 0x10A0, 0x11F9},
                                  {"4", 0x1E00, 0x21FF}, {"5", 0x22F2, 0x27BE}, {"6", 0x3000, 0x33FE},
                                  {"7", 0xFB00, 0xFBD2}, {"8", 0xFD3E, 0xFFFF}};
-constexpr Block kCaseBlocks[] = {
-    {"lower 1", 0x0100, 0x01FE}, {"lower 2", 0x0200, 0x0275}, {"lower 3", 0x0380, 0x03EE}, {"lower 4", 0x0400, 0x04F8},
-    {"lower 5", 0x1E00, 0x1EF8}, {"lower 6", 0x1F00, 0x1FFC}, {"upper 1", 0x0100, 0x01FF}, {"upper 2", 0x0200, 0x0292},
-    {"upper 3", 0x03A0, 0x03F1}, {"upper 4", 0x0430, 0x04F9}, {"upper 5", 0x1E00, 0x1EF9}, {"upper 6", 0x1F00, 0x1FF3}};
+constexpr Block kCaseBlocks[] = {{"lower 1", 0x0100, 0x01FE}, {"lower 2", 0x0200, 0x0275}, {"lower 3", 0x0380, 0x03EE},
+                                 {"lower 4", 0x0400, 0x04F8}, {"lower 5", 0x1E00, 0x1EF8}, {"lower 6", 0x1F00, 0x1FFC},
+                                 {"upper 1", 0x0100, 0x01FF}, {"upper 2", 0x0200, 0x0292}, {"upper 3", 0x03A0, 0x03F1},
+                                 {"upper 4", 0x0430, 0x04F9}, {"upper 5", 0x1E00, 0x1EF9}, {"upper 6", 0x1F00, 0x1FF3}};
 constexpr Block kWidthBlocks[] = {{"H2F1", 0x00A0, 0x00AF}, {"H2F2", 0xFF60, 0xFFEE}, {"F2H1", 0x2500, 0x25CB},
                                   {"F2H2", 0x3000, 0x30FC}, {"F2H3", 0x3130, 0x3164}, {"F2H4", 0xFFE0, 0xFFE6}};
 
-constexpr const char* kClasses[] = {"alpha", "upper", "lower", "digit", "xdigit", "punct",
-                                    "space", "blank", "cntrl", "ascii"};
+constexpr const char* kClasses[] = {"alpha", "upper", "lower", "digit", "xdigit",
+                                    "punct", "space", "blank", "cntrl", "ascii"};
 constexpr const char* kDirections[] = {"-", "L", "R", "EN", "ES", "ET", "AN", "CS", "B", "S", "WS", "ON"};
 constexpr const char* kForms[] = {"nonspacing", "diacritic", "vowel",     "symbol",    "katakana",
                                   "hiragana",   "halfwidth", "fullwidth", "ideograph", "kashida"};
@@ -115,8 +115,8 @@ UnicodeTables::UnicodeTables() : type_(65536), lower_(65536), upper_(65536), ful
     uint16_t first, last;
     int difference;
     bool both_ways;
-  } kPairs[] = {{0x41, 0x5A, 32, true},       {0xC0, 0xDE, 32, true},       {0x531, 0x556, 48, true},
-                {0x10A0, 0x10C5, 48, false},  {0x2160, 0x216F, 16, true},   {0x24B6, 0x24CF, 26, true},
+  } kPairs[] = {{0x41, 0x5A, 32, true},      {0xC0, 0xDE, 32, true},     {0x531, 0x556, 48, true},
+                {0x10A0, 0x10C5, 48, false}, {0x2160, 0x216F, 16, true}, {0x24B6, 0x24CF, 26, true},
                 {0xFF21, 0xFF3A, 32, true}};
   for (const auto& pair : kPairs) {
     add(lower_, pair.first, pair.last, pair.difference);

@@ -1,0 +1,431 @@
+// SPDX-License-Identifier: Apache-2.0
+// The data compiler, as its users run it: the program LEXAROC_PATH on the sources in LEXARO_SOURCE_DATA.
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+
+#include <algorithm>
+#include <cstdio>
+#include <cstdlib>
+#include <deque>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <map>
+#include <string>
+#include <vector>
+
+namespace {
+
+namespace fs = std::filesystem;
+
+struct Outcome {
+  int exit_code;
+  std::string output;  // both streams
+};
+
+Outcome lexaroc(const std::string& arguments) {
+  FILE* pipe = popen((std::string("'") + LEXAROC_PATH + "' " + arguments + " 2>&1").c_str(), "r");
+  if (pipe == nullptr) return {-1, "cannot run the compiler"};
+  std::string output;
+  char block[4096];
+  for (size_t count; (count = fread(block, 1, sizeof block, pipe)) != 0;) output.append(block, count);
+  int status = pclose(pipe);
+  return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, output};
+}
+
+std::string quoted(const fs::path& path) { return "'" + path.string() + "'"; }
+
+std::string content(const fs::path& path) {
+  std::ifstream file(path, std::ios::binary);
+  return {std::istreambuf_iterator<char>(file), {}};
+}
+
+void write(const fs::path& path, const std::string& bytes) {
+  std::ofstream(path, std::ios::binary | std::ios::trunc) << bytes;
+}
+
+std::map<std::string, std::string> files_in(const fs::path& directory) {
+  std::map<std::string, std::string> files;
+  for (const auto& entry : fs::directory_iterator(directory)) {
+    files[entry.path().filename().string()] = content(entry.path());
+  }
+  return files;
+}
+
+std::string without_comments(const std::string& text) {
+  std::string rest;
+  for (size_t at = 0; at < text.size();) {
+    size_t end = text.find('\n', at);
+    end = end == std::string::npos ? text.size() : end + 1;
+    if (text[at] != '#') rest += text.substr(at, end - at);
+    at = end;
+  }
+  return rest;
+}
+
+// The folder of an object's source, by the prefix of its file name.
+std::string folder_of(const std::string& stem) {
+  return stem[0] == 'l' ? "language" : stem[0] == 't' ? "territory" : "codepage";
+}
+
+class CompilerTest : public testing::Test {
+ protected:
+  CompilerTest() {
+    std::string name = (fs::temp_directory_path() / "lexaroc.XXXXXX").string();
+    if (mkdtemp(name.data()) != nullptr) work_ = name;
+  }
+  ~CompilerTest() override {
+    if (!work_.empty()) fs::remove_all(work_);
+  }
+  void SetUp() override { ASSERT_FALSE(work_.empty()); }
+
+  fs::path work(const std::string& name) const { return work_ / name; }
+
+  void compile(const fs::path& sources, const fs::path& output, const std::string& options = "") {
+    Outcome outcome = lexaroc("data " + options + " " + quoted(sources) + " " + quoted(output));
+    ASSERT_EQ(outcome.exit_code, 0) << outcome.output;
+    EXPECT_EQ(outcome.output, "");
+  }
+
+  // A source tree of what dump prints for each object of a data directory.
+  void dump_all(const fs::path& compiled, const fs::path& sources) {
+    fs::create_directories(sources);
+    fs::copy(data_ / "unicode", sources / "unicode");
+    fs::copy(compiled / "alias.txt", sources);
+    for (const char* folder : {"language", "territory", "codepage"}) fs::create_directory(sources / folder);
+    for (const auto& entry : fs::directory_iterator(compiled)) {
+      std::string stem = entry.path().stem().string();
+      if (entry.path().extension() != ".nls" || stem == "control") continue;
+      fs::path source = sources / folder_of(stem) / (stem + ".txt");
+      Outcome outcome = lexaroc("dump " + quoted(entry.path()) + " -o " + quoted(source));
+      ASSERT_EQ(outcome.exit_code, 0) << outcome.output;
+    }
+  }
+
+  // A few sources of each type, to be broken.
+  fs::path small_tree() {
+    fs::path tree = work("small");
+    fs::remove_all(tree);
+    for (const char* folder : {"language", "territory", "codepage"}) fs::create_directories(tree / folder);
+    fs::copy(data_ / "unicode", tree / "unicode");
+    for (const char* name : {"language/la_00002.txt", "territory/te_00276.txt", "codepage/cp_00930.txt",
+                             "codepage/cp_00367.txt", "codepage/cp_00954.txt"}) {
+      fs::copy(data_ / name, tree / name);
+    }
+    write(tree / "alias.txt", "US-ASCII ascii\n    us\n");
+    return tree;
+  }
+
+  const fs::path data_ = LEXARO_SOURCE_DATA;
+
+ private:
+  fs::path work_;
+};
+
+TEST_F(CompilerTest, OutputIsReproducible) {
+  compile(data_, work("one"));
+  compile(data_, work("two"));
+  compile(data_, work("two"));  // again, over what is there
+  auto files = files_in(work("one"));
+  EXPECT_EQ(files, files_in(work("two")));
+  EXPECT_EQ(files.count("control.nls"), 1u);
+  EXPECT_EQ(files["alias.txt"], content(data_ / "alias.txt"));
+}
+
+TEST_F(CompilerTest, DumpGivesTheSourcesBack) {
+  compile(data_, work("compiled"));
+  dump_all(work("compiled"), work("dumped"));
+  for (const char* folder : {"language", "territory", "codepage"}) {
+    auto dumped = files_in(work("dumped") / folder);
+    auto sources = files_in(data_ / folder);
+    EXPECT_EQ(dumped.size(), sources.size());
+    for (const auto& [name, text] : sources) {
+      EXPECT_TRUE(without_comments(dumped[name]) == without_comments(text)) << name << " is not in the form of dump";
+    }
+  }
+  compile(work("dumped"), work("again"));
+  EXPECT_TRUE(files_in(work("compiled")) == files_in(work("again")));
+}
+
+TEST_F(CompilerTest, OlderLayoutGoesRound) {
+  const std::string options = "--layout=1 --only 37,367,819,970";
+  compile(data_, work("compiled"), options);
+  auto files = files_in(work("compiled"));
+  EXPECT_EQ(files["cp_00037.nls"][4], 0x10);
+  EXPECT_EQ(files.count("cp_00930.nls"), 0u);
+  EXPECT_EQ(lexaroc("check " + quoted(work("compiled"))).output, "");
+  dump_all(work("compiled"), work("dumped"));
+  EXPECT_TRUE(without_comments(content(work("dumped") / "codepage/cp_00970.txt")) ==
+              without_comments(content(data_ / "codepage/cp_00970.txt")));
+  compile(work("dumped"), work("again"), options);
+  EXPECT_TRUE(files == files_in(work("again")));
+}
+
+TEST_F(CompilerTest, PagesThatTheOlderLayoutCannotHoldAreRefused) {
+  for (const char* id : {"930", "932", "954", "57352"}) {
+    Outcome outcome =
+        lexaroc(std::string("data --layout=1 --only ") + id + " " + quoted(data_) + " " + quoted(work("x")));
+    EXPECT_EQ(outcome.exit_code, 1) << id;
+    EXPECT_NE(outcome.output.find("version-1 layout"), std::string::npos) << outcome.output;
+  }
+}
+
+TEST_F(CompilerTest, ShippedDataIsClean) {
+  Outcome sources = lexaroc("check " + quoted(data_));
+  EXPECT_EQ(sources.exit_code, 0) << sources.output;
+  compile(data_, work("compiled"));
+  Outcome compiled = lexaroc("check " + quoted(work("compiled")));
+  EXPECT_EQ(compiled.exit_code, 0) << compiled.output;
+}
+
+TEST_F(CompilerTest, BuiltInObjectsAreUpToDate) {
+  fs::path objects = data_.parent_path() / "objects";
+  fs::create_directory(work("made"));
+  Outcome outcome = lexaroc("builtin " + quoted(data_) + " " + quoted(work("made")));
+  ASSERT_EQ(outcome.exit_code, 0) << outcome.output;
+  for (const auto& [name, text] : files_in(work("made"))) {
+    EXPECT_TRUE(content(objects / name) == text) << "run: lexaroc builtin data objects";
+  }
+}
+
+// One line of a source is replaced.
+struct BrokenSource {
+  const char* file;
+  const char* line;  // the line that begins so
+  const char* replacement;
+  unsigned line_offset;  // the fault is reported so many lines further on,
+  unsigned column;       // and in this column
+  const char* message;   // or its beginning
+};
+constexpr unsigned kEnd = ~0u;        // the line after the last
+constexpr unsigned kElsewhere = ~1u;  // a line that the case does not care about
+
+// Breaks a source for as long as it lives.
+class Fault {
+ public:
+  Fault(const fs::path& tree, const BrokenSource& broken)
+      : broken_(broken), path_(tree / broken.file), sound_(content(path_)) {
+    std::string text = "\n" + sound_;
+    size_t at = text.find(std::string("\n") + broken.line);
+    if (at == std::string::npos) {
+      ADD_FAILURE() << broken.file << " has no line " << broken.line;
+      return;
+    }
+    text.erase(0, 1);
+    text.replace(at, text.find('\n', at) - at, broken.replacement);
+    auto end = text.begin() + (broken.line_offset == kEnd ? static_cast<long>(text.size()) : static_cast<long>(at));
+    line_ = std::count(text.begin(), end, '\n') + 1 + (broken.line_offset == kEnd ? 0 : broken.line_offset);
+    write(path_, text);
+  }
+  Fault(const Fault&) = delete;
+  Fault& operator=(const Fault&) = delete;
+  ~Fault() { write(path_, sound_); }
+
+  void expect_in(const Outcome& outcome) const {
+    std::string expected = path_.string() + ":" + std::to_string(line_) + ":" + std::to_string(broken_.column) + ": ";
+    if (broken_.line_offset == kElsewhere) expected.clear();
+    expected += broken_.message;
+    EXPECT_EQ(outcome.exit_code, 1) << broken_.replacement;
+    EXPECT_NE(outcome.output.find(expected), std::string::npos)
+        << "expected " << expected << "\ngot " << outcome.output;
+  }
+
+ private:
+  const BrokenSource& broken_;
+  fs::path path_;
+  std::string sound_;
+  long line_ = 0;
+};
+
+constexpr const char* kGerman = "language/la_00002.txt";
+constexpr const char* kGermany = "territory/te_00276.txt";
+constexpr const char* kMixed = "codepage/cp_00930.txt";
+constexpr const char* kAscii = "codepage/cp_00367.txt";
+constexpr const char* kEuc = "codepage/cp_00954.txt";
+
+const BrokenSource kBroken[] = {
+    // What every source has in common
+    {kGerman, "pm = ", "pm = A\x01", 0, 7, "a control character, or bytes that are not UTF-8"},
+    {kGerman, "pm = ", "pm = \xC3\xA4\xC3", 0, 7, "a control character, or bytes that are not UTF-8"},
+    {kGerman, "pm = ", "pm = \xED\xA0\x80", 0, 6, "a control character, or bytes that are not UTF-8"},
+    {kGerman, "pm = ", "pm = \xC0\xAF", 0, 6, "a control character, or bytes that are not UTF-8"},
+    {kGerman, "id = ", "\xEF\xBB\xBFid = 2", 0, 1, "expected a key"},
+    // Fields
+    {kGerman, "pm = ", "pm = a\nam = b", 1, 1, "\"am\" is given twice"},
+    {kGerman, "pm = ", "pn = x", 0, 1, "unknown key \"pn\""},
+    {kGerman, "pm = ", "# pm", kEnd, 1, "\"pm\" is missing"},
+    {kGerman, "pm = ", "pm", 0, 3, "expected a blank"},
+    {kGerman, "pm = ", "pm = ", 0, 6, "text that is empty or begins with a blank needs quotes"},
+    {kGerman, "pm = ", "pm = x ", 0, 7, "text that ends in a blank needs quotes"},
+    {kGerman, "pm = ", "pm = \"x", 0, 8, "expected \"\"\""},
+    {kGerman, "pm = ", "pm = \"x\"y", 0, 9, "expected the end of the line"},
+    {kGerman, "pm = ", "pm = x\\n", 0, 7, "an unknown escape"},
+    {kGerman, "pm = ", "pm = \\u00e4", 0, 10, "expected 4 hexadecimal digits in upper case"},
+    {kGerman, "pm = ", "pm = \\uD800", 0, 8, "a surrogate is no character"},
+    {kGerman, "pm = ", "pm = x\\u0000", 0, 7, "a text cannot contain U+0000"},
+    {kGerman, "pm = ", "pm = x\xC2\xA0y", 0, 7, "U+00A0 must be written as an escape"},
+    {kGerman, "pm = ", "pm = \xF0\x9F\x98\x80", 0, 6, "only characters up to U+FFFF are possible"},
+    {kGerman, "name = ", "name = A_B", 0, 8, "a name cannot contain"},
+    {kGerman, "name = ", "name = abcdefghijklmnopqrstuvwxyzabcdefg", 0, 8, "the name is longer than 32"},
+    {kGerman, "default-territory = ", "default-territory = 65536", 0, 21, "the number is larger than 65535"},
+    {kGerman, "default-territory = ", "default-territory = -1", 0, 21, "expected a number"},
+    {kGerman, "special.upper = ", "special.upper = 00DF = 0053 0053 0053", 0, 33, "expected the end of the line"},
+    {kGermany, "decimal = ", "decimal = \",,\"", 0, 11, "a separator is one character"},
+    {kGermany, "positive = ", "positive = precedes 2 space 0 sign 1", 0, 21, "the number is larger than 1"},
+    {kGermany, "positive = ", "positive = precedes 1 sign 1", 0, 23, "expected \"space N\""},
+    {kGermany, "item58 = ", "item58 = 2", 0, 10, "the number is larger than 1"},
+    // Code pages
+    {kAscii, "id ", "id 368", kElsewhere, 0, "the id is not that of the file name"},
+    {kAscii, "family ", "family greek", 0, 8, "the family is ascii or ebcdic"},
+    {kAscii, "kind ", "kind wide", 0, 6, "the kind is single, multibyte, mixed or utf8"},
+    {kAscii, "kind ", "# no kind", kEnd, 1, "\"kind\" is missing"},
+    {kAscii, "kind ", "kind mixed", kEnd, 1, "a mixed page needs \"shift\""},
+    {kAscii, "kind ", "kind multibyte", kEnd, 1, "a page of this kind needs characters of several bytes"},
+    {kAscii, "substitution ", "substitution 9A", kElsewhere, 0, "the substitution byte is no character"},
+    {kAscii, "line-ends ", "line-ends 0A 0D", 0, 16, "expected a blank"},
+    {kAscii, "50 ", "40 A", 0, 4, "the bytes 40 are given twice"},
+    {kAscii, "50 ", "50 \\{0050-005F}x", 1, 4, "the bytes 60 are given twice"},
+    {kAscii, "70 ", "FF ab", 0, 5, "the row runs past the byte FF"},
+    {kAscii, "70 ", "FF \\-{2}", 0, 4, "the row runs past the byte FF"},
+    {kAscii, "70 ", "70 \\uFFFD", 0, 4, "U+FFFD stands for bytes that are no character"},
+    {kAscii, "70 ", "70 a b", 0, 5, "U+0020 must be written as an escape"},
+    {kAscii, "70 ", "70 \xCC\x81", 0, 4, "U+0301 must be written as an escape"},
+    {kAscii, "70 ", "70 \\x41", 0, 4, "an unknown escape"},
+    {kAscii, "70 ", "70 \\{0041-0040}", 0, 4, "the range is empty or too wide"},
+    {kAscii, "70 ", "70 \\{D7FF-E000}", 0, 4, "the range is empty or too wide"},
+    {kAscii, "70 ", "7 a", 0, 2, "expected 2 hexadecimal digits in upper case"},
+    {kAscii, "70 ", "7A7A a", 0, 1, "too many bytes for a page of this kind"},
+    {kAscii, "70 ", "70", 0, 3, "expected a blank"},
+    {kAscii, "70 ", "70 p\nkind single", 1, 1, "\"kind\" must stand before the characters"},
+    {kAscii, "70 ", "70 p\nfrom U+00A0 71", 1, 13, "these bytes are no character of the page"},
+    {kAscii, "70 ", "70 p\nfrom U+0070 41", 1, 6, "the character has bytes already"},
+    {kAscii, "70 ", "70 p\nfrom U+00A0 1A", 1, 13, "characters without bytes become the substitution anyway"},
+    {kAscii, "70 ", "70 p\nprefer U+0070 41", 1, 15, "the bytes stand for another character"},
+    {kAscii, "70 ", "70 p\nprefer U+0070 70", 1, 15, "these bytes are taken anyway"},
+    {kAscii, "70 ", "70 p\nfrom U+00A0 41\n71 q", 2, 1, "characters must stand before"},
+    {kMixed, "shift ", "shift 0E 0E", 0, 9, "the shift bytes must differ"},
+    {kMixed, "00 ", "0E \\u000E", 0, 4, "a shift byte is no character"},
+    {kMixed, "4040 ", "404040 \\u3000", 0, 1, "too many bytes for a page of this kind"},
+    {kMixed, "4040 ", "4000 a", 0, 6, "a later byte of a character cannot be 00"},
+    {kMixed, "4040 ", "0041 a", 0, 1, "the first byte of several cannot be 00"},
+    {kEuc, "70 ", "A1 a", kElsewhere, 0, "the byte A1 begins characters of different length"},
+    {kEuc, "A2A1 ", "A1A1A1 a", 0, 8, "the byte A1 begins characters of different length"},
+    // Aliases and Unicode tables
+    {"alias.txt", "US-ASCII", " early", 0, 1, "aliases without a code page"},
+    {"alias.txt", "    us", "    us US", 0, 8, "\"US\" is given twice"},
+    {"alias.txt", "    us", "    \xC3\xA4", 0, 5, "expected an alias"},
+    {"unicode/case.txt", "0102 0103", "0100 0101", 0, 1, "out of order, or outside its table"},
+    {"unicode/case.txt", "table lower 2", "table lower 3 0380 03EE", 0, 7, "expected \"lower 2 0200 0275\""},
+    {"unicode/ctype.txt", "0009 ;", "0009 ; spice ; S ;", 0, 8, "unknown property \"spice\""},
+    {"unicode/ctype.txt", "0009 ;", "0009 ; space ; S L ;", 0, 16, "expected one direction"},
+    {"unicode/digits.txt", "0031 0031", "0032 0032", 1, 1, "out of order"},
+};
+
+TEST_F(CompilerTest, BrokenSourcesAreNamedByPlace) {
+  fs::path tree = small_tree();
+  for (const BrokenSource& broken : kBroken) {
+    Fault fault(tree, broken);
+    fault.expect_in(lexaroc("data " + quoted(tree) + " " + quoted(work("out"))));
+  }
+  EXPECT_FALSE(fs::exists(work("out")));
+  compile(tree, work("out"));
+}
+
+// Sources that compile but that users should not get.
+const BrokenSource kBad[] = {
+    {kGermany, "decimal = ", "decimal = \"\\u00A0\"", 0, 11, "a separator must be an ASCII character"},
+    {kGermany, "decimal = ", "decimal = \"1\"", 0, 11, "a separator cannot be a digit"},
+    {kGermany, "decimal = ", "decimal = \"\"", 0, 11, "a decimal separator is needed"},
+    {kGermany, "thousands = ", "thousands = \",\"", 0, 13, "the same character as the decimal separator"},
+    {kGermany, "grouping = ", "grouping = 3", 0, 12, "expected group sizes that end in 0"},
+    {kGermany, "mon-grouping = ", "mon-grouping = 3;0;0", 0, 16, "expected group sizes that end in 0"},
+    {kGermany, "time = ", "time = %H:%N", 0, 8, "an unknown directive"},
+    {kGermany, "time = ", "time = %H:%", 0, 8, "an unknown directive"},
+    {kGermany, "negative-sign = ", "negative-sign = \"minus\"", 0, 17, "the sign is longer than 3 characters"},
+    {kAscii, "40 ", "40 \\u2020ABCDEFGHIJKLMNO", kElsewhere, 0,
+     "on every page of this family, 40 is U+0040, both ways"},
+    {kAscii, "line-ends ", "line-ends 0A 0D 0B 0A", kElsewhere, 0, "line end 0A is given twice"},
+    {kEuc, "line-ends ", "line-ends 0A 0D 0B 8F", kElsewhere, 0, "line end 8F is no character"},
+    {kMixed, "F0 ", "F0 1023456789", kElsewhere, 0, "on every page of this family, F0 is U+0030, both ways"},
+};
+
+TEST_F(CompilerTest, CheckFindsWhatCompiles) {
+  fs::path tree = small_tree();
+  for (const BrokenSource& bad : kBad) {
+    Fault fault(tree, bad);
+    fault.expect_in(lexaroc("check " + quoted(tree / bad.file)));
+    compile(tree, work("out"));
+  }
+  for (const BrokenSource& bad : kBad) EXPECT_EQ(lexaroc("check " + quoted(tree / bad.file)).output, "");
+}
+
+// Faults that show only when all sources are seen together.
+TEST_F(CompilerTest, CheckSeesTheWholeTree) {
+  const BrokenSource cases[] = {
+      {"language/la_00033.txt", "pm = ", "pm = \xC3\xBC", 0, 6, "U+00FC does not exist in ISO-8859-5"},
+      {"language/la_00033.txt", "own-name = ",
+       "own-name = \xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F"
+       "\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F\xD1\x8F",
+       0, 12, "longer than 31 bytes in "},
+      {"language/la_00033.txt", "default-codepage = ", "default-codepage = 4711", 0, 20, "there is no such codepage"},
+      {"language/la_00033.txt", "default-sort = ", "default-sort = 99", 0, 16, "there is no such sort"},
+      {"territory/te_00643.txt", "name = ", "name = Rossija", kElsewhere, 0, "no object has the name \"Russia\""},
+      {"territory/te_00250.txt", "time = ", "time = %#H:%M:%S", 0, 8, "\"#\" cannot be used"},
+      {"alias.txt", "KOI8-R ", "KOI8-R cp878 57371", 0, 14, "57371 is the number of another code page"},
+      {"alias.txt", "KOI8-U ", "KOI8-X cp1168", 0, 8, "there is no code page \"KOI8-X\""},
+  };
+  fs::path tree = work("tree");
+  fs::copy(data_, tree, fs::copy_options::recursive);
+  std::deque<Fault> faults;
+  for (const BrokenSource& bad : cases) faults.emplace_back(tree, bad);
+  Outcome outcome = lexaroc("check " + quoted(tree));
+  for (const Fault& fault : faults) fault.expect_in(outcome);
+}
+
+TEST_F(CompilerTest, FailedRunLeavesTheOldFiles) {
+  fs::path tree = small_tree();
+  compile(tree, work("out"));
+  auto before = files_in(work("out"));
+  write(tree / kAscii, "nonsense\n");
+  EXPECT_EQ(lexaroc("data " + quoted(tree) + " " + quoted(work("out"))).exit_code, 1);
+  EXPECT_TRUE(files_in(work("out")) == before);
+}
+
+TEST_F(CompilerTest, ExitCodesTellUsageFromTheSystem) {
+  EXPECT_EQ(lexaroc("").exit_code, 2);
+  EXPECT_EQ(lexaroc("data " + quoted(data_)).exit_code, 2);
+  EXPECT_EQ(lexaroc("data --layout=3 " + quoted(data_) + " x").exit_code, 2);
+  EXPECT_EQ(lexaroc("frobnicate").exit_code, 2);
+  EXPECT_EQ(lexaroc("--help").exit_code, 0);
+  EXPECT_EQ(lexaroc("data " + quoted(work("nowhere")) + " " + quoted(work("out"))).exit_code, 3);
+  EXPECT_EQ(lexaroc("check " + quoted(work("nowhere.txt"))).exit_code, 3);
+  EXPECT_EQ(lexaroc("dump " + quoted(work("cp_00037.nls"))).exit_code, 3);
+}
+
+// Whatever stands in a compiled file, check and dump end with a message or accept it.
+TEST_F(CompilerTest, DamagedFilesAreRefusedOrHarmless) {
+  compile(data_, work("compiled"), "--only 37,970,57352");
+  for (const char* name :
+       {"cp_00970.nls", "cp_57352.nls", "cp_00037.nls", "la_00002.nls", "te_00276.nls", "control.nls"}) {
+    const std::string sound = content(work("compiled") / name);
+    fs::path damaged = work(name);
+    for (unsigned round = 0; round < 40; ++round) {
+      std::string bytes = sound;
+      if (round % 4 == 0) {
+        bytes.resize(bytes.size() * round / 40);
+      } else {
+        // Headers, and the tables that steer the walks, are near the start of their sections.
+        size_t at =
+            (round * 7919u + round * round * 104729u) % std::min<size_t>(bytes.size(), round % 4 == 1 ? 76 : 6000);
+        bytes[at] = static_cast<char>(bytes[at] ^ (1 << round % 8) ^ (round % 3 == 0 ? 0x7F : 0));
+      }
+      write(damaged, bytes);
+      int checked = lexaroc("check " + quoted(damaged)).exit_code;
+      int dumped = lexaroc("dump " + quoted(damaged)).exit_code;
+      EXPECT_TRUE(checked == 0 || checked == 1) << name << " round " << round;
+      EXPECT_EQ(checked, dumped) << name << " round " << round;
+    }
+  }
+}
+
+}  // namespace
