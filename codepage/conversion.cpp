@@ -59,6 +59,14 @@ uint8_t state_of(const Side& side) {
   }
 }
 
+void deliver_pending(LXConversion& handle, Output& output) {
+  size_t count = std::min<size_t>(output.room, handle.pending_count);
+  output.write(handle.pending, count);
+  handle.counts.bytes_out += count;
+  handle.pending_count = static_cast<uint8_t>(handle.pending_count - count);
+  std::memmove(handle.pending, handle.pending + count, handle.pending_count);
+}
+
 // One call of LXConvertBuffer for one pair of kinds.
 template <class In, class Out>
 class BufferCall {
@@ -77,11 +85,13 @@ class BufferCall {
     ConversionWatch watch(handle_, text, handle_.counts.bytes_in);
     in_.at = in_.start = text;
     in_.end = text + input_.left;
+    if constexpr (In::kShifted) in_.past_shift = handle_.past_shift;
     point_writer_at_output();
     Stop stop = transcode(in_, out_, watch);
     settle_output();
     if (stop == Stop::full) spill(in_, watch);
     handle_.source_state = state_of(in_);
+    if constexpr (In::kShifted) handle_.past_shift = in_.past_shift && stop == Stop::done;
     consume(static_cast<size_t>(in_.at - text));
     if (stop == Stop::full) return LX_E_FULL;
     if (stop == Stop::done) return LX_OK;
@@ -153,15 +163,6 @@ class BufferCall {
     return stop == Stop::full ? LX_E_FULL : LX_OK;
   }
 
- public:
-  static void deliver_pending(LXConversion& handle, Output& output) {
-    size_t count = std::min<size_t>(output.room, handle.pending_count);
-    output.write(handle.pending, count);
-    handle.counts.bytes_out += count;
-    handle.pending_count = static_cast<uint8_t>(handle.pending_count - count);
-    std::memmove(handle.pending, handle.pending + count, handle.pending_count);
-  }
-
  private:
   LXConversion& handle_;
   Input& input_;
@@ -170,17 +171,13 @@ class BufferCall {
   Out out_;
 };
 
-void deliver_pending(LXConversion& handle, Output& output) {
-  BufferCall<SingleByteReader, SingleByteWriter>::deliver_pending(handle, output);
-}
-
 uint32_t convert(LXConversion& handle, Input& input, Output& output) {
   if (handle.pending_count != 0) {
     deliver_pending(handle, output);
     if (handle.pending_count != 0) return LX_E_FULL;
   }
-  return with_reader(page_of(handle.source), {true, handle.source_state}, input.at, input.left, [&](const auto& in) {
-    return with_writer(page_of(handle.target), {true, handle.target_state}, output.at, output.room,
+  return with_reader(*handle.from, {true, handle.source_state}, input.at, input.left, [&](const auto& in) {
+    return with_writer(*handle.to, {true, handle.target_state}, output.at, output.room,
                        [&](const auto& out) { return BufferCall(handle, input, output, in, out).run(); });
   });
 }
@@ -189,22 +186,22 @@ uint32_t convert(LXConversion& handle, Input& input, Output& output) {
 // cut off, and the way back to the single-byte state.
 void finish_text(LXConversion& handle) {
   ConversionWatch watch(handle, nullptr, 0);
-  with_writer(page_of(handle.target), {true, handle.target_state}, handle.pending, sizeof handle.pending,
-              [&](auto out) {
-                if (handle.held_return) out.put(out.code(0x0D));
-                if (handle.held_count != 0) {
-                  LXConversionProblem problem = {
-                      handle.counts.bytes_in - handle.held_count, LX_PROBLEM_CUT, kUnassigned, handle.held_count, {}};
-                  std::memcpy(problem.bytes, handle.held, handle.held_count);
-                  watch.add(problem);
-                  if ((handle.options & LX_CONV_DISCARD) == 0) out.put(out.code(kUnassigned));
-                }
-                if constexpr (decltype(out)::kShifted) {
-                  if (out.double_byte) *out.at++ = out.page->leave_byte;
-                }
-                handle.pending_count = static_cast<uint8_t>(out.at - out.begin);
-              });
+  with_writer(*handle.to, {true, handle.target_state}, handle.pending, sizeof handle.pending, [&](auto out) {
+    if (handle.held_return) out.put(out.code(0x0D));
+    if (handle.held_count != 0) {
+      LXConversionProblem problem = {
+          handle.counts.bytes_in - handle.held_count, LX_PROBLEM_CUT, kUnassigned, handle.held_count, {}};
+      std::memcpy(problem.bytes, handle.held, handle.held_count);
+      watch.add(problem);
+      if ((handle.options & LX_CONV_DISCARD) == 0) out.put(out.code(kUnassigned));
+    }
+    if constexpr (decltype(out)::kShifted) {
+      if (out.double_byte) *out.at++ = out.page->leave_byte;
+    }
+    handle.pending_count = static_cast<uint8_t>(out.at - out.begin);
+  });
   if (handle.source_state != 0) watch.add({handle.counts.bytes_in, LX_PROBLEM_SHIFT, kUnassigned, 0, {}});
+  handle.past_shift = false;
   handle.held_return = false;
   handle.held_count = 0;
   handle.source_state = 0;
@@ -225,6 +222,8 @@ LXConversion* make_handle(LXLocale& target, LXLocale& source) {
   auto* handle = reinterpret_cast<LXConversion*>(block.give_up());
   handle->source = &source;
   handle->target = &target;
+  handle->from = &from;
+  handle->to = &to;
   if (mapped) handle->map = new (handle + 1) ByteMap(from, to);
   return handle;
 }
@@ -277,8 +276,8 @@ uint32_t LXConvertBuffer(LXConversion* handle, char** out, int32_t* out_room, co
     if (handle == nullptr || out == nullptr || out_room == nullptr || in == nullptr || in_left == nullptr) {
       return LX_E_ARGUMENT;
     }
-    Input input = {bytes_of(*in), *in_left > 0 ? static_cast<size_t>(*in_left) : 0};
-    Output output = {bytes_of(*out), *out_room > 0 ? static_cast<size_t>(*out_room) : 0};
+    Input input = {bytes_of(*in), *in != nullptr && *in_left > 0 ? static_cast<size_t>(*in_left) : 0};
+    Output output = {bytes_of(*out), *out != nullptr && *out_room > 0 ? static_cast<size_t>(*out_room) : 0};
     uint32_t status = convert(*handle, input, output);
     *in_left -= static_cast<int32_t>(input.at - bytes_of(*in));
     *out_room -= static_cast<int32_t>(output.at - bytes_of(*out));
@@ -311,18 +310,15 @@ uint32_t LXSetConversionOptions(LXConversion* handle, uint32_t options, LXProble
 uint32_t LXFinishConversion(LXConversion* handle, char** out, int32_t* out_room) noexcept {
   return exported(trace_unit, __func__, [&]() -> uint32_t {
     if (handle == nullptr || out == nullptr || out_room == nullptr) return LX_E_ARGUMENT;
-    Output output = {bytes_of(*out), *out_room > 0 ? static_cast<size_t>(*out_room) : 0};
+    Output output = {bytes_of(*out), *out != nullptr && *out_room > 0 ? static_cast<size_t>(*out_room) : 0};
     deliver_pending(*handle, output);
-    if (handle->pending_count == 0 && !handle->finishing) {
+    if (handle->pending_count == 0) {
       finish_text(*handle);
-      handle->finishing = true;
       deliver_pending(*handle, output);
     }
     *out_room -= static_cast<int32_t>(output.at - bytes_of(*out));
     *out = reinterpret_cast<char*>(output.at);
-    if (handle->pending_count != 0) return LX_E_FULL;
-    handle->finishing = false;
-    return LX_OK;
+    return handle->pending_count != 0 ? LX_E_FULL : LX_OK;
   });
 }
 

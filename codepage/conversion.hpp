@@ -20,8 +20,11 @@ struct LXConversion {
   LXProblemFn callback;
   void* context;
   LXConversionCounts counts;
+  bool past_shift;   // the input ended right behind a shift byte; the next byte is text
   bool held_return;  // a carriage return that may be the first half of a line end
-  bool finishing;
+  // The pages of the two locales when the handle was opened: a locale may change its own.
+  const lx::CodePage* from;
+  const lx::CodePage* to;
   const lx::ByteMap* map;  // behind the handle, when both pages are single-byte
 };
 
@@ -38,11 +41,15 @@ class ConversionWatch {
 
   bool each_character() const { return lines_ != 0; }
 
-  // Writes the character, or what stands for it; false: no room, and nothing has happened.
+  // Writes the character, or what stands for it; false: no room, and the caller comes again with the same character.
   template <class In, class Out>
-  bool carry(const In& in, Out& out, uint16_t character) {
-    if (lines_ != 0 && (handle_.held_return || is_line_character(character))) return carry_line(in, out, character);
+  bool carry(In& in, Out& out, uint16_t character) {
     Kind kind = classify(in, out, character);
+    if (lines_ != 0) {
+      bool line = kind != Kind::malformed && is_line_character(character);
+      if (handle_.held_return && !(line && character == kLineFeed) && !put_held_return(in, out)) return false;
+      if (line) return carry_line(in, out, character);
+    }
     if (kind != Kind::exact && discards()) {
       report(in, character, kind);
       return true;
@@ -80,34 +87,27 @@ class ConversionWatch {
   template <class In, class Out>
   static Kind classify(const In& in, const Out& out, uint16_t character) {
     if (is_malformed(in, character)) return Kind::malformed;
-    if (character == kUnassigned && beyond_ucs2(in)) return Kind::substituted;
+    if (beyond_ucs2(in)) return Kind::substituted;
     return out.stands_in(out.code(character), character) ? Kind::substituted : Kind::exact;
   }
 
   template <class In>
   static bool is_malformed(const In& in, uint16_t character) {
     if constexpr (std::same_as<In, Utf8Reader>) {
-      if (*in.start < 0x80) return character == kUnassigned;
-      Utf8Reader again(*in.page, in.start, static_cast<size_t>(in.at - in.start));
-      again.strict = true;
-      uint16_t same = 0;
-      if (again.next(same) != Got::character || again.at != in.at) return true;
-      return same == kUnassigned && !beyond_ucs2(in) && !is_replacement_character(in);
+      return !Utf8Reader::well_formed(in.start, static_cast<size_t>(in.at - in.start));
     } else {
       return character == kUnassigned;
     }
   }
-  // Well-formed UTF-8 of four bytes. Only strict reading takes it as one character.
+  // Well-formed UTF-8 of four bytes, which strict reading takes as one character.
   template <class In>
   static bool beyond_ucs2(const In& in) {
     return std::same_as<In, Utf8Reader> && in.at - in.start == 4;
   }
-  static bool is_replacement_character(const Utf8Reader& in) {
-    return in.at - in.start == 3 && Utf8Reader::decode(in.start) == kUnassigned;
-  }
 
   template <class In>
-  void report(const In& in, uint16_t character, Kind kind) {
+  void report(In& in, uint16_t character, Kind kind) {
+    if constexpr (In::kShifted) note_odd_shift(in);  // it stands before the character
     LXConversionProblem problem = {
         offset_of(in.start), LX_PROBLEM_SUBSTITUTED, character, static_cast<uint8_t>(in.at - in.start), {}};
     if (kind == Kind::malformed) {
@@ -123,31 +123,35 @@ class ConversionWatch {
 
   // Carriage returns wait for the character behind them, because together with a line feed they are one line end.
   template <class In, class Out>
-  bool carry_line(const In& in, Out& out, uint16_t character) {
-    if (handle_.held_return && character != kLineFeed) {
-      if (!put_all(out, kReturn)) return false;
-      handle_.held_return = false;
-      // Without room for the character itself the reader comes here again, with the return already written.
-      return carry(in, out, character);
-    }
+  bool carry_line(In& in, Out& out, uint16_t character) {
     if (character == kReturn) {
       handle_.held_return = true;
       return true;
     }
-    bool fits = lines_ == LX_CONV_LINES_CRLF  ? put_all(out, kReturn, kLineFeed)
-                : lines_ == LX_CONV_LINES_NEL ? put_all(out, kNextLine)
-                                              : put_all(out, kLineFeed);
+    bool fits = lines_ == LX_CONV_LINES_CRLF  ? put_all(in, out, kReturn, kLineFeed)
+                : lines_ == LX_CONV_LINES_NEL ? put_all(in, out, kNextLine)
+                                              : put_all(in, out, kLineFeed);
     if (fits) handle_.held_return = false;
     return fits;
   }
 
-  template <class Out, class... Characters>
-  static bool put_all(Out& out, Characters... characters) {
+  template <class In, class Out>
+  bool put_held_return(In& in, Out& out) {
+    if (!put_all(in, out, kReturn)) return false;
+    handle_.held_return = false;
+    return true;
+  }
+
+  template <class In, class Out, class... Characters>
+  bool put_all(In& in, Out& out, Characters... characters) {
     Out trial = out;
     for (uint16_t character : {characters...}) {
       uint32_t code = trial.code(character);
       if (!trial.fits(code)) return false;
       trial.put(code);
+    }
+    for (uint16_t character : {characters...}) {
+      if (out.stands_in(out.code(character), character)) report(in, character, Kind::substituted);
     }
     out = trial;
     return true;

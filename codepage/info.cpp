@@ -8,9 +8,7 @@
 using namespace lx;
 
 extern "C" uint32_t LXGetCodePageInfo(const LXObjEntry* code_page, LXCodePageInfo* info) noexcept {
-  if (code_page == nullptr || info == nullptr || code_page->type != LX_CODEPAGE || !code_page->loaded()) {
-    return LX_E_ARGUMENT;
-  }
+  if (!is_loaded_code_page(code_page) || info == nullptr) return LX_E_ARGUMENT;
   const CodePage& page = code_page_of(*code_page);
   *info = {code_page->id,     page.max_length,      page.substitution, {},
            page.ascii_family, page.shift_sensitive, page.enter_byte,   page.leave_byte};

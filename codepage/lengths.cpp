@@ -56,7 +56,7 @@ size_t bytes_of_characters(const CodePage& page, const uint8_t* text, uint32_t s
   for (; characters != 0; --characters) {
     walk.take_shift();
     walk.at += walk.length_here();
-    if (characters > 1 || walk.double_byte || look_behind) walk.take_shift();
+    if (characters > 1 || look_behind) walk.take_shift();
   }
   return static_cast<size_t>(walk.at - text);
 }
@@ -70,7 +70,7 @@ extern "C" {
 int32_t LXCpStrCharToByteLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                              int32_t chars) noexcept {
   return exported(trace_unit, __func__, [&]() -> int32_t {
-    if (record == nullptr || string == nullptr || chars <= 0) return 0;
+    if (!is_loaded_code_page(record) || string == nullptr || chars <= 0) return 0;
     return clamped(
         bytes_of_characters(code_page_of(*record), bytes_of(string), shift_state, static_cast<size_t>(chars), true));
   });
@@ -79,7 +79,7 @@ int32_t LXCpStrCharToByteLen(const LXObjEntry* record, const char* string, uint3
 int32_t LXCpStrByteToCharLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                              int32_t bytes) noexcept {
   return exported(trace_unit, __func__, [&]() -> int32_t {
-    if (record == nullptr || string == nullptr) return 0;
+    if (!is_loaded_code_page(record) || string == nullptr) return 0;
     const uint8_t* text = bytes_of(string);
     size_t length = bytes < 0 ? measured_length(text) : static_cast<size_t>(bytes);
     return clamped(characters_of_bytes(code_page_of(*record), text, shift_state, length));

@@ -36,9 +36,9 @@ int32_t LXCpMbToUnicode(const LXObjEntry* record, const char* bytes) noexcept {
 }
 
 int32_t LXCpMbToUnicodeW(const LXObjEntry* record, LXWChar packed) noexcept {
-  char bytes[kMaxCharacterLength] = {};
-  LXWToMb(bytes, packed);
-  return LXCpMbToUnicode(record, bytes);
+  uint8_t bytes[kMaxCharacterLength] = {};
+  unpack(bytes, packed);
+  return LXCpMbToUnicode(record, reinterpret_cast<const char*>(bytes));
 }
 
 int32_t LXCpUnicodeToChar(const LXObjEntry* record, LXUChar ucs2, char* out) noexcept {
@@ -104,6 +104,10 @@ const LXCharType* LXGetMbCtypeW(const LXObjEntry* record, LXWChar packed) noexce
 void LXCpMbCaseConv(const LXObjEntry* record, const char* src, char* dst, uint32_t mask) noexcept {
   const CodePage& page = code_page_of(*record);
   size_t length = page.char_length[static_cast<uint8_t>(*src)];
+  if (length == 1) {  // of such characters the case is in a table of bytes
+    *dst = *src;
+    return;
+  }
   const LXCharType& type = type_entry(page, bytes_of(src));
   if ((type.flags & mask) == 0) {
     std::memcpy(dst, src, length);

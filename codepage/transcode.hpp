@@ -25,10 +25,12 @@ struct NoWatch {
 
 // ---- Runs of ASCII ----
 
-// How ASCII stands in a byte text: as itself, through a table, or not in a way that a run can use.
+// How ASCII stands in a byte text: as itself, through a table, or not in a way that a run can use. Characters below
+// `from` are left to others.
 struct AsciiForm {
   enum Way : uint8_t { none, itself, by_table } way;
   const uint8_t* table;
+  uint8_t from = 0;
 };
 
 inline AsciiForm ascii_form(const SingleByteReader& in) {
@@ -46,7 +48,7 @@ inline AsciiForm ascii_form(const ShiftedReader& in) {
 }
 inline AsciiForm ascii_form_of_target(const CodePage& page) {
   if (page.ascii_bytes) return {AsciiForm::itself, nullptr};
-  return {page.ascii_complete ? AsciiForm::by_table : AsciiForm::none, page.byte_of_ascii};
+  return {page.ascii_from < 0x80 ? AsciiForm::by_table : AsciiForm::none, page.byte_of_latin1, page.ascii_from};
 }
 inline AsciiForm ascii_form(const SingleByteWriter& out) { return ascii_form_of_target(*out.page); }
 inline AsciiForm ascii_form(const MultibyteWriter& out) { return ascii_form_of_target(*out.page); }
@@ -58,22 +60,43 @@ inline AsciiForm ascii_form(const ShiftedWriter& out) {
 template <class In, class Out>
 concept BytesToBytes = std::same_as<typename In::Unit, uint8_t> && std::same_as<typename Out::Unit, uint8_t>;
 
+template <class In, class Out, class InUnit, class OutUnit>
+void carry_run(void (*carry)(const CodePage&, Run<InUnit, OutUnit>&), const CodePage& page, In& in, Out& out) {
+  Run<InUnit, OutUnit> run = {in.at, in.end, out.at, out.end};
+  carry(page, run);
+  in.at = run.in;
+  out.at = run.out;
+}
+
 template <class In, class Out>
 void carry_ascii(In& in, Out& out) {
   if constexpr (BytesToBytes<In, Out>) {
+    if constexpr (std::same_as<In, SingleByteReader> && std::same_as<Out, Utf8Writer>) {
+      carry_run(carry_to_utf8, *in.page, in, out);
+    }
+    if constexpr (std::same_as<In, Utf8Reader> && std::same_as<Out, SingleByteWriter>) {
+      if (in.page->standard_utf8 && out.from.usual && out.page->ascii_from < 0x80)
+        carry_run(carry_from_utf8, *out.page, in, out);
+    }
     AsciiForm from = ascii_form(in);
     AsciiForm to = ascii_form(out);
     if (from.way == AsciiForm::none || to.way == AsciiForm::none) return;
     size_t room = std::min(in.left(), out.room());
     size_t done = 0;
     if (from.way == AsciiForm::itself) {
-      done =
-          to.way == AsciiForm::itself ? copy_ascii(in.at, room, out.at) : map_from_ascii(to.table, in.at, room, out.at);
+      done = to.way == AsciiForm::itself ? copy_ascii(in.at, room, out.at)
+                                         : map_from_ascii(to.table, to.from, in.at, room, out.at);
     } else if (to.way == AsciiForm::itself) {
       done = map_to_ascii(from.table, in.at, room, out.at);
     }
     in.at += done;
     out.at += done;
+  }
+  if constexpr (std::same_as<In, SingleByteReader> && std::same_as<Out, Ucs2Writer>) {
+    if (in.page->latin1) carry_run(carry_to_ucs2, *in.page, in, out);
+  }
+  if constexpr (std::same_as<In, Ucs2Reader> && std::same_as<Out, SingleByteWriter>) {
+    carry_run(carry_from_ucs2, *out.page, in, out);
   }
 }
 
@@ -98,32 +121,41 @@ bool carry_mapped(In&, Out&, const Watch&) {
 
 // ---- Single characters ----
 
-// Carries well-formed characters that a watch need not see, as many as surely fit. True: a run of ASCII follows.
+// Carries well-formed characters that a watch need not see, as many as surely fit. True: a run of ASCII follows. The
+// loop works on copies of the two sides: nothing that is written to the output can change them, so they stay in
+// registers.
 template <class In, class Out, class Watch>
-bool carry_fast(In& in, Out& out, const Watch&) {
-  for (;;) {
-    size_t count = std::min(in.fast_characters(), out.fast_characters());
-    if (count == 0) return false;
+bool carry_fast(In& given_in, Out& given_out, const Watch&) {
+  In in = given_in;
+  Out out = given_out;
+  bool ascii = false;
+  while (size_t count = std::min(in.fast_characters(), out.fast_characters())) {
     for (; count != 0; --count) {
-      In mark = in;
       uint16_t character = 0;
-      if (!in.next_fast(character)) [[unlikely]] {
-        in = mark;
-        return false;
+      size_t length = in.peek(character);
+      if (length == 0) [[unlikely]] {
+        if (in.turn()) continue;
+        goto end;
       }
       uint32_t code = out.code(character);
       if constexpr (Watch::kWatching) {
-        if (character == kUnassigned || out.stands_in(code, character)) [[unlikely]] {
-          in = mark;
-          return false;
-        }
+        if (out.doubtful(code)) [[unlikely]]
+          goto end;
       }
+      in.skip(length);
       out.put(code);
       if constexpr (BytesToBytes<In, Out>) {
-        if (character < 0x80 && !in.done() && in.page->ascii_of_byte[*in.at] < 0x80) return true;
+        if (character < 0x80 && in.ascii_ahead()) {
+          ascii = true;
+          goto end;
+        }
       }
     }
   }
+end:
+  given_in = in;
+  given_out = out;
+  return ascii;
 }
 
 // Carries one character, however long it takes.

@@ -44,7 +44,9 @@ const LXObjEntry* ascii_page() {
   return entry;
 }
 
-bool usable(const LXObjEntry* record, uint32_t flags) { return record != nullptr && (flags & ~kStringOptions) == 0; }
+bool usable(const LXObjEntry* record, uint32_t flags) {
+  return is_loaded_code_page(record) && (flags & ~kStringOptions) == 0;
+}
 
 }  // namespace
 }  // namespace lx

@@ -61,7 +61,7 @@ struct LocaleCall {
   }
 };
 
-// The same for a function with a locale and an option word. Helpers on the same locale that the body calls may
+// As exported(), for a function with a locale and an option word. Helpers on the same locale that the body calls may
 // overwrite the status in the record, so it is stored once more at the end.
 template <class Result, class Body>
 Result locale_call(TRC1_Unit& unit, const char* function, LXLocale* given, uint32_t options, uint32_t accepted,

@@ -18,7 +18,6 @@ constexpr char kDefaultDirectory[] = "/Vantrel/locale";
 constexpr int32_t kDefaultLocationSize = 17;  // one more than the text needs, as callers have always been told
 constexpr char kObjectExtension[] = ".nls";
 constexpr char kTypePrefixes[kObjectTypes][3] = {"la", "te", "cp", "so"};
-constexpr int32_t kObjectNameRoom = 14;  // separator, prefix, separator, five digits, extension, terminator
 
 int32_t to_lower(uint8_t byte) { return byte >= 'A' && byte <= 'Z' ? byte + ('a' - 'A') : byte; }
 

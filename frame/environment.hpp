@@ -7,6 +7,9 @@
 
 namespace lx {
 
+// What an object's file name adds to its directory: separator, prefix, separator, five digits, extension, terminator.
+inline constexpr int32_t kObjectNameRoom = 14;
+
 // Whether the text and `more` bytes (terminator included) fit.
 bool room_for(const char* text, int32_t more, int32_t buffer_size);
 

@@ -96,7 +96,7 @@ uint32_t open_existing(LXFile& file, const char* path, int how) {
 uint32_t open_by_mode(LXFile& file, const char* path, bool no_temporary) {
   switch (file.mode) {
     case kRead:
-      return open_existing(file, path, O_RDONLY);
+      return open_existing(file, path, O_RDONLY | O_NONBLOCK);  // a pipe in place of a file must not hang
     case kReadWrite:
       return open_existing(file, path, O_RDWR);
     case kCreate:

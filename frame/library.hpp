@@ -15,7 +15,7 @@ inline constexpr uint32_t kDefaultAlignment = 4;
 class GlobalLock {
  public:
   GlobalLock() : globals_(live_globals()) {
-    if (globals_ != nullptr) HSV1_GetLock(&globals_->lock);
+    if (globals_ != nullptr && HSV1_GetLock(&globals_->lock) != 0) globals_ = nullptr;
   }
   ~GlobalLock() {
     if (globals_ != nullptr) HSV1_ReleaseLock(&globals_->lock);

@@ -19,7 +19,7 @@ constexpr size_t kMaxExtension = 4;
 // Parts that are absent or too long are empty.
 int32_t deliver(std::string_view part, size_t limit, char* out) {
   if (part.size() > limit) part = {};
-  std::memcpy(out, part.data(), part.size());
+  if (!part.empty()) std::memcpy(out, part.data(), part.size());
   out[part.size()] = '\0';
   return static_cast<int32_t>(part.size());
 }

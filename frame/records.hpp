@@ -51,7 +51,6 @@ struct LXObjEntry {
   uint8_t type;
   uint8_t flags;
   char name[34];
-  LXFile* file;  // set while the object is being loaded
   // Section 1 is published last: a reader that sees it sees everything else of the entry too.
   std::atomic<const uint8_t*> section1;
   const uint8_t* more_sections[3];

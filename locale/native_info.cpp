@@ -57,7 +57,7 @@ void take_grouping(LXLocale& locale, LocaleText which, const char* sizes) {
   }
   text[length++] = '0';
   const CodePage& page = code_page_of(*locale.code_page);
-  for (size_t i = 0; i < length; ++i) text[i] = static_cast<char>(page.byte_of_ascii[static_cast<uint8_t>(text[i])]);
+  for (size_t i = 0; i < length; ++i) text[i] = static_cast<char>(page.byte_of_latin1[static_cast<uint8_t>(text[i])]);
   store_text(locale, which, text, length);
 }
 
@@ -146,9 +146,11 @@ extern "C" int32_t LXGetUserLocale(char* buffer, int32_t buffer_size) noexcept {
       std::memcpy(buffer, name, length < room ? length : room);
       return 1;
     }
-    SavedSystemLocale saved;
-    if (!saved.saved()) return 0;
-    LXMapNativeLocale(environment_locale(), buffer, buffer_size);
+    {
+      SavedSystemLocale saved;
+      if (!saved.saved()) return 0;
+      LXMapNativeLocale(environment_locale(), buffer, buffer_size);
+    }
     LX_TRACE(TRC1_LEVEL_DETAIL, "User locale: %s", buffer);
     return 2;
   });

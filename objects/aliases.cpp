@@ -8,9 +8,8 @@
 #include <string_view>
 
 #include "frame/call.hpp"
+#include "frame/data_file.hpp"
 #include "frame/environment.hpp"
-#include "frame/library.hpp"
-#include "frame/memory.hpp"
 #include "frame/text_view.hpp"
 
 namespace lx {
@@ -114,20 +113,16 @@ Owned<char> load_text(const char* name, size_t& length, bool& failed) {
   uint32_t rc = LX_OK;
   length = 0;
   failed = true;
-  const LXGlobals* area = live_globals();
-  LXFile* file = LXOpenFile(area != nullptr ? area->file_access_mode : 0, name, 0, 0, &rc);
-  if (file == nullptr) {
+  DataFile file(name, rc);
+  if (!file) {
     LX_TRACE(TRC1_LEVEL_ERROR, "Open of %s failed, err = %d", name, static_cast<int>(rc));
     return {};
   }
-  int32_t size = LXFileSize(file);
-  Owned<char> text;
-  if (size >= 0) {
-    text.reset(static_cast<char*>(LXLoadFile(file, 0, static_cast<uint32_t>(size), &rc)));
-    length = text ? static_cast<size_t>(size) : 0;
-    failed = rc != LX_OK;
-  }
-  LXCloseFile(file, 0);
+  int32_t size = LXFileSize(file.get());
+  if (size < 0) return {};
+  Owned<char> text(static_cast<char*>(LXLoadFile(file.get(), 0, static_cast<uint32_t>(size), &rc)));
+  length = text ? static_cast<size_t>(size) : 0;
+  failed = rc != LX_OK;
   return text;
 }
 

@@ -95,21 +95,23 @@ uint32_t packed_value(const CheckedCodePage& checked, const FromUnicodePage& pag
 }
 
 template <class Element>
-void fill_from_unicode(CodePage& page, Element* pages) {
+void fill_from_unicode(CodePage& page, Element* pages, const Element* (&by_high)[256]) {
   const CodePageHeader& header = *page.raw.header;
+  // The first array holds only the substitution byte and serves all pages without characters.
   for (size_t i = 0; i < kPageSize; ++i) pages[i] = page.substitution;
-  uint16_t next = 1;
+  Element* next = pages + kPageSize;
   for (unsigned high = 0; high < 256; ++high) {
     const FromUnicodePage& source = header.from_unicode[high];
-    page.from_page[high] = 0;
+    by_high[high] = pages;
     if (page.kind == PageKind::utf8 || !has_values(source)) continue;
-    Element* values = pages + next * kPageSize;
+    Element* values = next;
     for (unsigned low = 0; low < source.low; ++low) values[low] = page.substitution;
     for (unsigned low = source.low; low <= source.high; ++low) {
       values[low] = static_cast<Element>(packed_value(page.raw, source, low));
     }
     for (unsigned low = source.high + 1u; low < 256; ++low) values[low] = page.substitution;
-    page.from_page[high] = next++;
+    by_high[high] = values;
+    next += kPageSize;
   }
 }
 
@@ -135,7 +137,19 @@ void fill_to_unicode(CodePage& page, const StateNumbers& numbers, uint16_t* node
   page.rows = rows;
 }
 
+void fill_leads(CodePage& page) {
+  bool walks = (page.root & CodePage::kNode) != 0;
+  const uint16_t* node = walks ? page.nodes + (page.root & ~unsigned{CodePage::kNode}) * kPageSize : nullptr;
+  for (unsigned byte = 0; byte < 256; ++byte) {
+    unsigned length = page.shift_sensitive ? page.max_length : page.char_length[byte];
+    bool shifts = page.shift_sensitive && (byte == page.enter_byte || byte == page.leave_byte);
+    bool row = length == 2 && walks && (node[byte] & CodePage::kNode) == 0;
+    page.lead[byte] = shifts || length == 1 ? CodePage::kNoLead : row ? node[byte] : CodePage::kOtherLength;
+  }
+}
+
 uint32_t utf8_of(uint16_t ucs2) {
+  if (ucs2 == kUnassigned) return 0;
   if (ucs2 < 0x80) return 1u << 24 | ucs2;
   uint32_t last = 0x80u | (ucs2 & 0x3F);
   if (ucs2 < 0x800) return 2u << 24 | last << 8 | (0xC0u | ucs2 >> 6);
@@ -144,12 +158,15 @@ uint32_t utf8_of(uint16_t ucs2) {
 
 void fill_bytes(CodePage& page) {
   const CodePageHeader& header = *page.raw.header;
+  page.latin1 = true;
   for (unsigned byte = 0; byte < 256; ++byte) {
     uint8_t length = header.char_length[byte];
     page.char_length[byte] = length == 0 ? 1 : length;
     uint16_t ucs2 = header.to_unicode[byte];
     page.to_unicode[byte] = ucs2;
     page.utf8_of_byte[byte] = utf8_of(ucs2);
+    page.latin1_of_byte[byte] = static_cast<uint8_t>(ucs2);
+    page.latin1 = page.latin1 && ucs2 < 0x100;
     page.ascii_of_byte[byte] = ucs2 < 0x80 ? static_cast<uint8_t>(ucs2) : uint8_t{0x80};
   }
   if (page.shift_sensitive) page.ascii_of_byte[page.enter_byte] = page.ascii_of_byte[page.leave_byte] = 0x80;
@@ -167,15 +184,22 @@ PageKind kind_of(const CodePage& page) {
 // The facts that let runs of ASCII be copied or mapped bytewise.
 void note_ascii(CodePage& page) {
   page.ascii_bytes = true;
-  page.ascii_complete = true;
+  page.ascii_from = 0;
   for (unsigned byte = 0; byte < 128; ++byte) {
     auto ucs2 = static_cast<uint16_t>(byte);
     uint32_t packed = page.kind == PageKind::utf8 ? ucs2 : page.packed(ucs2);
-    page.byte_of_ascii[byte] = static_cast<uint8_t>(packed);
     bool plain = page.char_length[byte] == 1 && page.to_unicode[byte] == ucs2 && packed == byte;
     page.ascii_bytes = page.ascii_bytes && plain;
-    page.ascii_complete = page.ascii_complete && packed < 0x100 && page.to_unicode[packed] == ucs2;
+    bool there = packed < 0x100 && page.to_unicode[packed] == ucs2;
+    if (!there) page.ascii_from = byte < 0x20 ? 0x20 : 0x80;
   }
+  page.latin1_bytes = page.kind == PageKind::single && page.latin1;
+  for (unsigned ucs2 = 0; ucs2 < 256; ++ucs2) {
+    uint32_t packed = page.packed(static_cast<uint16_t>(ucs2));
+    page.byte_of_latin1[ucs2] = static_cast<uint8_t>(packed);
+    page.latin1_bytes = page.latin1_bytes && page.latin1_of_byte[ucs2] == ucs2 && packed == ucs2;
+  }
+  page.usual = page.kind == PageKind::utf8 || page.packed(kUnassigned) == page.substitution;
   page.standard_utf8 = page.kind == PageKind::utf8 && page.ascii_bytes;
   for (unsigned byte = 0x80; byte < 256; ++byte) {
     unsigned usual = byte >= 0xC2 && byte < 0xE0 ? 2 : byte >= 0xE0 && byte < 0xF0 ? 3 : 1;
@@ -219,7 +243,7 @@ struct BlockPlan {
 };
 
 CodePage* place(uint8_t* block, uint16_t id, const CheckedCodePage& checked, const BlockPlan& plan) {
-  auto* page = new (block) CodePage;
+  auto* page = new (block) CodePage{};
   uint8_t* tables = block + aligned(sizeof(CodePage));
   auto* nodes = reinterpret_cast<uint16_t*>(tables);
   auto* rows = reinterpret_cast<uint16_t*>(tables + plan.nodes_size);
@@ -230,12 +254,11 @@ CodePage* place(uint8_t* block, uint16_t id, const CheckedCodePage& checked, con
   fill_bytes(*page);
   page->kind = kind_of(*page);
   fill_to_unicode(*page, plan.numbers, nodes, rows);
-  page->from_narrow = plan.from.wide ? nullptr : reinterpret_cast<uint16_t*>(from_pages);
-  page->from_wide = plan.from.wide ? reinterpret_cast<uint32_t*>(from_pages) : nullptr;
+  fill_leads(*page);
   if (plan.from.wide) {
-    fill_from_unicode(*page, reinterpret_cast<uint32_t*>(from_pages));
+    fill_from_unicode(*page, reinterpret_cast<uint32_t*>(from_pages), page->from_wide);
   } else {
-    fill_from_unicode(*page, reinterpret_cast<uint16_t*>(from_pages));
+    fill_from_unicode(*page, reinterpret_cast<uint16_t*>(from_pages), page->from_narrow);
   }
   fill_types(*page, reinterpret_cast<LXCharType*>(from_pages + plan.from.size()));
   note_ascii(*page);

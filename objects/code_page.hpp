@@ -42,14 +42,20 @@ struct CodePage {
   bool shift_sensitive;
   bool ascii_family;
   PageKind kind;
-  bool ascii_bytes;            // 00-7F are the ASCII characters, both ways
-  bool ascii_complete;         // every ASCII character is one byte of the page
-  bool standard_utf8;          // UTF-8 whose length table is the usual one
-  uint8_t char_length[256];    // by first byte; never 0, so that every walk ends
-  uint16_t to_unicode[256];    // of one-byte characters
-  uint32_t utf8_of_byte[256];  // the same in UTF-8, first byte lowest; the top byte counts the bytes
-  uint8_t ascii_of_byte[256];  // the same as one byte; 0x80: not an ASCII character, or a shift byte
-  uint8_t byte_of_ascii[128];  // of U+0000-U+007F, the lowest byte of the packed character
+  bool ascii_bytes;  // 00-7F are the ASCII characters, both ways
+  // Every ASCII character from this one on is one byte of the page: 0, or 20 where a control character is missing;
+  // above 7F when others are.
+  uint8_t ascii_from;
+  bool usual;                   // U+FFFD is no character of the page, so it becomes the substitution byte
+  bool standard_utf8;           // UTF-8 whose length table is the usual one
+  uint8_t char_length[256];     // by first byte; never 0, so that every walk ends
+  uint16_t to_unicode[256];     // of one-byte characters
+  uint32_t utf8_of_byte[256];   // the same in UTF-8, first byte lowest; the top byte counts, 0: U+FFFD
+  uint8_t ascii_of_byte[256];   // the same as one byte; 0x80: not an ASCII character, or a shift byte
+  uint8_t latin1_of_byte[256];  // the same on pages whose characters are all in Latin1
+  uint8_t byte_of_latin1[256];  // of U+0000-U+00FF, the lowest byte of the packed character
+  bool latin1;                  // every byte is a Latin1 character,
+  bool latin1_bytes;            // and its own value, both ways
 
   // Multibyte characters to UCS-2: from `root`, a value with kNode set is the number of a node that the next byte
   // indexes; a value without it is a row of values that the last byte indexes. Row 0 holds only U+FFFD.
@@ -58,17 +64,22 @@ struct CodePage {
   const uint16_t* nodes;
   const uint16_t* rows;
 
-  // UCS-2 to packed characters: pages of 256 by high byte. Page 0 holds only the substitution byte. One of the two
-  // arrays is there: the narrow one unless some character has more than two bytes.
-  uint16_t from_page[256];
-  const uint16_t* from_narrow;
-  const uint32_t* from_wide;
+  // What the first byte of a double-byte character leads to: its row, or one of the two marks. On shift-sensitive pages
+  // it holds for the double-byte state, elsewhere for bytes that the length table gives two bytes.
+  static constexpr uint16_t kOtherLength = 0x8000;  // ask decode and the length
+  static constexpr uint16_t kNoLead = 0xFFFF;       // a character of one byte, or a shift byte
+  uint16_t lead[256];
+
+  // UCS-2 to packed characters: arrays of 256 by high byte. They are of the narrow kind unless some character has more
+  // than two bytes; those of the other kind are null.
+  const uint16_t* from_narrow[256];
+  const uint32_t* from_wide[256];
 
   const LXCharType* types;  // native copies of the type entries
 
   uint32_t packed(uint16_t ucs2) const {
-    size_t at = size_t{from_page[ucs2 >> 8]} << 8 | (ucs2 & 0xFF);
-    return from_narrow != nullptr ? from_narrow[at] : from_wide[at];
+    const uint16_t* narrow = from_narrow[ucs2 >> 8];
+    return narrow != nullptr ? narrow[ucs2 & 0xFF] : from_wide[ucs2 >> 8][ucs2 & 0xFF];
   }
   // Whether a packed value stands for the wanted character or merely in its place.
   bool stands_in(uint32_t packed_value, uint16_t ucs2) const {

@@ -237,11 +237,11 @@ const char* check_code_page_v1(const SectionBytes& section1, const SectionBytes&
   if (header.max_length < 2) return nullptr;
   if (section1.size < sizeof(CodePageHeaderV1)) return "section 1 size";
   uint32_t start = header.full_width;
-  if (start > section1.size) return "start of the variable part";
+  if (start < sizeof(CodePageHeaderV1) || start > section1.size) return "start of the variable part";
   uint32_t new_start = sizeof(CodePageHeader);
   for (uint32_t offset : {uint32_t{header.full_width}, uint32_t{header.half_to_full}, uint32_t{header.type_states},
                           uint32_t{header.type_entries}}) {
-    if (offset < start || offset - start + new_start > 0xFFFF) return "offset of a table";
+    if (offset != 0 && (offset < start || offset - start + new_start > 0xFFFF)) return "offset of a table";
   }
   if (section2.data != nullptr) {
     uint32_t array = header.to_unicode_array;

@@ -13,8 +13,8 @@ struct SectionBytes {
   uint32_t size = 0;
 };
 
-// Proves that no reader of the page can leave a section, whatever text it is given. Allocates nothing and takes time
-// proportional to the sections. Null, or the name of the first field that is wrong.
+// Proves that no reader of the page can leave a section, whatever text it is given. Allocates nothing. Null, or the
+// name of the first field that is wrong.
 const char* check_code_page(uint16_t id, const SectionBytes (&sections)[4], CheckedCodePage& checked);
 
 // The same for what the version-1 converter relies on.

@@ -4,7 +4,7 @@
 
 #include "frame/library.hpp"
 #include "frame/memory.hpp"
-#include "objects/code_page_format.hpp"
+#include "objects/code_page_check.hpp"
 
 namespace lx {
 namespace {
@@ -57,19 +57,26 @@ using namespace lx;
 
 extern "C" uint8_t* LXCpV1toV2(const uint8_t* v1_section1, uint16_t v1_section1_size, const uint8_t* v1_section2,
                                uint16_t v1_section2_size, uint8_t** out_section2) noexcept {
+  if (out_section2 != nullptr) *out_section2 = nullptr;
+  if (v1_section1 == nullptr || out_section2 == nullptr ||
+      check_code_page_v1({v1_section1, v1_section1_size}, {v1_section2, v1_section2_size}) != nullptr) {
+    return nullptr;
+  }
   const auto& old = *reinterpret_cast<const CodePageHeaderV1*>(v1_section1);
   bool multibyte = old.max_length >= 2;
   uint32_t old_start = multibyte ? uint32_t{old.full_width} : v1_section1_size;
   uint32_t new_start = multibyte ? rounded_up(sizeof(CodePageHeader)) : uint32_t{sizeof(CodePageHeader)};
   uint32_t variable_size = v1_section1_size - old_start;
-  *out_section2 = nullptr;
   auto section1 = Owned<uint8_t>::zeroed(new_start + variable_size);
   if (!section1) return nullptr;
   auto& header = *reinterpret_cast<CodePageHeader*>(section1.get());
   copy_fixed_part(old, header);
   if (!multibyte) return section1.give_up();
 
-  auto moved = [&](uint16_t offset) { return static_cast<uint16_t>(offset + (new_start - old_start)); };
+  // An offset of 0 says that there is no such table.
+  auto moved = [&](uint16_t offset) {
+    return offset == 0 ? uint16_t{0} : static_cast<uint16_t>(offset + (new_start - old_start));
+  };
   header.full_width = moved(old.full_width);
   header.half_to_full = moved(old.half_to_full);
   header.type_states = moved(old.type_states);

@@ -4,8 +4,7 @@
 #include <cstring>
 
 #include "frame/call.hpp"
-#include "frame/library.hpp"
-#include "frame/memory.hpp"
+#include "frame/data_file.hpp"
 #include "objects/file_format.hpp"
 
 namespace lx {
@@ -15,60 +14,6 @@ TRC1_Unit trace_unit = {"Lexaro", "control_file", 0};
 
 constexpr int32_t kControlNameRoom = 255;
 constexpr int32_t kDirectoryRoom = 255;
-
-// Closes the file when the reading is over, however it ends.
-class OpenControlFile {
- public:
-  explicit OpenControlFile(LXFile* file) : file_(file) {}
-  ~OpenControlFile() { LXCloseFile(file_, 0); }
-  OpenControlFile(const OpenControlFile&) = delete;
-  OpenControlFile& operator=(const OpenControlFile&) = delete;
-  LXFile* get() const { return file_; }
-
- private:
-  LXFile* file_;
-};
-
-// Where the search ends: at an open file, or at a place whose name cannot be built.
-struct Search {
-  LXObjMgr& manager;
-  LXFile* file = nullptr;
-  uint32_t rc = LX_OK;
-  bool ended = false;
-
-  void try_directory(const char* directory) {
-    char name[kControlNameRoom];
-    if (LXGetControlFileName(directory, name, kControlNameRoom) == nullptr) {
-      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to construct control file name in directory %s", directory);
-      LX_TRACE(TRC1_LEVEL_ERROR, "control size = %d", kControlNameRoom);
-      rc = LX_E_FILE;
-      ended = true;
-      return;
-    }
-    const LXGlobals* area = live_globals();
-    file = LXOpenFile(area != nullptr ? area->file_access_mode : 0, name, 0, 0, &rc);
-    if (file == nullptr) {
-      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to open %s, err = %d", name, static_cast<int>(rc));
-      return;
-    }
-    ended = true;
-    if (directory != manager.directory) std::memmove(manager.directory, directory, std::strlen(directory) + 1);
-  }
-
-  void try_environment() {
-    int32_t length = LXGetDataLocation(manager.directory, kDirectoryRoom, 0);
-    if (length > 0) {
-      try_directory(manager.directory);
-    } else if (length == 0) {  // set, but too long to be a directory here
-      rc = LX_E_FILE;
-      ended = true;
-    }
-  }
-
-  void try_default() {
-    if (LXGetDataLocation(manager.directory, kDirectoryRoom, 1) > 0) try_directory(manager.directory);
-  }
-};
 
 template <class T>
 Owned<T> allocate_for_control(size_t count, uint32_t& rc) {
@@ -156,6 +101,47 @@ uint32_t read_directory(LXObjMgr& manager, LXFile* file) {
   return rc;
 }
 
+// The search ends at the first file that opens, which is read, or at a place whose name cannot be built.
+struct Search {
+  LXObjMgr& manager;
+  uint32_t rc = LX_OK;
+  bool found = false;
+  bool ended = false;
+
+  void try_directory(const char* directory) {
+    char name[kControlNameRoom];
+    if (LXGetControlFileName(directory, name, kControlNameRoom) == nullptr) {
+      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to construct control file name in directory %s", directory);
+      LX_TRACE(TRC1_LEVEL_ERROR, "control size = %d", kControlNameRoom);
+      rc = LX_E_FILE;
+      ended = true;
+      return;
+    }
+    DataFile file(name, rc);
+    if (!file) {
+      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to open %s, err = %d", name, static_cast<int>(rc));
+      return;
+    }
+    found = ended = true;
+    if (directory != manager.directory) std::memmove(manager.directory, directory, std::strlen(directory) + 1);
+    rc = read_directory(manager, file.get());
+  }
+
+  void try_environment() {
+    int32_t length = LXGetDataLocation(manager.directory, kDirectoryRoom, 0);
+    if (length > 0) {
+      try_directory(manager.directory);
+    } else if (length == 0) {  // set, but too long to be a directory here
+      rc = LX_E_FILE;
+      ended = true;
+    }
+  }
+
+  void try_default() {
+    if (LXGetDataLocation(manager.directory, kDirectoryRoom, 1) > 0) try_directory(manager.directory);
+  }
+};
+
 }  // namespace
 
 uint32_t read_control_file(LXObjMgr& manager, const char* directory) {
@@ -164,12 +150,8 @@ uint32_t read_control_file(LXObjMgr& manager, const char* directory) {
   if (directory != nullptr) search.try_directory(directory);
   if (!search.ended) search.try_environment();
   if (!search.ended) search.try_default();
-  if (search.file == nullptr) {
-    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to open control file");
-    return search.rc;
-  }
-  OpenControlFile file(search.file);
-  return read_directory(manager, file.get());
+  if (!search.found) LX_TRACE(TRC1_LEVEL_ERROR, "Unable to open control file");
+  return search.rc;
 }
 
 }  // namespace lx

@@ -23,6 +23,10 @@ inline const BeU16* territory_text(const LXObjEntry& entry, TerritoryText text) 
                                         header.text_offsets[static_cast<unsigned>(text)]);
 }
 
+inline bool is_loaded_code_page(const LXObjEntry* entry) {
+  return entry != nullptr && entry->type == LX_CODEPAGE && entry->loaded();
+}
+
 inline const CodePage& code_page_of(const LXObjEntry& entry) { return *entry.code_page; }
 
 }  // namespace lx

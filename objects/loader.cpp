@@ -3,8 +3,8 @@
 #include <cstring>
 
 #include "frame/call.hpp"
-#include "frame/library.hpp"
-#include "frame/memory.hpp"
+#include "frame/data_file.hpp"
+#include "frame/environment.hpp"
 #include "objects/code_page_check.hpp"
 #include "objects/entry.hpp"
 #include "objects/file_format.hpp"
@@ -15,7 +15,6 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "loader", 0};
 
-constexpr int32_t kObjectNameRoom = 14;
 constexpr uint32_t kSortHeaderSize = 1036;
 
 // An object on its way into its entry. Sections become visible to readers only by publish().
@@ -33,9 +32,9 @@ uint32_t corrupted(const LXObjEntry& entry, const char* field) {
   return LX_E_HEADER;
 }
 
-uint32_t read_header(const LXObjEntry& entry, FileHeader& header) {
+uint32_t read_header(const LXObjEntry& entry, LXFile* file, FileHeader& header) {
   uint32_t rc = LX_OK;
-  Owned<uint8_t> bytes(static_cast<uint8_t*>(LXLoadFile(entry.file, 0, sizeof header, &rc)));
+  Owned<uint8_t> bytes(static_cast<uint8_t*>(LXLoadFile(file, 0, sizeof header, &rc)));
   if (!bytes) return rc;
   std::memcpy(static_cast<void*>(&header), bytes.get(), sizeof header);
   if (header.magic != kFileMagic) return corrupted(entry, "header");
@@ -43,11 +42,11 @@ uint32_t read_header(const LXObjEntry& entry, FileHeader& header) {
   return LX_OK;
 }
 
-uint32_t read_sections(const LXObjEntry& entry, const FileHeader& header, Loading& loading) {
+uint32_t read_sections(const LXObjEntry& entry, LXFile* file, const FileHeader& header, Loading& loading) {
   for (unsigned i = 0; i < header.section_count; ++i) {
     uint32_t rc = LX_OK;
     loading.sections[i].reset(
-        static_cast<uint8_t*>(LXLoadFile(entry.file, header.offset_of(i), header.size_of(i), &rc)));
+        static_cast<uint8_t*>(LXLoadFile(file, header.offset_of(i), header.size_of(i), &rc)));
     if (rc != LX_OK) return rc;
     loading.sizes[i] = header.size_of(i);
   }
@@ -116,11 +115,11 @@ void publish(LXObjEntry& entry, Loading& loading) {
   entry.section1.store(loading.sections[0].give_up(), std::memory_order_release);
 }
 
-uint32_t load_open_file(LXObjEntry& entry) {
+uint32_t load_open_file(LXObjEntry& entry, LXFile* file) {
   FileHeader header;
   Loading loading;
-  uint32_t rc = read_header(entry, header);
-  if (rc == LX_OK) rc = read_sections(entry, header, loading);
+  uint32_t rc = read_header(entry, file, header);
+  if (rc == LX_OK) rc = read_sections(entry, file, header, loading);
   if (rc == LX_OK) rc = check_object(entry, header, loading);
   if (rc == LX_OK) publish(entry, loading);
   return rc;
@@ -130,13 +129,9 @@ uint32_t load_from_file(const LXObjMgr& manager, LXObjEntry& entry) {
   char name[sizeof manager.directory + kObjectNameRoom];
   if (LXGetDataFileName(manager.directory, entry.type, entry.id, name, sizeof name) == nullptr) return LX_E_FILE;
   uint32_t rc = LX_OK;
-  const LXGlobals* area = live_globals();
-  entry.file = LXOpenFile(area != nullptr ? area->file_access_mode : 0, name, 0, 0, &rc);
-  if (entry.file == nullptr) return rc;
-  rc = load_open_file(entry);
-  // A process that starts and ends the library often must not run out of descriptors.
-  LXCloseFile(std::exchange(entry.file, nullptr), 0);
-  return rc;
+  // Closed again at once: a process that starts and ends the library often must not run out of descriptors.
+  DataFile file(name, rc);
+  return file ? load_open_file(entry, file.get()) : rc;
 }
 
 bool free_section(const uint8_t* section, bool converted) {
@@ -177,7 +172,6 @@ uint32_t LXUnloadObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
     }
     const CodePage* code_page = std::exchange(entry->code_page, nullptr);
     if (code_page != nullptr && !release(code_page)) result = LX_E_FREE;
-    entry->file = nullptr;
     entry->flags = 0;
     return result;
   });
@@ -186,6 +180,7 @@ uint32_t LXUnloadObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
 uint32_t LXLoadDefaultObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
   return exported(trace_unit, __func__, [&]() -> uint32_t {
     if (entry == nullptr || entry->type >= LX_SORT) return 1;
+    if (entry->loaded()) return 0;
     static const uint8_t* const kSections[] = {LXDefaultLanguage, LXDefaultTerritory, LXDefaultCodePage};
     entry->flags = kEntryBuiltIn;
     if (entry->type == LX_CODEPAGE) {

@@ -25,27 +25,40 @@ constexpr size_t kBlock = 32;
 
 bool has_avx2() { return __builtin_cpu_supports("avx2") != 0; }
 
-// A table lookup for 32 bytes: each of the table's rows of 16 is shuffled by the low nibbles and kept where the high
-// nibble is the row's number.
+// A table lookup for 32 bytes. The table's rows of 16 are kept as differences from the row before: a shuffle takes from
+// every row up to the right one, and the differences add up to its value. Behind the right row the index is negative,
+// for which a shuffle gives nothing. The upper half of the table is a table of its own.
 struct VectorTable {
   __m256i rows[16];
 };
 
 __attribute__((target("avx2"))) inline void load_rows(VectorTable& table, const uint8_t* bytes, unsigned count) {
+  __m128i before = _mm_setzero_si128();
   for (unsigned row = 0; row < count; ++row) {
-    table.rows[row] = _mm256_broadcastsi128_si256(_mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes + 16 * row)));
+    if (row == 8) before = _mm_setzero_si128();
+    __m128i values = _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes + 16 * row));
+    table.rows[row] = _mm256_broadcastsi128_si256(_mm_xor_si128(values, before));
+    before = values;
   }
 }
 
-// Adding 0x70 with saturation to the distance from the row's first byte leaves the high bit clear only for the row's
-// own 16 bytes; the shuffle gives zero for the others.
+__attribute__((target("avx2"))) inline __m256i look_up_half(const __m256i* rows, __m256i bytes) {
+  __m256i row_size = _mm256_set1_epi8(16);
+  __m256i result = _mm256_shuffle_epi8(rows[0], bytes);
+  for (unsigned row = 1; row < 8; ++row) {
+    bytes = _mm256_subs_epi8(bytes, row_size);
+    result = _mm256_xor_si256(result, _mm256_shuffle_epi8(rows[row], bytes));
+  }
+  return result;
+}
+
+// Bytes above 0x7F are negative in one half, the others in the other.
 template <unsigned kRows>
 __attribute__((target("avx2"))) inline __m256i look_up(const VectorTable& table, __m256i bytes) {
-  __m256i result = _mm256_setzero_si256();
-  for (unsigned row = 0; row < kRows; ++row) {
-    __m256i distance = _mm256_sub_epi8(bytes, _mm256_set1_epi8(static_cast<char>(16 * row)));
-    __m256i index = _mm256_adds_epu8(distance, _mm256_set1_epi8(0x70));
-    result = _mm256_or_si256(result, _mm256_shuffle_epi8(table.rows[row], index));
+  __m256i result = look_up_half(table.rows, bytes);
+  if constexpr (kRows == 16) {
+    __m256i upper = _mm256_xor_si256(bytes, _mm256_set1_epi8(static_cast<char>(0x80)));
+    result = _mm256_or_si256(result, look_up_half(table.rows + 8, upper));
   }
   return result;
 }
@@ -81,21 +94,23 @@ __attribute__((target("avx2"))) size_t map_to_ascii_blocks(const uint8_t* table,
   return done;
 }
 
-__attribute__((target("avx2"))) size_t map_from_ascii_blocks(const uint8_t* table, const uint8_t* in, size_t count,
-                                                             uint8_t* out) {
+__attribute__((target("avx2"))) size_t map_from_ascii_blocks(const uint8_t* table, uint8_t from, const uint8_t* in,
+                                                             size_t count, uint8_t* out) {
   VectorTable vectors;
   load_rows(vectors, table, 8);
+  // Compared as signed bytes, what is not ASCII is below everything.
+  __m256i below = _mm256_set1_epi8(static_cast<char>(from - 1));
   size_t done = 0;
   for (; count - done >= kBlock; done += kBlock) {
     __m256i block = load_block(in + done);
-    if (_mm256_movemask_epi8(block) != 0) break;
+    if (_mm256_movemask_epi8(_mm256_cmpgt_epi8(block, below)) != -1) break;
     store_block(out + done, look_up<8>(vectors, block));
   }
   return done;
 }
 
-__attribute__((target("avx2"))) size_t map_bytes_blocks(const uint8_t* table, const uint8_t* in, size_t count,
-                                                        uint8_t* out) {
+__attribute__((target("avx2"))) size_t map_bytes_avx2(const uint8_t* table, const uint8_t* in, size_t count,
+                                                      uint8_t* out) {
   VectorTable vectors;
   load_rows(vectors, table, 16);
   size_t done = 0;
@@ -103,13 +118,189 @@ __attribute__((target("avx2"))) size_t map_bytes_blocks(const uint8_t* table, co
   return done;
 }
 
+// Newer processors look up bytes in a table of 128 with one instruction.
+#define LX_AVX512 __attribute__((target("avx512f,avx512bw,avx512vl,avx512vbmi")))
+
+LX_AVX512 size_t map_bytes_avx512(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
+  __m512i quarters[4];
+  for (unsigned i = 0; i < 4; ++i) quarters[i] = _mm512_loadu_si512(table + 64 * i);
+  size_t done = 0;
+  while (count - done >= kBlock) {
+    size_t size = count - done >= 2 * kBlock ? 2 * kBlock : kBlock;
+    __mmask64 here = size == kBlock ? 0xFFFFFFFFu : ~__mmask64{0};
+    __m512i block = _mm512_maskz_loadu_epi8(here, in + done);
+    __m512i lower = _mm512_permutex2var_epi8(quarters[0], block, quarters[1]);
+    __m512i upper = _mm512_permutex2var_epi8(quarters[2], block, quarters[3]);
+    _mm512_mask_storeu_epi8(out + done, here, _mm512_mask_blend_epi8(_mm512_movepi8_mask(block), lower, upper));
+    done += size;
+  }
+  return done;
+}
+
+size_t map_bytes_blocks(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
+  static_assert(kBlock == 32);
+  if (__builtin_cpu_supports("avx512vbmi") && __builtin_cpu_supports("avx512vl")) {
+    return map_bytes_avx512(table, in, count, out);
+  }
+  return map_bytes_avx2(table, in, count, out);
+}
+
+// Bytes are mapped in pieces; a piece is done with before the next one begins, so that what is read back from it has
+// long been written.
+constexpr size_t kPiece = 256;
+
+// ASCII goes over in blocks; before each other character the block is stored as far as it is right, and begun anew
+// behind it. `ascii` holds the piece as ASCII, with the high bit set where it is something else.
+__attribute__((target("avx2"))) bool piece_to_utf8(const CodePage& page, const uint8_t* ascii, size_t count,
+                                                   Run<uint8_t, uint8_t>& run) {
+  const uint8_t* in = run.in;
+  uint8_t* out = run.out;
+  size_t done = 0;
+  bool all = true;
+  while (done < count) {
+    __m256i block = load_block(ascii + done);
+    auto others = static_cast<unsigned>(_mm256_movemask_epi8(block));
+    store_block(out, block);
+    size_t plain = others == 0 ? kBlock : static_cast<size_t>(__builtin_ctz(others));
+    if (plain >= count - done) plain = count - done;
+    done += plain;
+    out += plain;
+    for (; done < count && ascii[done] >= 0x80; ++done) {
+      uint32_t character = page.utf8_of_byte[in[done]];
+      if (character == 0) {
+        all = false;
+        break;
+      }
+      std::memcpy(out, &character, sizeof character);
+      out += character >> 24;
+    }
+    if (!all) break;
+  }
+  run.in = in + done;
+  run.out = out;
+  return all;
+}
+
+__attribute__((target("avx2"))) void to_utf8_blocks(const CodePage& page, Run<uint8_t, uint8_t>& run) {
+  uint8_t ascii[kPiece + kBlock];
+  for (;;) {
+    auto count = static_cast<size_t>(run.in_end - run.in);
+    if (count < kBlock || static_cast<size_t>(run.out_end - run.out) < 3 * kPiece + kBlock) return;
+    count = count < kPiece ? count / kBlock * kBlock : kPiece;
+    const uint8_t* piece = run.in;
+    if (!page.ascii_bytes || count + kBlock > static_cast<size_t>(run.in_end - run.in)) {
+      map_bytes_blocks(page.ascii_of_byte, run.in, count, ascii);
+      store_block(ascii + count, _mm256_setzero_si256());
+      piece = ascii;
+    }
+    if (!piece_to_utf8(page, piece, count, run)) return;
+  }
+}
+
+// One character of two or three bytes; null: not well-formed, or nothing to be sure of.
+inline const uint8_t* sequence_from_utf8(const CodePage& page, const uint8_t* in, uint8_t* out) {
+  unsigned first = in[0];
+  unsigned second = in[1] ^ 0x80u;  // below 0x40 for a continuation byte
+  unsigned character = (first & 0x1F) << 6 | second;
+  size_t length = 2;
+  bool sound = first >= 0xC2 && second < 0x40;
+  if (first >= 0xE0) {
+    unsigned third = in[2] ^ 0x80u;
+    character = (first & 0x0F) << 12 | second << 6 | third;
+    length = 3;
+    sound = first < 0xF0 && (second | third) < 0x40 && character >= 0x800;  // no page has surrogates
+  }
+  if (!sound) return nullptr;
+  uint32_t packed = page.from_narrow[character >> 8][character & 0xFF];
+  if (packed == page.substitution) return nullptr;
+  *out = static_cast<uint8_t>(packed);
+  return in + length;
+}
+
+__attribute__((target("avx2"))) void from_utf8_blocks(const CodePage& page, Run<uint8_t, uint8_t>& run) {
+  VectorTable vectors;
+  load_rows(vectors, page.byte_of_latin1, 8);
+  __m256i below = _mm256_set1_epi8(static_cast<char>(page.ascii_from - 1));
+  const uint8_t* in = run.in;
+  uint8_t* out = run.out;
+  while (static_cast<size_t>(run.in_end - in) >= kBlock && static_cast<size_t>(run.out_end - out) >= kBlock) {
+    __m256i block = load_block(in);
+    auto others = ~static_cast<unsigned>(_mm256_movemask_epi8(_mm256_cmpgt_epi8(block, below)));
+    store_block(out, page.ascii_bytes ? block : look_up<8>(vectors, block));
+    size_t plain = others == 0 ? kBlock : static_cast<size_t>(__builtin_ctz(others));
+    in += plain;
+    out += plain;
+    while (run.in_end - in >= 3 && out != run.out_end && *in >= 0x80) {
+      const uint8_t* next = sequence_from_utf8(page, in, out);
+      if (next == nullptr) break;
+      in = next;
+      ++out;
+    }
+    if (plain == 0 && *in >= 0x80) break;
+    if (in != run.in_end && *in < page.ascii_from) break;
+  }
+  run.in = in;
+  run.out = out;
+}
+
+// Whole blocks of a piece that both sides have room for.
+template <class In, class Out>
+size_t piece_size(const Run<In, Out>& run) {
+  auto count = static_cast<size_t>(run.in_end - run.in);
+  if (static_cast<size_t>(run.out_end - run.out) < count) count = static_cast<size_t>(run.out_end - run.out);
+  return (count < kPiece ? count : kPiece) / kBlock * kBlock;
+}
+
+__attribute__((target("avx2"))) void to_ucs2_blocks(const CodePage& page, Run<uint8_t, uint16_t>& run) {
+  uint8_t mapped[kPiece];
+  while (size_t count = piece_size(run)) {
+    const uint8_t* piece = run.in;
+    if (!page.latin1_bytes) {
+      map_bytes_blocks(page.latin1_of_byte, piece, count, mapped);
+      piece = mapped;
+    }
+    for (size_t i = 0; i < count; i += kBlock) {
+      __m256i block = load_block(piece + i);
+      auto* out = reinterpret_cast<uint8_t*>(run.out + i);
+      store_block(out, _mm256_cvtepu8_epi16(_mm256_castsi256_si128(block)));
+      store_block(out + kBlock, _mm256_cvtepu8_epi16(_mm256_extracti128_si256(block, 1)));
+    }
+    run.in += count;
+    run.out += count;
+  }
+}
+
+__attribute__((target("avx2"))) void from_ucs2_blocks(const CodePage& page, Run<uint16_t, uint8_t>& run) {
+  __m256i beyond = _mm256_set1_epi16(static_cast<short>(0xFF00));
+  uint8_t packed[kPiece];
+  while (size_t count = piece_size(run)) {
+    uint8_t* piece = page.latin1_bytes ? run.out : packed;
+    size_t done = 0;
+    for (; done < count; done += kBlock) {
+      const auto* in = reinterpret_cast<const uint8_t*>(run.in + done);
+      __m256i first = load_block(in);
+      __m256i second = load_block(in + kBlock);
+      if (!_mm256_testz_si256(_mm256_or_si256(first, second), beyond)) break;
+      // Packing works on halves of 128 bits, which are put in order afterwards.
+      store_block(piece + done, _mm256_permute4x64_epi64(_mm256_packus_epi16(first, second), 0xD8));
+    }
+    if (!page.latin1_bytes) map_bytes_blocks(page.byte_of_latin1, packed, done, run.out);
+    run.in += done;
+    run.out += done;
+    if (done < count) return;
+  }
+}
+
 // Below this the plain loops are as quick as loading the rows.
 constexpr size_t kWorthwhile = 64;
 
 #define LX_BLOCKS(call) (count >= kWorthwhile && has_avx2() ? (call) : 0)
+#define LX_RUN_BLOCKS(least, call) \
+  if (static_cast<size_t>(run.in_end - run.in) >= (least) && has_avx2()) call
 #else
 #define LX_BLOCKS(call) \
   size_t { 0 }
+#define LX_RUN_BLOCKS(least, call)
 #endif
 
 }  // namespace
@@ -135,15 +326,31 @@ size_t map_to_ascii(const uint8_t* table, const uint8_t* in, size_t count, uint8
   return done;
 }
 
-size_t map_from_ascii(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
-  size_t done = LX_BLOCKS(map_from_ascii_blocks(table, in, count, out));
-  for (; done < count && in[done] < 0x80; ++done) out[done] = table[in[done]];
+size_t map_from_ascii(const uint8_t* table, uint8_t from, const uint8_t* in, size_t count, uint8_t* out) {
+  size_t done = LX_BLOCKS(map_from_ascii_blocks(table, from, in, count, out));
+  for (; done < count && in[done] >= from && in[done] < 0x80; ++done) out[done] = table[in[done]];
   return done;
 }
 
 void map_bytes(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
   size_t done = LX_BLOCKS(map_bytes_blocks(table, in, count, out));
   for (; done < count; ++done) out[done] = table[in[done]];
+}
+
+void carry_to_utf8([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint8_t>& run) {
+  LX_RUN_BLOCKS(kWorthwhile, to_utf8_blocks(page, run));
+}
+
+void carry_from_utf8([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint8_t>& run) {
+  LX_RUN_BLOCKS(kWorthwhile, from_utf8_blocks(page, run));
+}
+
+void carry_to_ucs2([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint16_t>& run) {
+  LX_RUN_BLOCKS(kBlock, to_ucs2_blocks(page, run));
+}
+
+void carry_from_ucs2([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint16_t, uint8_t>& run) {
+  LX_RUN_BLOCKS(kBlock, from_ucs2_blocks(page, run));
 }
 
 }  // namespace lx

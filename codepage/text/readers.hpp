@@ -8,8 +8,11 @@
 //   next_fast(character) as next, for well-formed characters only; false: ask next instead (the reader may have moved)
 #pragma once
 
+#include <algorithm>
+#include <bit>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 
 #include "codepage/text/byte_runs.hpp"
 #include "codepage/text/packed.hpp"
@@ -40,6 +43,8 @@ struct ByteReader {
 
   bool done() const { return at == end; }
   size_t left() const { return static_cast<size_t>(end - at); }
+  void skip(size_t length) { at += length; }
+  bool turn() { return false; }
   // The character of `length` bytes that begins here, when it is all there.
   bool take(size_t length) {
     if (left() < length) return false;
@@ -48,6 +53,14 @@ struct ByteReader {
     return true;
   }
 };
+
+// Whether eight bytes of ASCII follow: fewer are not worth a run.
+inline bool word_of_ascii(const ByteReader& in) {
+  uint64_t word = 0;
+  if (in.left() < sizeof word) return false;
+  std::memcpy(&word, in.at, sizeof word);
+  return (word & 0x8080808080808080u) == 0;
+}
 
 // The way from the bytes of one single-byte page to those of another.
 struct ByteMap {
@@ -60,7 +73,9 @@ struct ByteMap {
 
 // Every byte is a character.
 struct SingleByteReader : ByteReader {
-  using ByteReader::ByteReader;
+  const uint16_t* one_byte_;
+  SingleByteReader(const CodePage& code_page, const uint8_t* text, size_t length)
+      : ByteReader(code_page, text, length), one_byte_(code_page.to_unicode) {}
   const ByteMap* map = nullptr;  // to the page of the writer, where somebody has made it
 
   Got next(uint16_t& character) {
@@ -74,23 +89,28 @@ struct SingleByteReader : ByteReader {
     return Got::character;
   }
   size_t fast_characters() const { return left(); }
-  bool next_fast(uint16_t& character) {
-    character = page->to_unicode[*at++];
-    return true;
+  size_t peek(uint16_t& character) const {
+    character = one_byte_[*at];
+    return 1;
   }
+  bool ascii_ahead() const { return !done() && page->ascii_of_byte[*at] < 0x80; }
 };
 
 // The first byte tells the length.
 struct MultibyteReader : ByteReader {
-  using ByteReader::ByteReader;
+  MultibyteReader(const CodePage& code_page, const uint8_t* text, size_t length)
+      : ByteReader(code_page, text, length),
+        lead_(code_page.lead),
+        rows_(code_page.rows),
+        one_byte_(code_page.to_unicode) {}
 
   Got next(uint16_t& character) {
     if (done()) return Got::end;
     size_t length = page->char_length[*at];
+    if (strict && length > 1) [[unlikely]]
+      return next_strict(character, length);
     if (!take(length)) return Got::partial;
     character = length == 1 ? page->to_unicode[*start] : page->decode(start);
-    if (character == kUnassigned && strict && length > 1) [[unlikely]]
-      at = start + well_formed_prefix();
     return Got::character;
   }
   Got next_packed(uint32_t& value) {
@@ -101,28 +121,47 @@ struct MultibyteReader : ByteReader {
     return Got::character;
   }
   size_t fast_characters() const { return left() / kMaxCharacterLength; }
-  bool next_fast(uint16_t& character) {
-    size_t length = page->char_length[*at];
-    character = length == 1 ? page->to_unicode[*at] : page->decode(at);
-    at += length;
-    return true;
+  size_t peek(uint16_t& character) const {
+    unsigned row = lead_[*at];
+    if (row < CodePage::kOtherLength) {
+      character = rows_[row << 8 | at[1]];
+      return 2;
+    }
+    if (row == CodePage::kNoLead) {
+      character = one_byte_[*at];
+      return 1;
+    }
+    character = page->decode(at);
+    return page->char_length[*at];
   }
+  bool ascii_ahead() const { return word_of_ascii(*this); }
 
  private:
-  // Bytes that some character of the page could begin with; at least one. A lead byte before a control character or
+  // What is no character ends before the first byte that could not follow: a lead byte before a control character or
   // a line end does not swallow it.
-  size_t well_formed_prefix() const {
-    const ToUnicodeState* states = page->raw.states;
-    if (states == nullptr) return 1;
-    const ToUnicodeState* state = states;
-    const uint8_t* byte = start;
-    while (byte < at && *byte >= state->low && *byte <= state->high) {
-      if (state->final != 0) return static_cast<size_t>(byte + 1 - start);
-      state = states + state->index + (*byte & state->mask);
-      ++byte;
-    }
-    return byte == start ? 1 : static_cast<size_t>(byte - start);
+  Got next_strict(uint16_t& character, size_t length) {
+    size_t fits = well_formed_prefix(std::min(length, left()));
+    if (fits == left() && fits < length) return Got::partial;
+    take(fits < length ? fits : length);
+    character = fits < length ? kUnassigned : page->decode(start);
+    return Got::character;
   }
+
+  // Bytes that some character of the page could begin with; at least one.
+  size_t well_formed_prefix(size_t count) const {
+    const ToUnicodeState* states = page->raw.states;
+    const ToUnicodeState* state = states;
+    for (size_t i = 0; i < count; ++i) {
+      if (states == nullptr || at[i] < state->low || at[i] > state->high) return i == 0 ? 1 : i;
+      if (state->final != 0) return count;
+      state = states + state->index + (at[i] & state->mask);
+    }
+    return count;
+  }
+
+  const uint16_t* lead_;
+  const uint16_t* rows_;
+  const uint16_t* one_byte_;
 };
 
 // Multibyte text converted by rule.
@@ -132,6 +171,30 @@ struct Utf8Reader : ByteReader {
   static uint16_t decode(const uint8_t* bytes) {
     if (bytes[0] < 0xE0) return static_cast<uint16_t>((bytes[0] & 0x1F) << 6 | (bytes[1] & 0x3F));
     return static_cast<uint16_t>((bytes[0] & 0x0F) << 12 | (bytes[1] & 0x3F) << 6 | (bytes[2] & 0x3F));
+  }
+
+  // The first byte lowest.
+  static uint32_t load_four(const uint8_t* bytes) {
+    uint32_t four = 0;
+    std::memcpy(&four, bytes, sizeof four);
+    return std::endian::native == std::endian::little ? four : __builtin_bswap32(four);
+  }
+
+  static bool well_formed(const uint8_t* bytes, size_t length) {
+    auto follows = [=](size_t i) { return (bytes[i] & 0xC0) == 0x80; };
+    unsigned first = bytes[0];
+    switch (length) {
+      case 1:
+        return first < 0x80;
+      case 2:
+        return first >= 0xC2 && first < 0xE0 && follows(1);
+      case 3:
+        return (first & 0xF0) == 0xE0 && follows(1) && follows(2) && (first != 0xE0 || bytes[1] >= 0xA0) &&
+               (first != 0xED || bytes[1] < 0xA0);
+      default:
+        return first >= 0xF0 && first < 0xF5 && follows(1) && follows(2) && follows(3) &&
+               (first != 0xF0 || bytes[1] >= 0x90) && (first != 0xF4 || bytes[1] < 0x90);
+    }
   }
 
   Got next(uint16_t& character) {
@@ -149,26 +212,22 @@ struct Utf8Reader : ByteReader {
     value = pack(start, length);
     return Got::character;
   }
-  size_t fast_characters() const { return page->standard_utf8 ? left() / 3 : 0; }
-  bool next_fast(uint16_t& character) {
-    unsigned first = *at;
-    if (first < 0x80) {
-      character = static_cast<uint16_t>(first);
-      at += 1;
-      return true;
+  size_t fast_characters() const { return page->standard_utf8 ? left() / 4 : 0; }
+  size_t peek(uint16_t& character) const {
+    uint32_t four = load_four(at);
+    if ((four & 0x80) == 0) {
+      character = static_cast<uint16_t>(four & 0x7F);
+      return 1;
     }
-    unsigned second = at[1] ^ 0x80u;  // below 0x40 for a continuation byte
-    if (first - 0xE0 < 0x10) {
-      unsigned third = at[2] ^ 0x80u;
-      unsigned value = (first & 0x0F) << 12 | second << 6 | third;
+    if ((four & 0xC0C0F0) == 0x8080E0) {
+      uint32_t value = (four & 0x0F) << 12 | (four >> 2 & 0xFC0) | (four >> 16 & 0x3F);
       character = static_cast<uint16_t>(value);
-      at += 3;
-      return (second | third) < 0x40 && value >= 0x800 && value - 0xD800 >= 0x800;
+      return value - 0x800 < 0xD000 || value >= 0xE000 ? 3 : 0;
     }
-    character = static_cast<uint16_t>((first & 0x1F) << 6 | second);
-    at += 2;
-    return first - 0xC2 < 0x1E && second < 0x40;
+    character = static_cast<uint16_t>((four & 0x1F) << 6 | (four >> 8 & 0x3F));
+    return (four & 0xC0E0) == 0x80C0 && character >= 0x80 ? 2 : 0;
   }
+  bool ascii_ahead() const { return word_of_ascii(*this); }
 
  private:
   // Well-formed sequences beyond UCS-2 and the longest beginnings of broken ones are one U+FFFD each.
@@ -200,12 +259,19 @@ struct ShiftedReader : ByteReader {
   const uint8_t* odd_shift = nullptr;  // a shift byte that changed nothing, until somebody takes note of it
 
   ShiftedReader(const CodePage& code_page, const uint8_t* text, size_t length, uint32_t state)
-      : ByteReader(code_page, text, length), double_byte(state != 0) {}
+      : ByteReader(code_page, text, length),
+        double_byte(state != 0),
+        lead_(code_page.lead),
+        rows_(code_page.rows),
+        one_byte_(code_page.to_unicode),
+        enter_(code_page.enter_byte),
+        leave_(code_page.leave_byte) {}
 
   bool at_shift() const { return *at == page->enter_byte || *at == page->leave_byte; }
   size_t length_here() const { return double_byte ? page->max_length : size_t{1}; }
   uint16_t decode() const {
     if (!double_byte) return page->to_unicode[*start];
+    if (at - start < page->max_length) return kUnassigned;
     return page->kind == PageKind::utf8 ? Utf8Reader::decode(start) : page->decode(start);
   }
 
@@ -222,18 +288,26 @@ struct ShiftedReader : ByteReader {
     return got;
   }
   size_t fast_characters() const { return past_shift ? 0 : left() / (kMaxCharacterLength + 1); }
-  bool next_fast(uint16_t& character) {
-    if (at_shift()) [[unlikely]] {
-      bool enters = *at == page->enter_byte;
-      if (enters == double_byte) return false;
-      double_byte = enters;
-      ++at;
-      if (at_shift()) return false;
+  size_t peek(uint16_t& character) const {
+    if (double_byte) {
+      unsigned row = lead_[*at];
+      if (row >= CodePage::kOtherLength) return 0;
+      character = rows_[row << 8 | at[1]];
+      return 2;
     }
-    start = at;
-    at += length_here();
-    character = decode();
+    if (*at == enter_ || *at == leave_) return 0;
+    character = one_byte_[*at];
+    return 1;
+  }
+  // Takes a shift byte that does what it should; with another shift byte behind it, that is for next to see.
+  bool turn() {
+    if (*at != (double_byte ? leave_ : enter_) || at[1] == enter_ || at[1] == leave_) return false;
+    double_byte = !double_byte;
+    ++at;
     return true;
+  }
+  bool ascii_ahead() const {
+    return !double_byte && left() >= 8 && page->ascii_of_byte[at[0]] < 0x80 && page->ascii_of_byte[at[1]] < 0x80;
   }
 
  private:
@@ -244,11 +318,27 @@ struct ShiftedReader : ByteReader {
       double_byte = enters;
       ++at;
       if (strict && !done() && at_shift()) return Got::shift;
+      past_shift = !strict;
     }
     if (done()) return Got::end;
-    past_shift = !take(length_here());
+    size_t length = length_here();
+    if (strict && double_byte) length = length_before_shift(length);
+    past_shift = !take(length);
     return past_shift ? Got::partial : Got::character;
   }
+  // Strict reading ends a double-byte character before a shift byte: a lost byte must not cost the text behind the run.
+  size_t length_before_shift(size_t length) const {
+    for (size_t i = 1; i < length && i < left(); ++i) {
+      if (at[i] == page->enter_byte || at[i] == page->leave_byte) return i;
+    }
+    return length;
+  }
+
+  const uint16_t* lead_;
+  const uint16_t* rows_;
+  const uint16_t* one_byte_;
+  uint8_t enter_;
+  uint8_t leave_;
 };
 
 // Packed characters.
@@ -276,10 +366,12 @@ struct WideReader {
     return Got::character;
   }
   size_t fast_characters() const { return static_cast<size_t>(end - at); }
-  bool next_fast(uint16_t& character) {
-    character = unicode_of_packed(*page, *at++);
-    return true;
+  size_t peek(uint16_t& character) const {
+    character = unicode_of_packed(*page, *at);
+    return 1;
   }
+  void skip(size_t length) { at += length; }
+  bool turn() { return false; }
 
   static uint16_t unicode_of_packed(const CodePage& page, uint32_t value) {
     if (value <= 0xFF) return page.to_unicode[value];
@@ -305,10 +397,12 @@ struct Ucs2Reader {
     return Got::character;
   }
   size_t fast_characters() const { return static_cast<size_t>(end - at); }
-  bool next_fast(uint16_t& character) {
-    character = *at++;
-    return true;
+  size_t peek(uint16_t& character) const {
+    character = *at;
+    return 1;
   }
+  void skip(size_t length) { at += length; }
+  bool turn() { return false; }
 };
 
 }  // namespace lx

@@ -3,10 +3,12 @@
 //
 //   code(character)            what is stored for a UCS-2 character: its packed value in the writer's code page
 //   stands_in(code, character) whether that is only the substitution byte
+//   doubtful(code)             whether it may be so, or the character is U+FFFD; cheaper to ask
 //   fits(code)                 room for it, with the shift byte that it may need
 //   put(code)                  stores it; the caller has asked fits, or is within fast_characters
 #pragma once
 
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
@@ -15,6 +17,35 @@
 #include "objects/code_page.hpp"
 
 namespace lx {
+
+// The way from UCS-2 to packed characters, with what every character asks for at hand.
+struct FromUnicode {
+  const uint16_t* const* narrow;
+  const uint32_t* const* wide;
+  uint32_t substitution;
+  uint16_t substituted;  // the character whose place in the page the substitution byte has
+  bool usual;
+
+  explicit FromUnicode(const CodePage& page)
+      : narrow(page.from_narrow[0] != nullptr ? page.from_narrow : nullptr),
+        wide(page.from_wide),
+        substitution(page.substitution),
+        substituted(page.to_unicode[page.substitution]),
+        usual(page.usual) {}
+  uint32_t packed(uint16_t ucs2) const {
+    return narrow != nullptr ? narrow[ucs2 >> 8][ucs2 & 0xFF] : wide[ucs2 >> 8][ucs2 & 0xFF];
+  }
+  bool stands_in(uint32_t packed_value, uint16_t ucs2) const {
+    return packed_value == substitution && ucs2 != substituted;
+  }
+};
+
+// The first byte lowest in the address.
+inline void store_two(uint8_t* to, uint32_t packed) {
+  auto two = static_cast<uint16_t>(packed);
+  if (std::endian::native == std::endian::little) two = __builtin_bswap16(two);
+  std::memcpy(to, &two, sizeof two);
+}
 
 template <class U>
 struct UnitWriter {
@@ -31,13 +62,16 @@ struct UnitWriter {
 
 struct SingleByteWriter : UnitWriter<uint8_t> {
   const CodePage* page;
+  FromUnicode from;
 
-  SingleByteWriter(const CodePage& code_page, uint8_t* out, size_t size) : UnitWriter(out, size), page(&code_page) {}
-  uint32_t code(uint16_t character) const { return page->packed(character); }
-  bool stands_in(uint32_t code, uint16_t character) const { return page->stands_in(code, character); }
+  SingleByteWriter(const CodePage& code_page, uint8_t* out, size_t size)
+      : UnitWriter(out, size), page(&code_page), from(code_page) {}
+  uint32_t code(uint16_t character) const { return from.packed(character); }
+  bool stands_in(uint32_t code, uint16_t character) const { return from.stands_in(code, character); }
+  bool doubtful(uint32_t code) const { return code == from.substitution; }
   bool fits(uint32_t) const { return at != end; }
   void put(uint32_t code) { *at++ = static_cast<uint8_t>(code); }
-  size_t fast_characters() const { return room(); }
+  size_t fast_characters() const { return from.usual ? room() : 0; }
 };
 
 // Bytes of packed characters, of any code page.
@@ -48,8 +82,8 @@ struct PackedWriter : UnitWriter<uint8_t> {
     if (code < 0x100) {
       *at++ = static_cast<uint8_t>(code);
     } else if (code < 0x10000) {
-      *at++ = static_cast<uint8_t>(code >> 8);
-      *at++ = static_cast<uint8_t>(code);
+      store_two(at, code);
+      at += 2;
     } else {
       at += unpack(at, code);
     }
@@ -59,10 +93,14 @@ struct PackedWriter : UnitWriter<uint8_t> {
 
 struct MultibyteWriter : PackedWriter {
   const CodePage* page;
+  FromUnicode from;
 
-  MultibyteWriter(const CodePage& code_page, uint8_t* out, size_t size) : PackedWriter(out, size), page(&code_page) {}
-  uint32_t code(uint16_t character) const { return page->packed(character); }
-  bool stands_in(uint32_t code, uint16_t character) const { return page->stands_in(code, character); }
+  MultibyteWriter(const CodePage& code_page, uint8_t* out, size_t size)
+      : PackedWriter(out, size), page(&code_page), from(code_page) {}
+  uint32_t code(uint16_t character) const { return from.packed(character); }
+  bool stands_in(uint32_t code, uint16_t character) const { return from.stands_in(code, character); }
+  bool doubtful(uint32_t code) const { return code == from.substitution; }
+  size_t fast_characters() const { return from.usual ? PackedWriter::fast_characters() : 0; }
 };
 
 // The code of a character is the character: its bytes follow by rule.
@@ -72,17 +110,20 @@ struct Utf8Writer : UnitWriter<uint8_t> {
   Utf8Writer(const CodePage& code_page, uint8_t* out, size_t size) : UnitWriter(out, size), page(&code_page) {}
   uint32_t code(uint16_t character) const { return character; }
   bool stands_in(uint32_t, uint16_t) const { return false; }
+  bool doubtful(uint32_t code) const { return code == kUnassigned; }
   bool fits(uint32_t code) const { return room() >= (code < 0x80 ? 1u : code < 0x800 ? 2u : 3u); }
   void put(uint32_t code) {
     if (code < 0x80) {
       *at++ = static_cast<uint8_t>(code);
     } else if (code < 0x800) {
-      *at++ = static_cast<uint8_t>(0xC0 | code >> 6);
-      *at++ = static_cast<uint8_t>(0x80 | (code & 0x3F));
+      at[0] = static_cast<uint8_t>(0xC0 | code >> 6);
+      at[1] = static_cast<uint8_t>(0x80 | (code & 0x3F));
+      at += 2;
     } else {
-      *at++ = static_cast<uint8_t>(0xE0 | code >> 12);
-      *at++ = static_cast<uint8_t>(0x80 | (code >> 6 & 0x3F));
-      *at++ = static_cast<uint8_t>(0x80 | (code & 0x3F));
+      at[0] = static_cast<uint8_t>(0xE0 | code >> 12);
+      at[1] = static_cast<uint8_t>(0x80 | (code >> 6 & 0x3F));
+      at[2] = static_cast<uint8_t>(0x80 | (code & 0x3F));
+      at += 3;
     }
   }
   size_t fast_characters() const { return room() / 3; }
@@ -93,26 +134,32 @@ struct ShiftedWriter : UnitWriter<uint8_t> {
   static constexpr bool kShifted = true;
 
   const CodePage* page;
+  FromUnicode from;
+  bool by_rule;  // the double-byte characters are those of UTF-8
   bool double_byte;
   uint8_t* run = nullptr;  // where the double-byte run begins, behind its enter byte, when that was written here
 
   ShiftedWriter(const CodePage& code_page, uint8_t* out, size_t size, uint32_t state)
-      : UnitWriter(out, size), page(&code_page), double_byte(state != 0) {}
-  uint32_t code(uint16_t character) const {
-    return page->kind == PageKind::utf8 ? utf8_packed(character) : page->packed(character);
-  }
-  bool stands_in(uint32_t code, uint16_t character) const {
-    return page->kind != PageKind::utf8 && page->stands_in(code, character);
-  }
+      : UnitWriter(out, size),
+        page(&code_page),
+        from(code_page),
+        by_rule(code_page.kind == PageKind::utf8),
+        double_byte(state != 0) {}
+  uint32_t code(uint16_t character) const { return by_rule ? utf8_packed(character) : from.packed(character); }
+  bool stands_in(uint32_t code, uint16_t character) const { return !by_rule && from.stands_in(code, character); }
+  bool doubtful(uint32_t code) const { return code == from.substitution; }
   bool needs_shift(uint32_t code) const { return (code > 0xFF) != double_byte; }
   bool fits(uint32_t code) const { return room() >= unpacked_length(code) + (needs_shift(code) ? 1 : 0); }
   void put(uint32_t code) {
-    if (needs_shift(code)) {
-      double_byte = code > 0xFF;
-      *at++ = double_byte ? page->enter_byte : page->leave_byte;
-      run = at;
+    if (needs_shift(code)) shift();
+    if (code < 0x100) {
+      *at++ = static_cast<uint8_t>(code);
+    } else if (code < 0x10000) {
+      store_two(at, code);
+      at += 2;
+    } else {
+      at += unpack(at, code);
     }
-    at += put_bytes(code);
   }
   // Returns to the single-byte state: takes an enter byte back that has nothing behind it, or writes the leave byte,
   // for which characters make way until `needed` units are free. False: there is no room even so.
@@ -132,7 +179,7 @@ struct ShiftedWriter : UnitWriter<uint8_t> {
     }
     return true;
   }
-  size_t fast_characters() const { return room() / (kMaxCharacterLength + 1); }
+  size_t fast_characters() const { return from.usual && !by_rule ? room() / (kMaxCharacterLength + 1) : 0; }
 
   static uint32_t utf8_packed(uint16_t character) {
     if (character < 0x80) return character;
@@ -141,24 +188,21 @@ struct ShiftedWriter : UnitWriter<uint8_t> {
   }
 
  private:
-  size_t put_bytes(uint32_t code) {
-    if (code > 0xFFFF) return unpack(at, code);
-    if (code < 0x100) {
-      at[0] = static_cast<uint8_t>(code);
-      return 1;
-    }
-    at[0] = static_cast<uint8_t>(code >> 8);
-    at[1] = static_cast<uint8_t>(code);
-    return 2;
+  void shift() {
+    double_byte = !double_byte;
+    *at++ = double_byte ? page->enter_byte : page->leave_byte;
+    run = at;
   }
 };
 
 struct WideWriter : UnitWriter<uint32_t> {
   const CodePage* page;
+  FromUnicode from;
 
-  WideWriter(const CodePage& code_page, uint32_t* out, size_t size) : UnitWriter(out, size), page(&code_page) {}
+  WideWriter(const CodePage& code_page, uint32_t* out, size_t size)
+      : UnitWriter(out, size), page(&code_page), from(code_page) {}
   uint32_t code(uint16_t character) const {
-    return page->kind == PageKind::utf8 ? ShiftedWriter::utf8_packed(character) : page->packed(character);
+    return page->kind == PageKind::utf8 ? ShiftedWriter::utf8_packed(character) : from.packed(character);
   }
   bool fits(uint32_t) const { return at != end; }
   void put(uint32_t code) { *at++ = code; }

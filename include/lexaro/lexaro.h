@@ -226,8 +226,8 @@ LX_API int32_t LXLangGetSpecial(const LXObjEntry* language, uint16_t key1, uint1
 /* ---- Locales ---- */
 
 /*
- * A new locale from "Language_Territory.CodePage@Sort"; every part but the language may be left out (the language's
- * defaults stand in), the code page may be an alias, the sort may be "BINARY". Null or empty: English.
+ * A new locale from "Language_Territory.CodePage@Sort"; every part may be left out (English, and the
+ * language's defaults, stand in), the code page may be an alias, the sort may be "BINARY". Null or empty: English.
  * options: LX_GET_USER, LX_GET_SUBSTITUTE. Null with rc LX_E_ARGUMENT, LX_E_MEMORY, LX_E_LANGUAGE, LX_E_TERRITORY,
  * LX_E_CODEPAGE, LX_E_SORT or LX_E_MANAGER. Free it with LXReleaseLocale.
  * With LX_GET_USER the process's setlocale state is switched and restored: for use while a program sets itself up.

@@ -1,0 +1,12 @@
+# SPDX-License-Identifier: Apache-2.0
+# A test for each fuzz target, built without the fuzzer: all seeds go through it.
+include(${CMAKE_CURRENT_LIST_DIR}/targets.cmake)
+
+foreach(target ${LEXARO_FUZZ_TARGETS})
+  set(name ${target}_replay)
+  add_executable(${name} ${LEXARO_FUZZ_FOLDER}/${target}.cpp ${LEXARO_FUZZ_FOLDER}/replay_main.cpp
+    ${LEXARO_FUZZ_SUPPORT})
+  lexaro_fuzz_properties(${name})
+  add_test(NAME ${name} COMMAND ${name} ${LEXARO_FUZZ_FOLDER}/seeds/${target})
+  set_tests_properties(${name} PROPERTIES TIMEOUT 300)
+endforeach()

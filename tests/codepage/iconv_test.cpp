@@ -1,0 +1,281 @@
+// SPDX-License-Identifier: Apache-2.0
+// The code pages beside those of the C library, both ways, all byte sequences and all of UCS-2. Where the two differ
+// on purpose, iconv_differences.txt says so and why; anything else is a failure, and so is a difference that is gone.
+#include <errno.h>
+#include <iconv.h>
+
+#include <algorithm>
+#include <fstream>
+#include <iterator>
+#include <map>
+#include <optional>
+#include <set>
+
+#include "support/page_source.hpp"
+#include "support/session.hpp"
+
+namespace lx::test {
+namespace {
+
+struct Peer {
+  uint16_t id;
+  const char* name;
+};
+
+const Peer kPeers[] = {
+    {37, "IBM037"},          {273, "IBM273"},         {277, "IBM277"},         {278, "IBM278"},
+    {280, "IBM280"},         {284, "IBM284"},         {285, "IBM285"},         {290, "IBM290"},
+    {297, "IBM297"},         {367, "US-ASCII"},       {420, "IBM420"},         {424, "IBM424"},
+    {437, "IBM437"},         {500, "IBM500"},         {737, "CP737"},          {775, "CP775"},
+    {813, "ISO-8859-7"},     {819, "ISO-8859-1"},     {850, "IBM850"},         {852, "IBM852"},
+    {855, "IBM855"},         {857, "IBM857"},         {858, "IBM858"},         {860, "IBM860"},
+    {861, "IBM861"},         {862, "IBM862"},         {863, "IBM863"},         {864, "IBM864"},
+    {865, "IBM865"},         {866, "IBM866"},         {869, "IBM869"},         {870, "IBM870"},
+    {871, "IBM871"},         {874, "CP874"},          {875, "IBM875"},         {878, "KOI8-R"},
+    {912, "ISO-8859-2"},     {913, "ISO-8859-3"},     {915, "ISO-8859-5"},     {916, "ISO-8859-8"},
+    {919, "ISO-8859-10"},    {920, "ISO-8859-9"},     {921, "ISO-8859-13"},    {923, "ISO-8859-15"},
+    {930, "IBM930"},         {932, "CP932"},          {933, "IBM933"},         {935, "IBM935"},
+    {936, "CP936"},          {937, "IBM937"},         {939, "IBM939"},         {949, "CP949"},
+    {950, "CP950"},          {954, "EUC-JP"},         {964, "EUC-TW"},         {970, "EUC-KR"},
+    {1025, "IBM1025"},       {1026, "IBM1026"},       {1047, "IBM1047"},       {1089, "ISO-8859-6"},
+    {1112, "IBM1112"},       {1122, "IBM1122"},       {1140, "IBM1140"},       {1141, "IBM1141"},
+    {1142, "IBM1142"},       {1143, "IBM1143"},       {1144, "IBM1144"},       {1145, "IBM1145"},
+    {1146, "IBM1146"},       {1147, "IBM1147"},       {1148, "IBM1148"},       {1149, "IBM1149"},
+    {1153, "IBM1153"},       {1154, "IBM1154"},       {1155, "IBM1155"},       {1156, "IBM1156"},
+    {1157, "IBM1157"},       {1160, "IBM1160"},       {1168, "KOI8-U"},        {1250, "CP1250"},
+    {1251, "CP1251"},        {1252, "CP1252"},        {1253, "CP1253"},        {1254, "CP1254"},
+    {1255, "CP1255"},        {1256, "CP1256"},        {1257, "CP1257"},        {1258, "CP1258"},
+    {1364, "IBM1364"},       {1371, "IBM1371"},       {1383, "EUC-CN"},        {1388, "IBM1388"},
+    {1390, "IBM1390"},       {1399, "IBM1399"},       {57346, "ISO-8859-4"},   {57352, "UTF-8"},
+    {57371, "ISO-8859-11"},  {57374, "ISO-8859-14"},  {57376, "ISO-8859-16"},
+};
+
+std::string unicode_text(uint32_t value) {
+  std::string digits = "0000";
+  for (size_t i = 0; i < 4; ++i) digits[i] = "0123456789ABCDEF"[value >> (12 - 4 * i) & 0xF];
+  return digits;
+}
+
+// One conversion of the C library, a character at a time.
+class Iconv {
+ public:
+  Iconv(const char* to, const char* from) : handle_(iconv_open(to, from)) {}
+  ~Iconv() {
+    if (ok()) iconv_close(handle_);
+  }
+  bool ok() const { return handle_ != reinterpret_cast<iconv_t>(-1); }
+  // Nothing when the text is not converted whole.
+  std::optional<std::string> convert(std::string text) {
+    iconv(handle_, nullptr, nullptr, nullptr, nullptr);
+    char out[32];
+    char* in_at = text.data();
+    char* out_at = out;
+    size_t left = text.size();
+    size_t room = sizeof out;
+    if (iconv(handle_, &in_at, &left, &out_at, &room) != 0 || left != 0) return std::nullopt;
+    if (iconv(handle_, nullptr, nullptr, &out_at, &room) != 0) return std::nullopt;
+    return std::string(out, out_at);
+  }
+
+ private:
+  iconv_t handle_;
+};
+
+// What the two make of one key, as text; "-" for no character.
+struct Difference {
+  uint32_t key;
+  std::string ours;
+  std::string theirs;
+};
+
+// Neighbouring keys whose values run on in step are one line.
+class Lines {
+ public:
+  Lines(uint16_t page, bool from_unicode)
+      : head_(std::to_string(page) + (from_unicode ? " from " : " to ")), from_unicode_(from_unicode) {}
+
+  void add(const Difference& next) {
+    if (!run_.empty()) {
+      const Difference& last = run_.back();
+      bool in_step = next.key == last.key + 1 && follows(last.ours, next.ours) && follows(last.theirs, next.theirs);
+      if (!in_step) end_run();
+    }
+    run_.push_back(next);
+  }
+  std::set<std::string> take() {
+    end_run();
+    std::set<std::string> all;
+    tell(both_, 40, "both: ", all);
+    tell(ours_only_, 12, "only ours: ", all);
+    tell(theirs_only_, 12, "only theirs: ", all);
+    return all;
+  }
+
+ private:
+  struct Side {
+    std::set<std::string> lines;
+    size_t count = 0;
+  };
+  // More lines than anybody would read are merely counted.
+  void tell(const Side& side, size_t most_lines, const std::string& what, std::set<std::string>& all) const {
+    if (side.lines.size() <= most_lines) {
+      all.insert(side.lines.begin(), side.lines.end());
+    } else {
+      all.insert(head_ + what + std::to_string(side.count));
+    }
+  }
+
+  static bool follows(const std::string& last, const std::string& next) {
+    if (last == "-" || next == "-") return last == next;
+    return std::stoul(next, nullptr, 16) == std::stoul(last, nullptr, 16) + 1;
+  }
+  static std::string range(const std::string& first, const std::string& last) {
+    return first == last ? first : first + ".." + last;
+  }
+  std::string key_text(uint32_t key) const { return from_unicode_ ? unicode_text(key) : hex(unpacked(key)); }
+
+  void end_run() {
+    if (run_.empty()) return;
+    const Difference& first = run_.front();
+    const Difference& last = run_.back();
+    std::string line = head_ + range(key_text(first.key), key_text(last.key)) + " " + range(first.ours, last.ours) +
+                       " " + range(first.theirs, last.theirs);
+    Side& side = first.ours == "-" ? theirs_only_ : first.theirs == "-" ? ours_only_ : both_;
+    side.lines.insert(line);
+    side.count += run_.size();
+    run_.clear();
+  }
+
+  std::string head_;
+  bool from_unicode_;
+  std::vector<Difference> run_;
+  Side both_;
+  Side ours_only_;
+  Side theirs_only_;
+};
+
+std::set<std::string> known_differences() {
+  std::ifstream in(LEXARO_TEST_FOLDER "/iconv_differences.txt");
+  EXPECT_TRUE(in.good());
+  std::set<std::string> lines;
+  for (std::string line; std::getline(in, line);) {
+    if (!line.empty() && line[0] != '#') lines.insert(line);
+  }
+  return lines;
+}
+
+class BesideIconv {
+ public:
+  explicit BesideIconv(const Peer& peer)
+      : page_(PageSource::of(peer.id)),
+        locale_(locale_of(page_.name)),
+        record_(LXGetLocaleObject(locale_.get(), LX_CODEPAGE)),
+        id_(peer.id),
+        decode_("UTF-16LE", peer.name),
+        encode_(peer.name, "UTF-16LE") {
+    EXPECT_TRUE(decode_.ok() && encode_.ok()) << peer.name;
+  }
+
+  std::set<std::string> to_unicode() {
+    Lines lines(id_, false);
+    for (const std::string& bytes : sequences()) {
+      std::string ours = our_unicode(bytes);
+      std::string theirs = their_unicode(bytes);
+      if (ours != theirs) lines.add({packed(bytes), ours, theirs});
+    }
+    return lines.take();
+  }
+
+  std::set<std::string> from_unicode() {
+    Lines lines(id_, true);
+    for (uint32_t unicode = 0; unicode < 65536; ++unicode) {
+      std::string ours = our_bytes(unicode);
+      std::string theirs = their_bytes(unicode);
+      if (ours != theirs) lines.add({unicode, ours, theirs});
+    }
+    return lines.take();
+  }
+
+ private:
+  // All that could begin a character, but for four-byte sequences outside the plane that we have.
+  std::vector<std::string> sequences() const {
+    std::vector<std::string> all;
+    for (uint32_t first = 0; first < 256; ++first) {
+      auto byte = static_cast<uint8_t>(first);
+      bool shift = page_.mixed() && (byte == page_.enter || byte == page_.leave);
+      if (!shift && page_.length_of(byte) == 1) all.emplace_back(1, static_cast<char>(first));
+    }
+    for (uint32_t code = 0x100; code < 0x10000; ++code) {
+      bool lead = page_.mixed() ? (code >> 8) >= 0x40 : page_.lengths[code >> 8] == 2;
+      if (lead) all.push_back(unpacked(code));
+    }
+    for (uint32_t code = 0x10000; code < 0x1000000; ++code) {
+      if (page_.lengths[code >> 16] == 3) all.push_back(unpacked(code));
+    }
+    if (page_.kind == PageSource::Kind::utf8) {  // the rule takes ill-formed sequences for characters too
+      std::erase_if(all, [&](const std::string& bytes) { return page_.encode(page_.decode(bytes)) != bytes; });
+    }
+    for (uint32_t code = 0x8EA20000; code < 0x8EA30000; ++code) {
+      if (page_.lengths[0x8E] == 4) all.push_back(unpacked(code));
+    }
+    return all;
+  }
+
+  std::string our_unicode(const std::string& bytes) const {
+    int32_t unicode = 0;
+    if (bytes.size() == 1) {
+      LXUChar out = 0;
+      LXCpStrToUnicode(record_, &out, 1, bytes.data(), 1, 0);
+      unicode = out;
+    } else {
+      unicode = LXCpMbToUnicode(record_, bytes.data());
+    }
+    return unicode == kNoCharacter ? "-" : unicode_text(static_cast<uint32_t>(unicode));
+  }
+  std::string their_unicode(const std::string& bytes) {
+    bool shift = page_.mixed() && bytes.size() == 2;
+    auto result = decode_.convert(shift ? static_cast<char>(page_.enter) + bytes + static_cast<char>(page_.leave) : bytes);
+    if (!result || result->size() != 2) return "-";
+    return unicode_text(static_cast<uint8_t>((*result)[1]) * 256u + static_cast<uint8_t>((*result)[0]));
+  }
+  std::string our_bytes(uint32_t unicode) const {
+    char out[4];
+    auto count = static_cast<size_t>(LXCpUnicodeToChar(record_, static_cast<LXUChar>(unicode), out));
+    std::string bytes(out, count);
+    bool stands_in = count == 1 && static_cast<uint8_t>(out[0]) == page_.substitution &&
+                     page_.decode(bytes) != unicode;
+    return stands_in ? "-" : hex(bytes);
+  }
+  std::string their_bytes(uint32_t unicode) {
+    auto result = encode_.convert({static_cast<char>(unicode), static_cast<char>(unicode >> 8)});
+    if (!result || result->empty()) return "-";
+    if (page_.mixed() && result->size() == 4) return hex(result->substr(1, 2));
+    return hex(*result);
+  }
+
+  const PageSource& page_;
+  Locale locale_;
+  const LXObjEntry* record_;
+  uint16_t id_;
+  Iconv decode_;
+  Iconv encode_;
+};
+
+TEST(BesideIconv, DiffersOnlyWhereMeantTo) {
+  Session session;
+  std::set<std::string> found;
+  for (const Peer& peer : kPeers) {
+    BesideIconv pair(peer);
+    found.merge(pair.to_unicode());
+    found.merge(pair.from_unicode());
+  }
+  std::set<std::string> known = known_differences();
+  std::vector<std::string> fresh, gone;
+  std::set_difference(found.begin(), found.end(), known.begin(), known.end(), std::back_inserter(fresh));
+  std::set_difference(known.begin(), known.end(), found.begin(), found.end(), std::back_inserter(gone));
+  for (const std::string& line : fresh) ADD_FAILURE() << "new: " << line;
+  for (const std::string& line : gone) ADD_FAILURE() << "gone: " << line;
+}
+
+}  // namespace
+}  // namespace lx::test

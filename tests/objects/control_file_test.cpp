@@ -1,0 +1,210 @@
+// SPDX-License-Identifier: Apache-2.0
+// The directory of objects: how it is found, and what is made of good and bad ones.
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "support/descriptors.hpp"
+#include "support/environment.hpp"
+#include "support/object_builder.hpp"
+#include "support/session.hpp"
+
+namespace lx::test {
+namespace {
+
+// What a manager is asked: the first object of each type, and how many there are.
+std::string contents_of(LXObjMgr* manager) {
+  std::string text;
+  for (uint8_t type = 0; type < 4; ++type) {
+    int count = 0;
+    uint32_t rc = 0;
+    for (unsigned id = type == LX_SORT ? 1 : 0; id < 65536; ++id) {
+      if (LXGetObjFromID(manager, type, static_cast<uint16_t>(id), 1, &rc) != nullptr) ++count;
+    }
+    text += std::to_string(count) + (type < 3 ? " " : "");
+  }
+  return text;
+}
+
+struct Managed {
+  explicit Managed(const char* directory, uint32_t options = 0) : manager(LXInitObjManager(directory, options, &rc)) {}
+  ~Managed() { LXTermObjManager(manager); }
+  Managed(const Managed&) = delete;
+  Managed& operator=(const Managed&) = delete;
+  uint32_t rc = 99;
+  LXObjMgr* manager;
+};
+
+TEST(ControlFile, TypesMayBeMissing) {
+  struct Case {
+    std::vector<ObjectRecord> records;
+    const char* contents;
+  };
+  const ObjectRecord la{LX_LANGUAGE, 1, "L"}, la2{LX_LANGUAGE, 9, "L2"}, te{LX_TERRITORY, 2, "T"},
+      cp{LX_CODEPAGE, 3, "C"}, cp2{LX_CODEPAGE, 4, "C2"}, so{LX_SORT, 5, "S"};
+  const Case cases[] = {
+      {{la, la2, te, cp, cp2, so}, "2 1 2 1"},
+      {{cp, cp2}, "0 0 2 0"},
+      {{so}, "0 0 0 1"},
+      {{la}, "1 0 0 0"},
+      {{te}, "0 1 0 0"},
+      {{la, so}, "1 0 0 1"},
+      {{la, cp}, "1 0 1 0"},
+      {{te, so}, "0 1 0 1"},
+      {{}, "0 0 0 0"},
+  };
+  for (const Case& one : cases) {
+    DataDirectory directory;
+    directory.write_control(one.records);
+    Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
+    EXPECT_EQ(managed.rc, LX_OK) << one.contents;
+    EXPECT_EQ(contents_of(managed.manager), one.contents);
+  }
+}
+
+TEST(ControlFile, IdsOutOfOrderAreHarmless) {
+  DataDirectory directory;
+  directory.write_control({{LX_CODEPAGE, 9, "Nine"}, {LX_CODEPAGE, 3, "Three"}, {LX_CODEPAGE, 9, "Nine2"}});
+  Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
+  EXPECT_EQ(managed.rc, LX_OK);
+  uint32_t rc = 0;
+  for (const char* name : {"Nine", "Three", "Nine2"}) {
+    EXPECT_NE(LXGetObjFromName(managed.manager, LX_CODEPAGE, name, -1, 1, &rc), nullptr) << name;
+  }
+  contents_of(managed.manager);
+}
+
+TEST(ControlFile, ForeignFlagsAndEndlessNamesAreTamed) {
+  DataDirectory directory;
+  directory.write_control({{LX_TERRITORY, 1, std::string(34, 'n'), 0xFF}});
+  directory.write_object(LX_TERRITORY, 1, territory_file());
+  Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
+  uint32_t rc = 0;
+  LXObjEntry* entry = LXGetObjFromName(managed.manager, LX_TERRITORY, std::string(33, 'N').c_str(), -1, 0, &rc);
+  ASSERT_NE(entry, nullptr);
+  EXPECT_EQ(rc, LX_OK);
+  EXPECT_EQ(std::string(LXGetObjName(entry)), std::string(33, 'n'));
+}
+
+TEST(ControlFile, BadOnesAreRefused) {
+  const Bytes good = control_file(small_directory_records());
+  struct Case {
+    const char* what;
+    Bytes (*spoil)(Bytes);
+    uint32_t rc;
+  };
+  const Case cases[] = {
+      {"good", [](Bytes b) { return b; }, LX_OK},
+      {"empty", [](Bytes) { return Bytes(); }, LX_E_FILE},
+      {"half a header", [](Bytes b) { return b.resize(75), b; }, LX_E_FILE},
+      {"magic", [](Bytes b) { return b[3] ^= 1, b; }, LX_E_HEADER},
+      {"no section", [](Bytes b) { return b[9] = 0, b; }, LX_E_HEADER},
+      {"many sections", [](Bytes b) { return b[8] = 9, b; }, LX_OK},
+      {"any format word", [](Bytes b) { return b[4] = 0x77, b; }, LX_OK},
+      {"directory too long", [](Bytes b) { return b[10] = 0xFF, b; }, LX_E_FILE},
+      {"directory one byte longer", [](Bytes b) { return b[11]++, b.push_back(0), b; }, LX_OK},
+      {"directory elsewhere", [](Bytes b) { return b[15]++, b; }, LX_E_FILE},
+      {"directory far away", [](Bytes b) { return b[12] = 0xFF, b; }, LX_E_FILE},
+      {"cut", [](Bytes b) { return b.pop_back(), b; }, LX_E_FILE},
+      {"unknown type", [](Bytes b) { return b[76 + 38 * 8 + 2] = 4, b; }, LX_E_HEADER},
+      {"types out of order", [](Bytes b) { return b[76 + 2] = LX_CODEPAGE, b; }, LX_E_HEADER},
+  };
+  long before = open_descriptors();
+  for (const Case& one : cases) {
+    SCOPED_TRACE(one.what);
+    DataDirectory directory;
+    directory.write("control.nls", one.spoil(good));
+    {
+      Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
+      EXPECT_EQ(managed.rc, one.rc);
+      ASSERT_NE(managed.manager, nullptr);
+      EXPECT_EQ(contents_of(managed.manager), one.rc == LX_OK ? "2 2 5 0" : "0 0 0 0");
+    }
+    Managed managed(directory.path());
+    EXPECT_EQ(managed.rc, one.rc) << "built-in objects stand in, and the error is still told";
+    EXPECT_EQ(contents_of(managed.manager), one.rc == LX_OK ? "2 2 5 0" : "1 1 1 0");
+  }
+  EXPECT_EQ(open_descriptors(), before);
+}
+
+class SearchTest : public testing::Test {
+ protected:
+  SearchTest() {
+    given_.write_control({{LX_LANGUAGE, 1, "Given"}});
+    variable_.write_control({{LX_LANGUAGE, 1, "Variable"}});
+  }
+  // Who won, and with which code.
+  std::string found(const char* directory, const char* location) {
+    Variable variable("LX_LOCALEDIR", location);
+    uint32_t status = LXInit(directory, nullptr, nullptr, nullptr, 0);
+    uint32_t rc = 0;
+    std::string name = LXGetObjName(LXGetObjFromID(LXGetObjManager(), LX_LANGUAGE, 1, 1, &rc));
+    LXTerm();
+    return name + " " + std::to_string(status);
+  }
+  DataDirectory given_, variable_, empty_;
+};
+
+TEST_F(SearchTest, GivenThenVariableThenDefault) {
+  if (access("/Vantrel/locale/control.nls", F_OK) == 0) GTEST_SKIP() << "this system has a default directory";
+  EXPECT_EQ(found(given_.path(), variable_.path()), "Given 0");
+  EXPECT_EQ(found(nullptr, variable_.path()), "Variable 0");
+  EXPECT_EQ(found(empty_.path(), variable_.path()), "Variable 0");
+  EXPECT_EQ(found(empty_.path(), empty_.path()), "English 10");
+  EXPECT_EQ(found(empty_.path(), nullptr), "English 10");
+  EXPECT_EQ(found(nullptr, ""), "English 10");
+}
+
+TEST_F(SearchTest, FileThatIsFoundButBadEndsIt) {
+  empty_.write("control.nls", Bytes(100));
+  EXPECT_EQ(found(empty_.path(), variable_.path()), "English 10");
+}
+
+TEST_F(SearchTest, NamesThatAreTooLongEndIt) {
+  const std::string long_name(243, 'x');  // with "/control.nls" one byte too many
+  const std::string longer_name(300, 'x');
+  for (const std::string& name : {long_name, longer_name, std::string(255, 'x'), std::string(100000, 'x')}) {
+    EXPECT_EQ(found(name.c_str(), variable_.path()), "English 10");
+    EXPECT_EQ(found(nullptr, name.c_str()), "English 10");
+  }
+  uint32_t rc = 0;
+  Variable variable("LX_LOCALEDIR", longer_name.c_str());
+  LXTermObjManager(LXInitObjManager(nullptr, 0, &rc));
+  EXPECT_EQ(rc, LX_E_FILE);
+  LXTermObjManager(LXInitObjManager(long_name.c_str(), 0, &rc));
+  EXPECT_EQ(rc, LX_E_FILE);
+  LXTermObjManager(LXInitObjManager(long_name.substr(1).c_str(), 0, &rc));
+  EXPECT_EQ(rc, LX_E_FILE) << "this one fits, but the variable that is tried next does not";
+  variable.set(nullptr);
+  LXTermObjManager(LXInitObjManager(long_name.substr(1).c_str(), 0, &rc));
+  EXPECT_EQ(rc, LX_E_NOFILE);
+}
+
+// The longest directory that can hold a control file also serves its objects.
+TEST(ControlFile, LongestDirectory) {
+  DataDirectory base;
+  std::string path = base.path();
+  while (path.size() < 240) {
+    size_t rest = 242 - path.size() - 1;
+    path += "/" + std::string(rest > 100 ? 50 : rest, 'd');
+    ASSERT_EQ(mkdir(path.c_str(), 0755), 0);
+  }
+  ASSERT_EQ(path.size(), 242u);
+  std::string below = path.substr(std::string(base.path()).size() + 1);
+  base.write(below + "/control.nls", control_file({{LX_TERRITORY, 1, "T"}}));
+  base.write(below + "/te_00001.nls", territory_file());
+  Managed managed(path.c_str(), LX_INIT_NO_DEFAULTS);
+  EXPECT_EQ(managed.rc, LX_OK);
+  uint32_t rc = 0;
+  EXPECT_NE(LXGetObjFromID(managed.manager, LX_TERRITORY, 1, 0, &rc), nullptr);
+  EXPECT_EQ(rc, LX_OK);
+}
+
+TEST(ControlFile, DirectoryInItsPlace) {
+  DataDirectory directory;
+  ASSERT_EQ(mkdir(directory.file("control.nls").c_str(), 0755), 0);
+  Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
+  EXPECT_EQ(managed.rc, LX_E_FILE);
+}
+
+}  // namespace
+}  // namespace lx::test

@@ -1,0 +1,28 @@
+// SPDX-License-Identifier: Apache-2.0
+// A variable of the environment, set (or removed: null) as long as the object lives.
+#pragma once
+
+#include <cstdlib>
+#include <string>
+
+namespace lx::test {
+
+class Variable {
+ public:
+  Variable(const char* name, const char* value) : name_(name), had_(std::getenv(name) != nullptr) {
+    if (had_) before_ = std::getenv(name);
+    set(value);
+  }
+  ~Variable() { set(had_ ? before_.c_str() : nullptr); }
+  Variable(const Variable&) = delete;
+  Variable& operator=(const Variable&) = delete;
+
+  void set(const char* value) { value != nullptr ? setenv(name_.c_str(), value, 1) : unsetenv(name_.c_str()); }
+
+ private:
+  std::string name_;
+  bool had_;
+  std::string before_;
+};
+
+}  // namespace lx::test
