@@ -71,7 +71,7 @@ void deliver_pending(LXConversion& handle, Output& output) {
 template <class In, class Out>
 class BufferCall {
  public:
-  BufferCall(LXConversion& handle, Input& input, Output& output, const In& in, const Out& out)
+  BufferCall(LXConversion& handle, Input& input, Output& output, In& in, Out& out)
       : handle_(handle), input_(input), output_(output), in_(in), out_(out) {
     set_up_reader(handle, in_);
   }
@@ -167,8 +167,8 @@ class BufferCall {
   LXConversion& handle_;
   Input& input_;
   Output& output_;
-  In in_;
-  Out out_;
+  In& in_;
+  Out& out_;
 };
 
 uint32_t convert(LXConversion& handle, Input& input, Output& output) {
@@ -176,9 +176,9 @@ uint32_t convert(LXConversion& handle, Input& input, Output& output) {
     deliver_pending(handle, output);
     if (handle.pending_count != 0) return LX_E_FULL;
   }
-  return with_reader(*handle.from, {true, handle.source_state}, input.at, input.left, [&](const auto& in) {
+  return with_reader(*handle.from, {true, handle.source_state}, input.at, input.left, [&](auto in) {
     return with_writer(*handle.to, {true, handle.target_state}, output.at, output.room,
-                       [&](const auto& out) { return BufferCall(handle, input, output, in, out).run(); });
+                       [&](auto out) { return BufferCall(handle, input, output, in, out).run(); });
   });
 }
 

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <concepts>
+#include <cstring>
 #include <type_traits>
 
 #include "codepage/text/text_kinds.hpp"
@@ -121,6 +122,19 @@ bool carry_mapped(In&, Out&, const Watch&) {
 
 // ---- Single characters ----
 
+// Copies ASCII word by word where it is the same on both sides.
+template <class In, class Out>
+void copy_words(In& in, Out& out) {
+  uint64_t word = 0;
+  while (in.left() >= sizeof word && out.room() >= sizeof word) {
+    std::memcpy(&word, in.at, sizeof word);
+    if ((word & 0x8080808080808080u) != 0) break;
+    std::memcpy(out.at, &word, sizeof word);
+    in.at += sizeof word;
+    out.at += sizeof word;
+  }
+}
+
 // Carries well-formed characters that a watch need not see, as many as surely fit. True: a run of ASCII follows. The
 // loop works on copies of the two sides: nothing that is written to the output can change them, so they stay in
 // registers.
@@ -129,6 +143,10 @@ bool carry_fast(In& given_in, Out& given_out, const Watch&) {
   In in = given_in;
   Out out = given_out;
   bool ascii = false;
+  bool copies = false;
+  if constexpr (BytesToBytes<In, Out>) {
+    copies = ascii_form(in).way == AsciiForm::itself && ascii_form(out).way == AsciiForm::itself;
+  }
   while (size_t count = std::min(in.fast_characters(), out.fast_characters())) {
     for (; count != 0; --count) {
       uint16_t character = 0;
@@ -145,35 +163,38 @@ bool carry_fast(In& given_in, Out& given_out, const Watch&) {
       in.skip(length);
       out.put(code);
       if constexpr (BytesToBytes<In, Out>) {
-        if (character < 0x80 && in.ascii_ahead()) {
-          ascii = true;
-          goto end;
+        if (character >= 0x80 || !in.ascii_ahead()) continue;
+        if (copies) {
+          copy_words(in, out);
+          break;
         }
+        ascii = true;
+        goto end;
       }
     }
   }
 end:
-  given_in = in;
-  given_out = out;
+  given_in.return_to(in.place());
+  given_out.advance_to(out);
   return ascii;
 }
 
 // Carries one character, however long it takes.
 template <class In, class Out, class Watch>
 Stop carry_one(In& in, Out& out, Watch& watch) {
-  In mark = in;
+  auto place = in.place();
   uint16_t character = 0;
   Got got = in.next(character);
   if (got == Got::character) {
     if constexpr (Watch::kWatching) {
       if (!watch.carry(in, out, character)) {
-        in = mark;
+        in.return_to(place);
         return Stop::full;
       }
     } else {
       uint32_t code = out.code(character);
       if (!out.fits(code)) {
-        in = mark;
+        in.return_to(place);
         return Stop::full;
       }
       out.put(code);
@@ -208,7 +229,7 @@ Stop transcode(In& in, Out& out, Watch& watch) {
 template <class In, class Out>
 Stop transfer(In& in, Out& out) {
   for (;;) {
-    In mark = in;
+    auto place = in.place();
     uint32_t value = 0;
     switch (in.next_packed(value)) {
       case Got::end:
@@ -221,7 +242,7 @@ Stop transfer(In& in, Out& out) {
         break;
     }
     if (!out.fits(value)) {
-      in = mark;
+      in.return_to(place);
       return Stop::full;
     }
     out.put(value);

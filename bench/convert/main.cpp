@@ -18,7 +18,7 @@ constexpr double kMultibyteAim = 2;
 
 struct Options {
   bool quick = false;
-  const char* only = "";  // rows whose name contains it
+  const char* only = "";  // of "ROW, SIZE"
   const char* data = LEXARO_DATA;
 };
 
@@ -49,9 +49,11 @@ int run(const Options& options) {
   for (const Size& size : kSizes) {
     std::vector<Result> results;
     for (const Row& row : rows()) {
-      if (row.name().find(options.only) == std::string::npos) continue;
+      std::string name = row.name() + ", " + size.name;
+      if (name.find(options.only) == std::string::npos) continue;
       results.push_back({row, measure(row, size, effort_for(options, size))});
     }
+    if (results.empty()) continue;
     print_table(size, results);
     std::printf("\n");
     slower += print_slower(size, results);

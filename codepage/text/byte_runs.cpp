@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "codepage/text/byte_runs.hpp"
 
+#include <algorithm>
 #include <cstring>
 
 #if defined(__x86_64__)
@@ -150,50 +151,56 @@ size_t map_bytes_blocks(const uint8_t* table, const uint8_t* in, size_t count, u
 constexpr size_t kPiece = 256;
 
 // ASCII goes over in blocks; before each other character the block is stored as far as it is right, and begun anew
-// behind it. `ascii` holds the piece as ASCII, with the high bit set where it is something else.
-__attribute__((target("avx2"))) bool piece_to_utf8(const CodePage& page, const uint8_t* ascii, size_t count,
-                                                   Run<uint8_t, uint8_t>& run) {
-  const uint8_t* in = run.in;
-  uint8_t* out = run.out;
+// behind it. `ascii` holds the piece as ASCII, with the high bit set where it is something else. `text` has room to
+// spare for the last block. Returns the number of characters carried; `end` is behind their text.
+__attribute__((target("avx2"))) size_t piece_to_utf8(const CodePage& page, const uint8_t* ascii, const uint8_t* in,
+                                                     size_t count, uint8_t* text, uint8_t*& end) {
   size_t done = 0;
-  bool all = true;
   while (done < count) {
     __m256i block = load_block(ascii + done);
     auto others = static_cast<unsigned>(_mm256_movemask_epi8(block));
-    store_block(out, block);
+    store_block(text, block);
     size_t plain = others == 0 ? kBlock : static_cast<size_t>(__builtin_ctz(others));
-    if (plain >= count - done) plain = count - done;
+    if (plain > count - done) plain = count - done;
     done += plain;
-    out += plain;
+    text += plain;
     for (; done < count && ascii[done] >= 0x80; ++done) {
       uint32_t character = page.utf8_of_byte[in[done]];
       if (character == 0) {
-        all = false;
-        break;
+        end = text;
+        return done;
       }
-      std::memcpy(out, &character, sizeof character);
-      out += character >> 24;
+      std::memcpy(text, &character, sizeof character);
+      text += character >> 24;
     }
-    if (!all) break;
   }
-  run.in = in + done;
-  run.out = out;
-  return all;
+  end = text;
+  return done;
 }
 
-__attribute__((target("avx2"))) void to_utf8_blocks(const CodePage& page, Run<uint8_t, uint8_t>& run) {
+// The text of a piece is made aside, since it is stored in blocks that reach beyond its end.
+void to_utf8_blocks(const CodePage& page, Run<uint8_t, uint8_t>& run) {
   uint8_t ascii[kPiece + kBlock];
+  uint8_t text[3 * kPiece + kBlock];
   for (;;) {
-    auto count = static_cast<size_t>(run.in_end - run.in);
-    if (count < kBlock || static_cast<size_t>(run.out_end - run.out) < 3 * kPiece + kBlock) return;
-    count = count < kPiece ? count / kBlock * kBlock : kPiece;
-    const uint8_t* piece = run.in;
-    if (!page.ascii_bytes || count + kBlock > static_cast<size_t>(run.in_end - run.in)) {
+    auto left = static_cast<size_t>(run.in_end - run.in);
+    auto room = static_cast<size_t>(run.out_end - run.out);
+    size_t count = std::min({left, room, kPiece}) / kBlock * kBlock;
+    if (count == 0) return;
+    if (page.ascii_bytes) {
+      std::memcpy(ascii, run.in, count);
+    } else {
       map_bytes_blocks(page.ascii_of_byte, run.in, count, ascii);
-      store_block(ascii + count, _mm256_setzero_si256());
-      piece = ascii;
     }
-    if (!piece_to_utf8(page, piece, count, run)) return;
+    std::memset(ascii + count, 0, kBlock);
+    uint8_t* end = text;
+    size_t done = piece_to_utf8(page, ascii, run.in, count, text, end);
+    auto size = static_cast<size_t>(end - text);
+    if (size > room) return;
+    std::memcpy(run.out, text, size);
+    run.in += done;
+    run.out += size;
+    if (done < count) return;
   }
 }
 
@@ -217,30 +224,56 @@ inline const uint8_t* sequence_from_utf8(const CodePage& page, const uint8_t* in
   return in + length;
 }
 
-__attribute__((target("avx2"))) void from_utf8_blocks(const CodePage& page, Run<uint8_t, uint8_t>& run) {
-  VectorTable vectors;
-  load_rows(vectors, page.byte_of_latin1, 8);
+// Carries a piece as far as it goes; false: the caller has to look at what comes next.
+__attribute__((target("avx2"))) bool piece_from_utf8(const CodePage& page, const VectorTable& vectors,
+                                                     Run<uint8_t, uint8_t>& run) {
   __m256i below = _mm256_set1_epi8(static_cast<char>(page.ascii_from - 1));
   const uint8_t* in = run.in;
   uint8_t* out = run.out;
-  while (static_cast<size_t>(run.in_end - in) >= kBlock && static_cast<size_t>(run.out_end - out) >= kBlock) {
+  while (static_cast<size_t>(run.in_end - in) >= kBlock && out < run.out_end) {
     __m256i block = load_block(in);
     auto others = ~static_cast<unsigned>(_mm256_movemask_epi8(_mm256_cmpgt_epi8(block, below)));
     store_block(out, page.ascii_bytes ? block : look_up<8>(vectors, block));
     size_t plain = others == 0 ? kBlock : static_cast<size_t>(__builtin_ctz(others));
     in += plain;
     out += plain;
-    while (run.in_end - in >= 3 && out != run.out_end && *in >= 0x80) {
-      const uint8_t* next = sequence_from_utf8(page, in, out);
+    if (plain == kBlock) continue;
+    const uint8_t* next = in;
+    while (run.in_end - in >= 3 && out < run.out_end && *in >= 0x80) {
+      next = sequence_from_utf8(page, in, out);
       if (next == nullptr) break;
       in = next;
       ++out;
     }
-    if (plain == 0 && *in >= 0x80) break;
-    if (in != run.in_end && *in < page.ascii_from) break;
+    if (next == nullptr || *in < page.ascii_from) {
+      run.in = in;
+      run.out = out;
+      return false;
+    }
   }
   run.in = in;
   run.out = out;
+  return true;
+}
+
+__attribute__((target("avx2"))) void from_utf8_blocks(const CodePage& page, Run<uint8_t, uint8_t>& run) {
+  VectorTable vectors;
+  load_rows(vectors, page.byte_of_latin1, 8);
+  uint8_t text[kPiece + kBlock];
+  for (;;) {
+    auto left = static_cast<size_t>(run.in_end - run.in);
+    auto room = static_cast<size_t>(run.out_end - run.out);
+    // So much of the input that its text fits.
+    size_t count = std::min({left, room, kPiece});
+    if (count < kBlock) return;
+    Run<uint8_t, uint8_t> piece = {run.in, run.in + count, text, text + kPiece};
+    bool more = piece_from_utf8(page, vectors, piece);
+    auto size = static_cast<size_t>(piece.out - text);
+    std::memcpy(run.out, text, size);
+    run.in = piece.in;
+    run.out += size;
+    if (!more || size == 0) return;
+  }
 }
 
 // Whole blocks of a piece that both sides have room for.
@@ -293,6 +326,7 @@ __attribute__((target("avx2"))) void from_ucs2_blocks(const CodePage& page, Run<
 
 // Below this the plain loops are as quick as loading the rows.
 constexpr size_t kWorthwhile = 64;
+constexpr size_t kWorthPieces = 192;
 
 #define LX_BLOCKS(call) (count >= kWorthwhile && has_avx2() ? (call) : 0)
 #define LX_RUN_BLOCKS(least, call) \
@@ -338,11 +372,11 @@ void map_bytes(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* o
 }
 
 void carry_to_utf8([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint8_t>& run) {
-  LX_RUN_BLOCKS(kWorthwhile, to_utf8_blocks(page, run));
+  LX_RUN_BLOCKS(kWorthPieces, to_utf8_blocks(page, run));
 }
 
 void carry_from_utf8([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint8_t>& run) {
-  LX_RUN_BLOCKS(kWorthwhile, from_utf8_blocks(page, run));
+  LX_RUN_BLOCKS(kWorthPieces, from_utf8_blocks(page, run));
 }
 
 void carry_to_ucs2([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint16_t>& run) {

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // Readers take text apart into characters, one kind of text each. A reader is a small value; a copy is a bookmark.
 //
+//   place(), return_to() a smaller bookmark, for a step that may have to be taken back
 //   done()               nothing left
 //   next(character)      the next character as UCS-2, or why there is none
 //   next_packed(value)   the next character as it is, packed
@@ -45,6 +46,8 @@ struct ByteReader {
   size_t left() const { return static_cast<size_t>(end - at); }
   void skip(size_t length) { at += length; }
   bool turn() { return false; }
+  const uint8_t* place() const { return at; }
+  void return_to(const uint8_t* place) { at = place; }
   // The character of `length` bytes that begins here, when it is all there.
   bool take(size_t length) {
     if (left() < length) return false;
@@ -120,7 +123,7 @@ struct MultibyteReader : ByteReader {
     value = pack(start, length);
     return Got::character;
   }
-  size_t fast_characters() const { return left() / kMaxCharacterLength; }
+  size_t fast_characters() const { return page->max_length == 2 ? left() / 2 : left() / kMaxCharacterLength; }
   size_t peek(uint16_t& character) const {
     unsigned row = lead_[*at];
     if (row < CodePage::kOtherLength) {
@@ -212,7 +215,8 @@ struct Utf8Reader : ByteReader {
     value = pack(start, length);
     return Got::character;
   }
-  size_t fast_characters() const { return page->standard_utf8 ? left() / 4 : 0; }
+  // No character takes more than three bytes, but peek looks at four.
+  size_t fast_characters() const { return page->standard_utf8 && !done() ? (left() - 1) / 3 : 0; }
   size_t peek(uint16_t& character) const {
     uint32_t four = load_four(at);
     if ((four & 0x80) == 0) {
@@ -267,6 +271,19 @@ struct ShiftedReader : ByteReader {
         enter_(code_page.enter_byte),
         leave_(code_page.leave_byte) {}
 
+  struct Place {
+    const uint8_t* at;
+    bool double_byte;
+    bool past_shift;
+  };
+  Place place() const { return {at, double_byte, past_shift}; }
+  void return_to(const Place& place) {
+    at = place.at;
+    double_byte = place.double_byte;
+    past_shift = place.past_shift;
+    odd_shift = nullptr;
+  }
+
   bool at_shift() const { return *at == page->enter_byte || *at == page->leave_byte; }
   size_t length_here() const { return double_byte ? page->max_length : size_t{1}; }
   uint16_t decode() const {
@@ -287,7 +304,11 @@ struct ShiftedReader : ByteReader {
     value = pack(start, static_cast<size_t>(at - start));
     return got;
   }
-  size_t fast_characters() const { return past_shift ? 0 : left() / (kMaxCharacterLength + 1); }
+  // Shift bytes are steps of their own, which look at the byte behind them.
+  size_t fast_characters() const {
+    if (past_shift) return 0;
+    return page->max_length == 2 ? left() / 2 : left() / kMaxCharacterLength;
+  }
   size_t peek(uint16_t& character) const {
     if (double_byte) {
       unsigned row = lead_[*at];
@@ -372,6 +393,8 @@ struct WideReader {
   }
   void skip(size_t length) { at += length; }
   bool turn() { return false; }
+  const uint32_t* place() const { return at; }
+  void return_to(const uint32_t* place) { at = place; }
 
   static uint16_t unicode_of_packed(const CodePage& page, uint32_t value) {
     if (value <= 0xFF) return page.to_unicode[value];
@@ -403,6 +426,8 @@ struct Ucs2Reader {
   }
   void skip(size_t length) { at += length; }
   bool turn() { return false; }
+  const uint16_t* place() const { return at; }
+  void return_to(const uint16_t* place) { at = place; }
 };
 
 }  // namespace lx

@@ -58,6 +58,8 @@ struct UnitWriter {
 
   UnitWriter(U* out, size_t room) : begin(out), at(out), end(out + room) {}
   size_t room() const { return static_cast<size_t>(end - at); }
+  // Goes on where a copy of this writer has come to.
+  void advance_to(const UnitWriter& copy) { at = copy.at; }
 };
 
 struct SingleByteWriter : UnitWriter<uint8_t> {
@@ -145,6 +147,11 @@ struct ShiftedWriter : UnitWriter<uint8_t> {
         from(code_page),
         by_rule(code_page.kind == PageKind::utf8),
         double_byte(state != 0) {}
+  void advance_to(const ShiftedWriter& copy) {
+    at = copy.at;
+    double_byte = copy.double_byte;
+    run = copy.run;
+  }
   uint32_t code(uint16_t character) const { return by_rule ? utf8_packed(character) : from.packed(character); }
   bool stands_in(uint32_t code, uint16_t character) const { return !by_rule && from.stands_in(code, character); }
   bool doubtful(uint32_t code) const { return code == from.substitution; }

@@ -23,31 +23,26 @@ struct Peer {
 };
 
 const Peer kPeers[] = {
-    {37, "IBM037"},          {273, "IBM273"},         {277, "IBM277"},         {278, "IBM278"},
-    {280, "IBM280"},         {284, "IBM284"},         {285, "IBM285"},         {290, "IBM290"},
-    {297, "IBM297"},         {367, "US-ASCII"},       {420, "IBM420"},         {424, "IBM424"},
-    {437, "IBM437"},         {500, "IBM500"},         {737, "CP737"},          {775, "CP775"},
-    {813, "ISO-8859-7"},     {819, "ISO-8859-1"},     {850, "IBM850"},         {852, "IBM852"},
-    {855, "IBM855"},         {857, "IBM857"},         {858, "IBM858"},         {860, "IBM860"},
-    {861, "IBM861"},         {862, "IBM862"},         {863, "IBM863"},         {864, "IBM864"},
-    {865, "IBM865"},         {866, "IBM866"},         {869, "IBM869"},         {870, "IBM870"},
-    {871, "IBM871"},         {874, "CP874"},          {875, "IBM875"},         {878, "KOI8-R"},
-    {912, "ISO-8859-2"},     {913, "ISO-8859-3"},     {915, "ISO-8859-5"},     {916, "ISO-8859-8"},
-    {919, "ISO-8859-10"},    {920, "ISO-8859-9"},     {921, "ISO-8859-13"},    {923, "ISO-8859-15"},
-    {930, "IBM930"},         {932, "CP932"},          {933, "IBM933"},         {935, "IBM935"},
-    {936, "CP936"},          {937, "IBM937"},         {939, "IBM939"},         {949, "CP949"},
-    {950, "CP950"},          {954, "EUC-JP"},         {964, "EUC-TW"},         {970, "EUC-KR"},
-    {1025, "IBM1025"},       {1026, "IBM1026"},       {1047, "IBM1047"},       {1089, "ISO-8859-6"},
-    {1112, "IBM1112"},       {1122, "IBM1122"},       {1140, "IBM1140"},       {1141, "IBM1141"},
-    {1142, "IBM1142"},       {1143, "IBM1143"},       {1144, "IBM1144"},       {1145, "IBM1145"},
-    {1146, "IBM1146"},       {1147, "IBM1147"},       {1148, "IBM1148"},       {1149, "IBM1149"},
-    {1153, "IBM1153"},       {1154, "IBM1154"},       {1155, "IBM1155"},       {1156, "IBM1156"},
-    {1157, "IBM1157"},       {1160, "IBM1160"},       {1168, "KOI8-U"},        {1250, "CP1250"},
-    {1251, "CP1251"},        {1252, "CP1252"},        {1253, "CP1253"},        {1254, "CP1254"},
-    {1255, "CP1255"},        {1256, "CP1256"},        {1257, "CP1257"},        {1258, "CP1258"},
-    {1364, "IBM1364"},       {1371, "IBM1371"},       {1383, "EUC-CN"},        {1388, "IBM1388"},
-    {1390, "IBM1390"},       {1399, "IBM1399"},       {57346, "ISO-8859-4"},   {57352, "UTF-8"},
-    {57371, "ISO-8859-11"},  {57374, "ISO-8859-14"},  {57376, "ISO-8859-16"},
+    {37, "IBM037"},       {273, "IBM273"},        {277, "IBM277"},        {278, "IBM278"},        {280, "IBM280"},
+    {284, "IBM284"},      {285, "IBM285"},        {290, "IBM290"},        {297, "IBM297"},        {367, "US-ASCII"},
+    {420, "IBM420"},      {424, "IBM424"},        {437, "IBM437"},        {500, "IBM500"},        {737, "CP737"},
+    {775, "CP775"},       {813, "ISO-8859-7"},    {819, "ISO-8859-1"},    {850, "IBM850"},        {852, "IBM852"},
+    {855, "IBM855"},      {857, "IBM857"},        {858, "IBM858"},        {860, "IBM860"},        {861, "IBM861"},
+    {862, "IBM862"},      {863, "IBM863"},        {864, "IBM864"},        {865, "IBM865"},        {866, "IBM866"},
+    {869, "IBM869"},      {870, "IBM870"},        {871, "IBM871"},        {874, "CP874"},         {875, "IBM875"},
+    {878, "KOI8-R"},      {912, "ISO-8859-2"},    {913, "ISO-8859-3"},    {915, "ISO-8859-5"},    {916, "ISO-8859-8"},
+    {919, "ISO-8859-10"}, {920, "ISO-8859-9"},    {921, "ISO-8859-13"},   {923, "ISO-8859-15"},   {930, "IBM930"},
+    {932, "CP932"},       {933, "IBM933"},        {935, "IBM935"},        {936, "CP936"},         {937, "IBM937"},
+    {939, "IBM939"},      {949, "CP949"},         {950, "CP950"},         {954, "EUC-JP"},        {964, "EUC-TW"},
+    {970, "EUC-KR"},      {1025, "IBM1025"},      {1026, "IBM1026"},      {1047, "IBM1047"},      {1089, "ISO-8859-6"},
+    {1112, "IBM1112"},    {1122, "IBM1122"},      {1140, "IBM1140"},      {1141, "IBM1141"},      {1142, "IBM1142"},
+    {1143, "IBM1143"},    {1144, "IBM1144"},      {1145, "IBM1145"},      {1146, "IBM1146"},      {1147, "IBM1147"},
+    {1148, "IBM1148"},    {1149, "IBM1149"},      {1153, "IBM1153"},      {1154, "IBM1154"},      {1155, "IBM1155"},
+    {1156, "IBM1156"},    {1157, "IBM1157"},      {1160, "IBM1160"},      {1168, "KOI8-U"},       {1250, "CP1250"},
+    {1251, "CP1251"},     {1252, "CP1252"},       {1253, "CP1253"},       {1254, "CP1254"},       {1255, "CP1255"},
+    {1256, "CP1256"},     {1257, "CP1257"},       {1258, "CP1258"},       {1364, "IBM1364"},      {1371, "IBM1371"},
+    {1383, "EUC-CN"},     {1388, "IBM1388"},      {1390, "IBM1390"},      {1399, "IBM1399"},      {57346, "ISO-8859-4"},
+    {57352, "UTF-8"},     {57371, "ISO-8859-11"}, {57374, "ISO-8859-14"}, {57376, "ISO-8859-16"},
 };
 
 std::string unicode_text(uint32_t value) {
@@ -234,7 +229,8 @@ class BesideIconv {
   }
   std::string their_unicode(const std::string& bytes) {
     bool shift = page_.mixed() && bytes.size() == 2;
-    auto result = decode_.convert(shift ? static_cast<char>(page_.enter) + bytes + static_cast<char>(page_.leave) : bytes);
+    auto result =
+        decode_.convert(shift ? static_cast<char>(page_.enter) + bytes + static_cast<char>(page_.leave) : bytes);
     if (!result || result->size() != 2) return "-";
     return unicode_text(static_cast<uint8_t>((*result)[1]) * 256u + static_cast<uint8_t>((*result)[0]));
   }
@@ -242,8 +238,7 @@ class BesideIconv {
     char out[4];
     auto count = static_cast<size_t>(LXCpUnicodeToChar(record_, static_cast<LXUChar>(unicode), out));
     std::string bytes(out, count);
-    bool stands_in = count == 1 && static_cast<uint8_t>(out[0]) == page_.substitution &&
-                     page_.decode(bytes) != unicode;
+    bool stands_in = count == 1 && static_cast<uint8_t>(out[0]) == page_.substitution && page_.decode(bytes) != unicode;
     return stands_in ? "-" : hex(bytes);
   }
   std::string their_bytes(uint32_t unicode) {

@@ -132,7 +132,8 @@ TEST_P(Mapping, LongSequencesToUnicode) {
     sequence.copy(whole, sizeof whole);
     uint16_t unicode = page.decode(sequence);
     LXWChar value = packed(sequence);
-    wrong.expect(LXCpMbToUnicode(record, whole) == unicode, [&] { return hex(sequence) + " is not " + number(unicode); });
+    wrong.expect(LXCpMbToUnicode(record, whole) == unicode,
+                 [&] { return hex(sequence) + " is not " + number(unicode); });
     bool zero_inside = sequence.find('\0') < sequence.size() - 1;
     if (!zero_inside) {
       wrong.expect(LXCpMbToUnicodeW(record, value) == unicode, [&] { return "W of " + hex(sequence); });
@@ -150,8 +151,8 @@ TEST_P(Mapping, LongSequencesToUnicode) {
     char out[4];
     bool right = LXWToMb(out, value) == written.size() && std::string_view(out, written.size()) == written;
     wrong.expect(right, [&] { return "LXWToMb of " + hex(sequence); });
-    bool shift = page.mixed() && (sequence[0] == static_cast<char>(page.enter) ||
-                                  sequence[0] == static_cast<char>(page.leave));
+    bool shift =
+        page.mixed() && (sequence[0] == static_cast<char>(page.enter) || sequence[0] == static_cast<char>(page.leave));
     if (shift) continue;
     text += sequence;
     expected.push_back(unicode);
@@ -159,9 +160,8 @@ TEST_P(Mapping, LongSequencesToUnicode) {
   std::vector<LXUChar> converted(expected.size() + 1, 0xABCD);
   auto length = static_cast<int32_t>(text.size());
   auto room = static_cast<int32_t>(converted.size());
-  int32_t count = page.mixed()
-                      ? LXStringToUnicodeEx(locale.get(), converted.data(), room, text.data(), 1, length, 0)
-                      : LXStringToUnicode(locale.get(), converted.data(), room, text.data(), length, 0);
+  int32_t count = page.mixed() ? LXStringToUnicodeEx(locale.get(), converted.data(), room, text.data(), 1, length, 0)
+                               : LXStringToUnicode(locale.get(), converted.data(), room, text.data(), length, 0);
   ASSERT_EQ(static_cast<size_t>(count), expected.size());
   for (size_t i = 0; i < expected.size(); ++i) {
     wrong.expect(converted[i] == expected[i],
@@ -211,7 +211,8 @@ std::string page_name(const testing::TestParamInfo<std::string>& info) {
 
 INSTANTIATE_TEST_SUITE_P(CodePages, Mapping, testing::ValuesIn(PageSource::all_files()), page_name);
 
-// ---- Types, case and widths of multibyte characters -------------------------------------------------------------------
+// ---- Types, case and widths of multibyte characters
+// -------------------------------------------------------------------
 
 class Characters : public Mapping {
  protected:

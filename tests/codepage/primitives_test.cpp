@@ -34,8 +34,8 @@ TEST_F(Primitives, ZeroMiddleBytesAreNotUnpacked) {
     LXWChar packed;
     const char* bytes;
   } cases[] = {
-      {0x00000000, "00"},     {0x00000041, "41"},     {0x00004100, "4100"},     {0x00410041, "4141"},
-      {0x00410000, "4100"},   {0x41000041, "4141"},   {0x41004100, "414100"},   {0x41410000, "414100"},
+      {0x00000000, "00"},       {0x00000041, "41"},   {0x00004100, "4100"},   {0x00410041, "4141"},
+      {0x00410000, "4100"},     {0x41000041, "4141"}, {0x41004100, "414100"}, {0x41410000, "414100"},
       {0x8EA2A1A1, "8EA2A1A1"}, {0xFF000000, "FF00"}, {0x00FFFFFF, "FFFFFF"}, {0x01000000, "0100"},
   };
   for (const auto& c : cases) {
@@ -51,15 +51,15 @@ TEST_F(Primitives, Utf8IsDecodedByRuleAlone) {
     std::string bytes;
     int32_t unicode;
   } cases[] = {
-      {"\x41\x42", 0x42},                // no one-byte case
-      {std::string("\x00\x00", 2), 0},   // whatever the lead byte
-      {"\xC0\xAF", 0x2F},                // overlong
+      {"\x41\x42", 0x42},               // no one-byte case
+      {std::string("\x00\x00", 2), 0},  // whatever the lead byte
+      {"\xC0\xAF", 0x2F},               // overlong
       {"\x80\x80", 0},
-      {"\xDF\x41", 0x7C1},               // continuation bytes are not looked at
+      {"\xDF\x41", 0x7C1},  // continuation bytes are not looked at
       {"\xE0\x41\x42", 0x42},
       {"\xED\xA0\x80", 0xD800},
       {"\xEF\xBF\xBF", 0xFFFF},
-      {"\xF1\x80\x80", 0x1000},          // from E0 on three bytes
+      {"\xF1\x80\x80", 0x1000},  // from E0 on three bytes
       {"\xFF\xBF\xBF", 0xFFFF},
   };
   for (const auto& c : cases) {
@@ -89,7 +89,8 @@ TEST_F(Primitives, ByteThatBeginsNothingPacksToNothing) {
 }
 
 TEST_F(Primitives, CharactersThatAPageLacks) {
-  for (auto [name, substitution] : {std::pair("US-ASCII", 0x1A), {"IBM037", 0x3F}, {"IBM930", 0x3F}, {"EUC-TW", 0x1A}}) {
+  for (auto [name, substitution] :
+       {std::pair("US-ASCII", 0x1A), {"IBM037", 0x3F}, {"IBM930", 0x3F}, {"EUC-TW", 0x1A}}) {
     const LXObjEntry* record = page(name);
     Guarded out(1);
     EXPECT_EQ(LXCpUnicodeToChar(record, 0xFFFD, out.data()), 1) << name;
@@ -98,7 +99,8 @@ TEST_F(Primitives, CharactersThatAPageLacks) {
   }
 }
 
-// ---- Changed objects ----------------------------------------------------------------------------------------------------
+// ---- Changed objects
+// ----------------------------------------------------------------------------------------------------
 
 // A data directory of its own, gone with the object.
 class DataDirectory {
@@ -213,7 +215,8 @@ TEST_F(Primitives, SingleByteHalfWins) {
   EXPECT_EQ(LXCpFullToHalfW(manager.page(954), full), LXWChar{'Q'});
 }
 
-// ---- The older layout ---------------------------------------------------------------------------------------------------
+// ---- The older layout
+// ---------------------------------------------------------------------------------------------------
 
 class OlderLayout : public Primitives {
  protected:
@@ -290,7 +293,7 @@ struct Moved {
   size_t to;
   size_t size;
 };
-constexpr Moved kFixedPart[] = {{0, 0, 8},        {8, 10, 256},      {264, 266, 512},    {776, 778, 512},
+constexpr Moved kFixedPart[] = {{0, 0, 8},          {8, 10, 256},       {264, 266, 512}, {776, 778, 512},
                                 {1288, 1292, 1024}, {2312, 2316, 2048}, {4360, 4364, 2}};
 
 // Tables hang off the fixed part here; it has grown by four bytes.

@@ -122,6 +122,7 @@ TEST_F(LoadingTest, FileThatIsBroken) {
       {"shift bytes alike", LX_CODEPAGE, with1(mixed, 9, 0x0E), LX_E_HEADER},
       {"older layout too small", LX_CODEPAGE, with(with(old_single, 10, 0x11), 11, 0x09), LX_E_HEADER},
       {"older layout, table before the variable part", LX_CODEPAGE, with1(old, 4364, 0), LX_E_HEADER},
+      {"older layout without types", LX_CODEPAGE, with1(with1(old, 4366, 0), 4367, 0), LX_OK},
       {"older layout, odd array offset", LX_CODEPAGE, with1(old, 4371, 85), LX_E_HEADER},
       {"older layout, array offset", LX_CODEPAGE, with1(old, 4370, 0xF0), LX_E_HEADER},
       {"unknown layout is read as the current one", LX_CODEPAGE, with(single, 4, 0x70), LX_OK},
@@ -282,6 +283,29 @@ TEST(OlderLayout, ShiftBytes) {
   EXPECT_EQ(info.shift_sensitive, 1);
   EXPECT_EQ(info.enter_byte, 0x0E);
   EXPECT_EQ(info.leave_byte, 0x0F);
+}
+
+// Called directly, it believes the sizes that it is given, and no table of the page.
+TEST(OlderLayout, SectionsThatAreTooSmall) {
+  const Bytes file = multibyte_page_file(true);
+  size_t whole1 = size_t{file[10]} << 8 | file[11];
+  size_t whole2 = size_t{file[16]} << 8 | file[17];
+  for (size_t size1 = 0; size1 <= whole1; size1 += size1 < 4360 ? 109 : 1) {
+    for (size_t size2 : {size_t{0}, size_t{83}, size_t{84}, whole2}) {
+      const Bytes section1(file.begin() + 76, file.begin() + 76 + static_cast<long>(size1));
+      const Bytes section2(file.begin() + 76 + static_cast<long>(whole1),
+                           file.begin() + 76 + static_cast<long>(whole1 + size2));
+      uint8_t* made2 = nullptr;
+      uint8_t* made1 = LXCpV1toV2(section1.data(), static_cast<uint16_t>(size1), section2.data(),
+                                  static_cast<uint16_t>(size2), &made2);
+      EXPECT_TRUE(made1 != nullptr || made2 == nullptr);
+      if (size1 < 4372) {
+        EXPECT_EQ(made1, nullptr) << size1;
+      }
+      LXUnloadFile(made1);
+      LXUnloadFile(made2);
+    }
+  }
 }
 
 TEST(OlderLayout, ConvertedSectionsAreFreed) {

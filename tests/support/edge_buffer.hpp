@@ -13,12 +13,11 @@ class EdgeBuffer {
  public:
   explicit EdgeBuffer(size_t size) : block_(size) {}
 
-  // Room for `size` bytes, filled with a mark.
   template <class Unit = char>
   Unit* room(size_t count) {
     size_t size = count * sizeof(Unit);
     char* at = block_.data() + block_.size() - size;
-    std::memset(at, kMark, size);
+    std::memset(at, '\x5A', size);
     return reinterpret_cast<Unit*>(at);
   }
   const char* text(std::string_view bytes) {
@@ -26,7 +25,6 @@ class EdgeBuffer {
     if (!bytes.empty()) std::memcpy(at, bytes.data(), bytes.size());
     return at;
   }
-  static constexpr char kMark = '\x5A';
 
  private:
   Guarded block_;

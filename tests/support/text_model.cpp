@@ -36,8 +36,8 @@ Parsed parse_bytes(const Form& form, const Units& text) {
       inside = text[at] == page.enter;
       if (++at == text.size()) break;
     }
-    size_t length = form.follows_shifts() ? (inside ? page.max_length : 1u)
-                                          : page.length_of(static_cast<uint8_t>(text[at]));
+    size_t length =
+        form.follows_shifts() ? (inside ? page.max_length : 1u) : page.length_of(static_cast<uint8_t>(text[at]));
     if (length > text.size() - at) {
       parsed.complete = false;
       break;
@@ -241,11 +241,14 @@ uint32_t BufferModel::convert(std::string& out, size_t room, std::string_view& i
       in.remove_prefix(missing);
     } else {
       if (in.empty()) return 0;
-      if (source_.mixed() && is_shift(source_, static_cast<uint8_t>(in[0]))) {
+      // One shift byte before a character, also when the text is cut behind it.
+      if (source_.mixed() && !past_shift_ && is_shift(source_, static_cast<uint8_t>(in[0]))) {
         source_inside_ = static_cast<uint8_t>(in[0]) == source_.enter;
         in.remove_prefix(1);
+        past_shift_ = true;
         if (in.empty()) return 0;
       }
+      past_shift_ = false;
       size_t length = length_of(in[0]);
       if (in.size() < length) {
         held_ = in;

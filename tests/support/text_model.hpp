@@ -77,7 +77,9 @@ class BufferModel {
   std::string held_;
   std::string pending_;
   bool source_inside_ = false;
+  bool behind_shift_ = false;  // which was the last byte; the next is text
   bool target_inside_ = false;
+  bool past_shift_ = false;
 };
 
 }  // namespace lx::test
