@@ -8,6 +8,7 @@
 #include <type_traits>
 
 #include "codepage/text/text_kinds.hpp"
+#include "codepage/text/vector_runs.hpp"
 
 namespace lx {
 
@@ -122,6 +123,16 @@ bool carry_mapped(In&, Out&, const Watch&) {
 
 // ---- Single characters ----
 
+// Whether the processor takes the text apart in blocks.
+template <class In>
+bool in_blocks(const In& in) {
+  if constexpr (std::same_as<In, Utf8Reader>) {
+    return in.page->standard_utf8 && has_table_vectors();
+  } else {
+    return false;
+  }
+}
+
 // Copies ASCII word by word where it is the same on both sides.
 template <class In, class Out>
 void copy_words(In& in, Out& out) {
@@ -145,7 +156,7 @@ bool carry_fast(In& given_in, Out& given_out, const Watch&) {
   bool ascii = false;
   bool copies = false;
   if constexpr (BytesToBytes<In, Out>) {
-    copies = ascii_form(in).way == AsciiForm::itself && ascii_form(out).way == AsciiForm::itself;
+    copies = !in_blocks(in) && ascii_form(in).way == AsciiForm::itself && ascii_form(out).way == AsciiForm::itself;
   }
   while (size_t count = std::min(in.fast_characters(), out.fast_characters())) {
     for (; count != 0; --count) {
@@ -177,6 +188,31 @@ end:
   given_in.return_to(in.place());
   given_out.advance_to(out);
   return ascii;
+}
+
+// Carries blocks of characters, as far as a watch need not see them.
+template <class In, class Out, class Watch>
+void carry_blocks(In& in, Out& given_out, const Watch&) {
+  if constexpr (std::same_as<In, Utf8Reader>) {
+    if (in.left() < kWorthVectors || !in_blocks(in)) return;
+    Out out = given_out;
+    Utf8Block block;
+    while (out.fast_characters() >= Utf8Block::kMost && !in.ascii_ahead()) {
+      decode_utf8(in.at, in.left(), block);
+      size_t count = 0;
+      for (; count < block.count; ++count) {
+        uint32_t code = out.code(block.characters[count]);
+        if constexpr (Watch::kWatching) {
+          if (out.doubtful(code)) [[unlikely]]
+            break;
+        }
+        out.put(code);
+      }
+      in.at += count == block.count ? block.length : utf8_length(block.characters, count);
+      if (count != Utf8Block::kMost) break;
+    }
+    given_out.advance_to(out);
+  }
 }
 
 // Carries one character, however long it takes.
@@ -218,6 +254,7 @@ Stop transcode(In& in, Out& out, Watch& watch) {
     if (!watch.each_character() && !carry_mapped(in, out, watch)) {
       do {
         carry_ascii(in, out);
+        carry_blocks(in, out, watch);
       } while (carry_fast(in, out, watch));
     }
     Stop stop = carry_one(in, out, watch);

@@ -63,21 +63,34 @@ LXObjEntry* look_up(uint8_t type, const Part<LXWChar>& part, uint32_t& rc) {
 
 // Code pages are known by their aliases too; object names come first.
 template <class Unit>
-LXObjEntry* look_up_code_page(const Part<Unit>& part, uint32_t& rc) {
-  LXObjEntry* entry = look_up(LX_CODEPAGE, part, rc);
+LXObjEntry* look_up_by_alias(const Part<Unit>& part, uint32_t& rc) {
   char alias[65];
-  if (rc != LX_E_NOTFOUND || part.length >= sizeof alias) return entry;
+  if (part.length >= sizeof alias) return nullptr;
   for (size_t i = 0; i < part.length; ++i) alias[i] = static_cast<char>(part.text[i] & 0xFF);
   alias[part.length] = '\0';
   const char* name = LXGetCodepageFromAlias(LXGetObjManager(), alias);
-  if (name == nullptr) return entry;
-  return LXGetObjFromName(LXGetObjManager(), LX_CODEPAGE, name, -1, 0, &rc);
+  return name != nullptr ? LXGetObjFromName(LXGetObjManager(), LX_CODEPAGE, name, -1, 0, &rc) : nullptr;
 }
 
 // What a failed lookup of a part means for the whole name.
 uint32_t failure_of(uint32_t rc, uint32_t not_found) {
   if (rc == LX_E_NOTFOUND) return not_found;
   return rc == LX_E_MEMORY ? LX_E_MEMORY : LX_E_MANAGER;
+}
+
+// The parts of a name: what they are called in messages, and the status when one is not found.
+struct PartKind {
+  uint8_t type;
+  const char* title;
+  uint32_t not_found;
+};
+constexpr PartKind kLanguagePart = {LX_LANGUAGE, "language", LX_E_LANGUAGE};
+constexpr PartKind kTerritoryPart = {LX_TERRITORY, "territory", LX_E_TERRITORY};
+constexpr PartKind kCodePagePart = {LX_CODEPAGE, "code page", LX_E_CODEPAGE};
+constexpr PartKind kSortPart = {LX_SORT, "sort", LX_E_SORT};
+
+auto by_id(uint8_t type, uint16_t id) {
+  return [=](uint32_t& rc) { return LXGetObjFromID(LXGetObjManager(), type, id, 0, &rc); };
 }
 
 class LocaleBuilder {
@@ -87,79 +100,44 @@ class LocaleBuilder {
   template <class Unit>
   uint32_t build(const Unit* name) {
     NameParts<Unit> parts(name);
-    uint32_t status = set_language(parts.language());
-    if (status == LX_OK) status = set_territory(parts.territory());
-    if (status == LX_OK) status = set_code_page(parts.code_page());
-    if (status == LX_OK) status = set_sort(parts.sort());
-    if (status == LX_OK) status = set_values();
-    return status;
+    auto english = [](uint32_t& rc) { return look_up(LX_LANGUAGE, Part<char>{kEnglish, sizeof kEnglish - 1}, rc); };
+    uint32_t status = find(kLanguagePart, parts.language(), locale_.language, english);
+    if (status != LX_OK) return status;
+
+    // The language has the defaults of the rest.
+    const LanguageHeader& language = language_of(*locale_.language);
+    status =
+        find(kTerritoryPart, parts.territory(), locale_.territory, by_id(LX_TERRITORY, language.default_territory));
+    if (status == LX_OK) {
+      status =
+          find(kCodePagePart, parts.code_page(), locale_.code_page, by_id(LX_CODEPAGE, language.default_code_page));
+    }
+    if (status == LX_OK) status = find(kSortPart, parts.sort(), locale_.sort, by_id(LX_SORT, language.default_sort));
+    return status == LX_OK ? set_values() : status;
   }
 
  private:
-  template <class Unit>
-  uint32_t set_language(const Part<Unit>& part) {
+  template <class Unit, class Default>
+  uint32_t find(const PartKind& kind, const Part<Unit>& part, LXObjEntry*& entry, Default find_default) {
     uint32_t rc = LX_E_NOTFOUND;
-    LXObjEntry* entry = part.empty() ? nullptr : look_up(LX_LANGUAGE, part, rc);
-    if (part.empty() || (rc == LX_E_NOTFOUND && substitute_)) {
-      entry = look_up(LX_LANGUAGE, Part<char>{kEnglish, sizeof kEnglish - 1}, rc);
-    }
-    locale_.language = entry;
-    if (entry != nullptr) return LX_OK;
-    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to locate language, rc = %d", static_cast<int>(rc));
-    return failure_of(rc, LX_E_LANGUAGE);
-  }
-
-  template <class Unit>
-  uint32_t set_territory(const Part<Unit>& part) {
-    uint32_t rc = LX_E_NOTFOUND;
-    LXObjEntry* entry = part.empty() ? nullptr : look_up(LX_TERRITORY, part, rc);
-    if (use_default(part.empty(), rc)) entry = by_id(LX_TERRITORY, language().default_territory, rc);
-    locale_.territory = entry;
-    if (entry != nullptr) return LX_OK;
-    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to locate territory, rc = %d", static_cast<int>(rc));
-    return failure_of(rc, LX_E_TERRITORY);
-  }
-
-  template <class Unit>
-  uint32_t set_code_page(const Part<Unit>& part) {
-    uint32_t rc = LX_E_NOTFOUND;
-    LXObjEntry* entry = part.empty() ? nullptr : look_up_code_page(part, rc);
-    if (use_default(part.empty(), rc)) entry = by_id(LX_CODEPAGE, language().default_code_page, rc);
-    locale_.code_page = entry;
-    if (entry != nullptr) {
-      note_code_page(locale_);
-      return LX_OK;
-    }
-    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to locate code page, rc = %d", static_cast<int>(rc));
-    return failure_of(rc, LX_E_CODEPAGE);
-  }
-
-  // No sort object without an error is the binary sort.
-  template <class Unit>
-  uint32_t set_sort(const Part<Unit>& part) {
-    uint32_t rc = LX_E_NOTFOUND;
-    LXObjEntry* entry = part.empty() ? nullptr : look_up(LX_SORT, part, rc);
-    if (use_default(part.empty(), rc)) entry = by_id(LX_SORT, language().default_sort, rc);
-    locale_.sort = entry;
-    if (entry == nullptr && rc == LX_OK) locale_.flags |= kLocaleBinarySort;
+    entry = part.empty() ? nullptr : look_up(kind.type, part, rc);
+    if (rc == LX_E_NOTFOUND && kind.type == LX_CODEPAGE && !part.empty()) entry = look_up_by_alias(part, rc);
+    if (part.empty() || (rc == LX_E_NOTFOUND && substitute_)) entry = find_default(rc);
+    // No sort object and no error either: that is the binary sort.
     if (entry != nullptr || rc == LX_OK) return LX_OK;
-    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to locate sort, rc = %d", static_cast<int>(rc));
-    return failure_of(rc, LX_E_SORT);
+    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to locate %s, rc = %d", kind.title, static_cast<int>(rc));
+    return failure_of(rc, kind.not_found);
   }
 
   uint32_t set_values() {
+    note_code_page(locale_);
+    if (locale_.sort == nullptr) locale_.flags |= kLocaleBinarySort;
     locale_.set_mask = 0;
     uint32_t status = LXLocaleSetModifiable(&locale_);
     if (status != LX_OK) {
       LX_TRACE(TRC1_LEVEL_ERROR, "Unable to set modifiable values, err = %d", static_cast<int>(status));
     }
     return status;
-  }
-
-  bool use_default(bool absent, uint32_t rc) const { return absent || (rc == LX_E_NOTFOUND && substitute_); }
-  const LanguageHeader& language() const { return language_of(*locale_.language); }
-  static LXObjEntry* by_id(uint8_t type, uint16_t id, uint32_t& rc) {
-    return LXGetObjFromID(LXGetObjManager(), type, id, 0, &rc);
   }
 
   LXLocale& locale_;

@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <cstring>
 
+#include "codepage/text/vector_runs.hpp"
+
 #if defined(__x86_64__)
 #include <immintrin.h>
 #define LX_AVX2 1
@@ -371,19 +373,32 @@ void map_bytes(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* o
   for (; done < count; ++done) out[done] = table[in[done]];
 }
 
-void carry_to_utf8([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint8_t>& run) {
+namespace {
+
+template <class In, class Out>
+bool worth_vectors(const Run<In, Out>& run) {
+  return static_cast<size_t>(run.in_end - run.in) >= kWorthVectors && has_table_vectors();
+}
+
+}  // namespace
+
+void carry_to_utf8(const CodePage& page, Run<uint8_t, uint8_t>& run) {
+  if (worth_vectors(run)) return to_utf8_vectors(page, run);
   LX_RUN_BLOCKS(kWorthPieces, to_utf8_blocks(page, run));
 }
 
-void carry_from_utf8([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint8_t>& run) {
+void carry_from_utf8(const CodePage& page, Run<uint8_t, uint8_t>& run) {
+  if (worth_vectors(run)) return from_utf8_vectors(page, run);
   LX_RUN_BLOCKS(kWorthPieces, from_utf8_blocks(page, run));
 }
 
-void carry_to_ucs2([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint8_t, uint16_t>& run) {
+void carry_to_ucs2(const CodePage& page, Run<uint8_t, uint16_t>& run) {
+  if (worth_vectors(run)) return to_ucs2_vectors(page, run);
   LX_RUN_BLOCKS(kBlock, to_ucs2_blocks(page, run));
 }
 
-void carry_from_ucs2([[maybe_unused]] const CodePage& page, [[maybe_unused]] Run<uint16_t, uint8_t>& run) {
+void carry_from_ucs2(const CodePage& page, Run<uint16_t, uint8_t>& run) {
+  if (worth_vectors(run)) return from_ucs2_vectors(page, run);
   LX_RUN_BLOCKS(kBlock, from_ucs2_blocks(page, run));
 }
 

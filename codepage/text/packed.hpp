@@ -27,4 +27,11 @@ inline size_t unpacked_length(uint32_t value) {
   return size_t{1} + (value > 0xFFFFFF) + ((value & 0xFF0000) != 0) + ((value & 0xFF00) != 0);
 }
 
+// Bytes of characters in UTF-8.
+inline size_t utf8_length(const uint16_t* characters, size_t count) {
+  size_t length = count;
+  for (size_t i = 0; i < count; ++i) length += (characters[i] > 0x7F) + (characters[i] > 0x7FF);
+  return length;
+}
+
 }  // namespace lx

@@ -100,9 +100,23 @@ struct SingleByteReader : ByteReader {
 };
 
 // The first byte tells the length.
-struct MultibyteReader : ByteReader {
+struct VariableLengthReader : ByteReader {
+  using ByteReader::ByteReader;
+
+  Got next_packed(uint32_t& value) {
+    if (done()) return Got::end;
+    size_t length = page->char_length[*at];
+    if (!take(length)) return Got::partial;
+    value = pack(start, length);
+    return Got::character;
+  }
+  bool ascii_ahead() const { return word_of_ascii(*this); }
+};
+
+// Such text converted by tables.
+struct MultibyteReader : VariableLengthReader {
   MultibyteReader(const CodePage& code_page, const uint8_t* text, size_t length)
-      : ByteReader(code_page, text, length),
+      : VariableLengthReader(code_page, text, length),
         lead_(code_page.lead),
         rows_(code_page.rows),
         one_byte_(code_page.to_unicode) {}
@@ -114,13 +128,6 @@ struct MultibyteReader : ByteReader {
       return next_strict(character, length);
     if (!take(length)) return Got::partial;
     character = length == 1 ? page->to_unicode[*start] : page->decode(start);
-    return Got::character;
-  }
-  Got next_packed(uint32_t& value) {
-    if (done()) return Got::end;
-    size_t length = page->char_length[*at];
-    if (!take(length)) return Got::partial;
-    value = pack(start, length);
     return Got::character;
   }
   size_t fast_characters() const { return page->max_length == 2 ? left() / 2 : left() / kMaxCharacterLength; }
@@ -137,7 +144,6 @@ struct MultibyteReader : ByteReader {
     character = page->decode(at);
     return page->char_length[*at];
   }
-  bool ascii_ahead() const { return word_of_ascii(*this); }
 
  private:
   // What is no character ends before the first byte that could not follow: a lead byte before a control character or
@@ -167,9 +173,9 @@ struct MultibyteReader : ByteReader {
   const uint16_t* one_byte_;
 };
 
-// Multibyte text converted by rule.
-struct Utf8Reader : ByteReader {
-  using ByteReader::ByteReader;
+// And by rule.
+struct Utf8Reader : VariableLengthReader {
+  using VariableLengthReader::VariableLengthReader;
 
   static uint16_t decode(const uint8_t* bytes) {
     if (bytes[0] < 0xE0) return static_cast<uint16_t>((bytes[0] & 0x1F) << 6 | (bytes[1] & 0x3F));
@@ -208,13 +214,6 @@ struct Utf8Reader : ByteReader {
     character = length == 1 ? page->to_unicode[*start] : decode(start);
     return Got::character;
   }
-  Got next_packed(uint32_t& value) {
-    if (done()) return Got::end;
-    size_t length = page->char_length[*at];
-    if (!take(length)) return Got::partial;
-    value = pack(start, length);
-    return Got::character;
-  }
   // No character takes more than three bytes, but peek looks at four.
   size_t fast_characters() const { return page->standard_utf8 && !done() ? (left() - 1) / 3 : 0; }
   size_t peek(uint16_t& character) const {
@@ -231,7 +230,6 @@ struct Utf8Reader : ByteReader {
     character = static_cast<uint16_t>((four & 0x1F) << 6 | (four >> 8 & 0x3F));
     return (four & 0xC0E0) == 0x80C0 && character >= 0x80 ? 2 : 0;
   }
-  bool ascii_ahead() const { return word_of_ascii(*this); }
 
  private:
   // Well-formed sequences beyond UCS-2 and the longest beginnings of broken ones are one U+FFFD each.

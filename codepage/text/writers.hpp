@@ -62,15 +62,20 @@ struct UnitWriter {
   void advance_to(const UnitWriter& copy) { at = copy.at; }
 };
 
-struct SingleByteWriter : UnitWriter<uint8_t> {
+// The codes of a page's characters.
+struct PageCodes {
   const CodePage* page;
   FromUnicode from;
 
-  SingleByteWriter(const CodePage& code_page, uint8_t* out, size_t size)
-      : UnitWriter(out, size), page(&code_page), from(code_page) {}
+  explicit PageCodes(const CodePage& code_page) : page(&code_page), from(code_page) {}
   uint32_t code(uint16_t character) const { return from.packed(character); }
   bool stands_in(uint32_t code, uint16_t character) const { return from.stands_in(code, character); }
   bool doubtful(uint32_t code) const { return code == from.substitution; }
+};
+
+struct SingleByteWriter : UnitWriter<uint8_t>, PageCodes {
+  SingleByteWriter(const CodePage& code_page, uint8_t* out, size_t size)
+      : UnitWriter(out, size), PageCodes(code_page) {}
   bool fits(uint32_t) const { return at != end; }
   void put(uint32_t code) { *at++ = static_cast<uint8_t>(code); }
   size_t fast_characters() const { return from.usual ? room() : 0; }
@@ -93,15 +98,9 @@ struct PackedWriter : UnitWriter<uint8_t> {
   size_t fast_characters() const { return room() / kMaxCharacterLength; }
 };
 
-struct MultibyteWriter : PackedWriter {
-  const CodePage* page;
-  FromUnicode from;
-
+struct MultibyteWriter : PackedWriter, PageCodes {
   MultibyteWriter(const CodePage& code_page, uint8_t* out, size_t size)
-      : PackedWriter(out, size), page(&code_page), from(code_page) {}
-  uint32_t code(uint16_t character) const { return from.packed(character); }
-  bool stands_in(uint32_t code, uint16_t character) const { return from.stands_in(code, character); }
-  bool doubtful(uint32_t code) const { return code == from.substitution; }
+      : PackedWriter(out, size), PageCodes(code_page) {}
   size_t fast_characters() const { return from.usual ? PackedWriter::fast_characters() : 0; }
 };
 
