@@ -151,6 +151,7 @@ void copy_words(In& in, Out& out) {
 // registers.
 template <class In, class Out, class Watch>
 bool carry_fast(In& given_in, Out& given_out, const Watch&) {
+  if (given_in.done()) return false;
   In in = given_in;
   Out out = given_out;
   bool ascii = false;
@@ -257,6 +258,7 @@ Stop transcode(In& in, Out& out, Watch& watch) {
         carry_blocks(in, out, watch);
       } while (carry_fast(in, out, watch));
     }
+    if (!In::kShifted && in.done()) return Stop::done;
     Stop stop = carry_one(in, out, watch);
     if (stop != Stop::none) return stop;
   }

@@ -65,6 +65,7 @@ struct LXObjMgr {
   uint8_t no_defaults;
   char directory[256];  // empty on built-in data
   lx::Alias* aliases;
+  char* alias_text;
 };
 
 struct LXLocale {

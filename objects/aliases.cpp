@@ -5,12 +5,10 @@
 
 #include <cstdio>
 #include <cstring>
-#include <string_view>
 
 #include "frame/call.hpp"
 #include "frame/data_file.hpp"
 #include "frame/environment.hpp"
-#include "frame/text_view.hpp"
 
 namespace lx {
 namespace {
@@ -21,98 +19,110 @@ constexpr char kAliasFile[] = "alias.txt";
 constexpr int32_t kAliasFileRoom = sizeof kAliasFile + 1;  // with its separator
 constexpr size_t kMaxLine = 32767;
 constexpr int kRecordSize = 104;  // what the message about a failed allocation has always said
-constexpr std::string_view kWhiteSpace = " \t\r\n";
 
-int printed(std::string_view text) { return static_cast<int>(text.size()); }
+constexpr bool is_white(char character) {
+  return character == ' ' || character == '\t' || character == '\r' || character == '\n';
+}
 
+// Reads the text in place: names are terminated and aliases turned to upper case where they stand.
 class AliasReader {
  public:
-  explicit AliasReader(LXObjMgr& manager) : tail_(&manager.aliases) {
-    while (*tail_ != nullptr) tail_ = &(*tail_)->next;
-  }
+  explicit AliasReader(LXObjMgr& manager) : tail_(&manager.aliases) {}
 
-  bool read(std::string_view text) {
-    while (!text.empty()) {
-      size_t end = text.find('\n');
-      std::string_view line = head(text, end);
-      if (line.size() > kMaxLine || line.find('\0') != line.npos || !read_line(line)) return false;
-      text = end == text.npos ? std::string_view() : tail(text, end + 1);
+  // `text` has room for one character more than `length`.
+  bool read(char* text, size_t length) {
+    char* end = text + length;
+    *end = '\n';
+    while (text < end) {
+      auto* line_end = static_cast<char*>(std::memchr(text, '\n', static_cast<size_t>(end - text) + 1));
+      auto line_length = static_cast<size_t>(line_end - text);
+      if (line_length > kMaxLine || std::memchr(text, '\0', line_length) != nullptr) return false;
+      if (!read_line(text, line_end)) return false;
+      text = line_end + 1;
     }
     return true;
   }
 
  private:
-  bool read_line(std::string_view line) {
-    if (line.empty() || line[0] == '#' || line.find_first_not_of(kWhiteSpace) == line.npos) return true;
-    bool continues = line[0] == ' ' || line[0] == '\t';
-    if (!continues) code_page_ = {};
-    std::string_view token = next_token(line);
-    if (code_page_.empty()) {
+  struct Token {
+    char* text;
+    size_t length;
+  };
+
+  bool read_line(char* at, char* end) {
+    if (at == end || *at == '#') return true;
+    bool continues = *at == ' ' || *at == '\t';
+    Token token = next_token(at, end);
+    if (token.length == 0) return true;
+    if (!continues) code_page_ = nullptr;
+    if (code_page_ == nullptr) {
       if (!begin_code_page(token, continues)) return false;
-      token = next_token(line);
+      token = next_token(at, end);
     }
-    for (; !token.empty(); token = next_token(line)) {
+    for (; token.length != 0; token = next_token(at, end)) {
       if (!add(token)) return false;
     }
     return true;
   }
 
-  static std::string_view next_token(std::string_view& line) {
-    line = tail(line, line.find_first_not_of(kWhiteSpace));
-    std::string_view token = head(line, line.find_first_of(kWhiteSpace));
-    line = tail(line, token.size());
-    return token;
+  // The character behind a token is white space or the end of the line, and becomes its terminator.
+  static Token next_token(char*& at, char* end) {
+    while (at < end && is_white(*at)) ++at;
+    char* begin = at;
+    while (at < end && !is_white(*at)) ++at;
+    auto length = static_cast<size_t>(at - begin);
+    if (length != 0) *at = '\0';
+    if (at < end) ++at;
+    return {begin, length};
   }
 
-  bool begin_code_page(std::string_view name, bool continues) {
+  bool begin_code_page(const Token& name, bool continues) {
     if (continues) {
-      LX_TRACE(TRC1_LEVEL_ERROR, "Codepage name %.*s does not start in column 1", printed(name), name.data());
+      LX_TRACE(TRC1_LEVEL_ERROR, "Codepage name %s does not start in column 1", name.text);
       return false;
     }
-    if (name.size() > kMaxCodePageName) {
-      LX_TRACE(TRC1_LEVEL_ERROR, "codepage name length (%d) for %.*s exceeds maximum of %d", printed(name),
-               printed(name), name.data(), kMaxCodePageName);
+    if (name.length > kMaxCodePageName) {
+      LX_TRACE(TRC1_LEVEL_ERROR, "codepage name length (%d) for %s exceeds maximum of %d",
+               static_cast<int>(name.length), name.text, kMaxCodePageName);
       return false;
     }
-    code_page_ = name;
-    LX_TRACE(TRC1_LEVEL_DETAIL, "Processing codepage '%.*s'", printed(name), name.data());
+    code_page_ = name.text;
+    LX_TRACE(TRC1_LEVEL_DETAIL, "Processing codepage '%s'", code_page_);
     return true;
   }
 
-  bool add(std::string_view alias) {
-    if (alias.size() > kMaxAlias) {
+  bool add(const Token& alias) {
+    if (alias.length > kMaxAlias) {
       // The message names the limit of code page names; tools that read it know it so.
-      LX_TRACE(TRC1_LEVEL_ERROR, "Alias name length (%d) for %.*s exceeds maximum of %d", printed(alias),
-               printed(alias), alias.data(), kMaxCodePageName);
+      LX_TRACE(TRC1_LEVEL_ERROR, "Alias name length (%d) for %s exceeds maximum of %d", static_cast<int>(alias.length),
+               alias.text, kMaxCodePageName);
       return false;
     }
-    auto record = Owned<Alias>::zeroed();
-    if (!record) {
-      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for codepage %.*s, alias %.*s", kRecordSize,
-               printed(code_page_), code_page_.data(), printed(alias), alias.data());
+    auto* record = static_cast<Alias*>(allocate(sizeof(Alias)));
+    if (record == nullptr) {
+      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for codepage %s, alias %s", kRecordSize, code_page_,
+               alias.text);
       return false;
     }
-    LX_TRACE(TRC1_LEVEL_DETAIL, "Processing alias '%.*s'", printed(alias), alias.data());
-    std::memcpy(record->code_page, code_page_.data(), code_page_.size());
-    for (size_t i = 0; i < alias.size(); ++i) {
-      record->alias[i] = alias[i] >= 'a' && alias[i] <= 'z' ? static_cast<char>(alias[i] - ('a' - 'A')) : alias[i];
+    LX_TRACE(TRC1_LEVEL_DETAIL, "Processing alias '%s'", alias.text);
+    for (size_t i = 0; i < alias.length; ++i) {
+      char character = alias.text[i];
+      if (character >= 'a' && character <= 'z') alias.text[i] = static_cast<char>(character - ('a' - 'A'));
     }
-    record->alias_length = static_cast<uint8_t>(alias.size());
-    LX_TRACE(TRC1_LEVEL_DETAIL, "Saved alias %s, length = %d", record->alias, printed(alias));
-    *tail_ = record.give_up();
-    tail_ = &(*tail_)->next;
+    *record = {nullptr, code_page_, alias.text, static_cast<uint8_t>(alias.length)};
+    LX_TRACE(TRC1_LEVEL_DETAIL, "Saved alias %s, length = %d", record->alias, static_cast<int>(alias.length));
+    *tail_ = record;
+    tail_ = &record->next;
     return true;
   }
 
   Alias** tail_;
-  std::string_view code_page_;
+  const char* code_page_ = nullptr;
 };
 
-// The whole text of the file; `failed` tells an empty file from one that cannot be read.
-Owned<char> load_text(const char* name, size_t& length, bool& failed) {
+// The text of the file, with room for one character more; null when it cannot be read whole.
+Owned<char> load_text(const char* name, size_t& length) {
   uint32_t rc = LX_OK;
-  length = 0;
-  failed = true;
   DataFile file(name, rc);
   if (!file) {
     LX_TRACE(TRC1_LEVEL_ERROR, "Open of %s failed, err = %d", name, static_cast<int>(rc));
@@ -120,9 +130,9 @@ Owned<char> load_text(const char* name, size_t& length, bool& failed) {
   }
   int32_t size = LXFileSize(file.get());
   if (size < 0) return {};
-  Owned<char> text(static_cast<char*>(LXLoadFile(file.get(), 0, static_cast<uint32_t>(size), &rc)));
-  length = text ? static_cast<size_t>(size) : 0;
-  failed = rc != LX_OK;
+  length = static_cast<size_t>(size);
+  auto text = Owned<char>::array(length + 1);
+  if (!text || LXReadFile(file.get(), text.get(), static_cast<uint32_t>(size), &rc) != length || rc != LX_OK) return {};
   return text;
 }
 
@@ -155,11 +165,12 @@ uint32_t LXBuildAliasList(LXObjMgr* manager) noexcept {
       LX_TRACE(TRC1_LEVEL_ERROR, "Unable to generate alias file name");
       return 1;
     }
+    LXDestroyAliasList(manager);
     size_t length = 0;
-    bool failed = false;
-    Owned<char> text = load_text(name, length, failed);
-    if (failed) return 1;
-    return AliasReader(*manager).read({text.get(), length}) ? 0 : 1;
+    Owned<char> text = load_text(name, length);
+    if (!text) return 1;
+    manager->alias_text = text.give_up();
+    return AliasReader(*manager).read(manager->alias_text, length) ? 0 : 1;
   });
 }
 
@@ -183,6 +194,7 @@ uint32_t LXDestroyAliasList(LXObjMgr* manager) noexcept {
     for (Alias* alias = std::exchange(manager->aliases, nullptr); alias != nullptr;) {
       release(std::exchange(alias, alias->next));
     }
+    Owned<char>(std::exchange(manager->alias_text, nullptr));
     return 0;
   });
 }

@@ -8,7 +8,6 @@
 
 namespace lx {
 
-inline constexpr uint16_t kUcs2Id = 1200;
 inline constexpr uint16_t kUtf8Id = 57352;
 inline constexpr uint16_t kUnassigned = 0xFFFD;    // to-Unicode value of bytes that are no character
 inline constexpr uint32_t kUnassignedType = 1024;  // character-type word of the same

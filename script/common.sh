@@ -10,7 +10,8 @@ fi
 
 say() { printf '\n== %s\n' "$*"; }
 
+# A preset, and of it a target instead of everything.
 build_preset() {
   say "Building preset $1"
-  cmake --preset "$1" --log-level=WARNING && cmake --build --preset "$1"
+  cmake --preset "$1" --log-level=WARNING && cmake --build --preset "$1" --target "${2:-all}"
 }

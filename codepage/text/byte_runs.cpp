@@ -12,6 +12,9 @@
 #endif
 
 namespace lx {
+
+Vectors allowed_vectors = Vectors::tables;
+
 namespace {
 
 constexpr uint64_t kHighBits = 0x8080808080808080u;
@@ -26,7 +29,7 @@ uint64_t load_word(const uint8_t* from) {
 
 constexpr size_t kBlock = 32;
 
-bool has_avx2() { return __builtin_cpu_supports("avx2") != 0; }
+bool has_avx2() { return allowed_vectors >= Vectors::blocks && __builtin_cpu_supports("avx2") != 0; }
 
 // A table lookup for 32 bytes. The table's rows of 16 are kept as differences from the row before: a shuffle takes from
 // every row up to the right one, and the differences add up to its value. Behind the right row the index is negative,
@@ -142,7 +145,7 @@ LX_AVX512 size_t map_bytes_avx512(const uint8_t* table, const uint8_t* in, size_
 
 size_t map_bytes_blocks(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
   static_assert(kBlock == 32);
-  if (__builtin_cpu_supports("avx512vbmi") && __builtin_cpu_supports("avx512vl")) {
+  if (has_table_vectors()) {
     return map_bytes_avx512(table, in, count, out);
   }
   return map_bytes_avx2(table, in, count, out);

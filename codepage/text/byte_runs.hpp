@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 // Runs of one-byte characters, many at a time. None of them writes more than it reports.
+// What the processor offers is found out at run time; every way gives the same text.
 #pragma once
 
 #include <cstddef>
@@ -8,6 +9,11 @@
 #include "objects/code_page.hpp"
 
 namespace lx {
+
+// The ways that are allowed: plain loops, vectors of 32 bytes, and those that look up bytes in tables. Tests go back to
+// the simpler ones, which their machine would never take.
+enum class Vectors : uint8_t { none, blocks, tables };
+extern Vectors allowed_vectors;
 
 // Copies up to `count` bytes and stops before the first that is not ASCII. Returns the number copied.
 size_t copy_ascii(const uint8_t* in, size_t count, uint8_t* out);

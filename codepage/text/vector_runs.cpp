@@ -119,8 +119,9 @@ LX_VECTOR inline size_t length_of(size_t characters, uint64_t ends) {
 }  // namespace
 
 bool has_table_vectors() {
-  return __builtin_cpu_supports("avx512vbmi2") != 0 && __builtin_cpu_supports("avx512vbmi") != 0 &&
-         __builtin_cpu_supports("avx512vl") != 0 && __builtin_cpu_supports("bmi2") != 0;
+  return allowed_vectors >= Vectors::tables && __builtin_cpu_supports("avx512vbmi2") != 0 &&
+         __builtin_cpu_supports("avx512vbmi") != 0 && __builtin_cpu_supports("avx512vl") != 0 &&
+         __builtin_cpu_supports("bmi2") != 0;
 }
 
 LX_VECTOR void to_ucs2_vectors(const CodePage& page, Run<uint8_t, uint16_t>& run) {

@@ -300,12 +300,12 @@ LX_API uint32_t LXCloseConversion(LXConversion* handle) LX_NOEXCEPT; /* 0 or LX_
 /*
  * Converts from *in to *out and advances both pointers and both byte counts. Returns 0 when all input is consumed,
  * LX_E_FULL when the output is full (call again with room), LX_E_PARTIAL when the input ends inside a character
- * (call again with more). Up to five bytes of either side wait inside the handle. A mixed host target is left in the
+ * (call again with more). A few bytes of either side may wait inside the handle. A mixed host target is left in the
  * state of the last character: LXFinishConversion closes it.
  */
 LX_API uint32_t LXConvertBuffer(LXConversion* handle, char** out, int32_t* out_room, const char** in, int32_t* in_left,
                                 uint32_t reserved) LX_NOEXCEPT;
-/* Most target bytes for one source byte. */
+/* Most target bytes for one source byte of well-formed text, without changed line ends and the final shift byte. */
 LX_API int32_t LXConversionRatio(LXLocale* target_locale, LXLocale* source_locale, uint32_t reserved) LX_NOEXCEPT;
 
 LX_API int32_t LXConvertString(LXLocale* target_locale, char* out, int32_t out_size, LXLocale* source_locale,
@@ -421,7 +421,7 @@ LX_API uint32_t LXSetConversionOptions(LXConversion* handle, uint32_t options, L
 /*
  * Ends a text: writes what is pending, turns an incomplete last character into one malformed character (problem
  * "cut"), and returns a mixed host target to the single-byte state. 0, or LX_E_FULL: call again with more room.
- * Afterwards the handle is as newly opened but for its counts.
+ * Afterwards the handle takes another text; its counts and options go on.
  */
 LX_API uint32_t LXFinishConversion(LXConversion* handle, char** out, int32_t* out_room) LX_NOEXCEPT;
 LX_API uint32_t LXGetConversionCounts(const LXConversion* handle, LXConversionCounts* counts) LX_NOEXCEPT;
