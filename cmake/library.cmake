@@ -5,7 +5,9 @@ file(GLOB LEXARO_SOURCES CONFIGURE_DEPENDS
 
 add_library(lexaro_core OBJECT ${LEXARO_SOURCES})
 target_link_libraries(lexaro_core PRIVATE lexaro_options)
-target_compile_options(lexaro_core PRIVATE -fno-exceptions -fno-rtti -fno-threadsafe-statics)
+# Joining two pointers that were just stored into one wide load makes short conversions wait for the stores, hence no
+# vectorizing of straight-line code; loops are not concerned.
+target_compile_options(lexaro_core PRIVATE -fno-exceptions -fno-rtti -fno-threadsafe-statics -fno-tree-slp-vectorize)
 
 add_library(lexaro SHARED)
 target_link_libraries(lexaro PRIVATE lexaro_core lexaro_options)
