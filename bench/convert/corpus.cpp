@@ -49,17 +49,38 @@ const Phrases kChinese = {
 
 // Fields of records. A double-byte field is followed by a blank, as fields of a fixed length are.
 const Phrases kRecords = {
-    u"0004711 ", u"20240331", u"000125000 ", u"A-20418 ", u"TOKYO ", u"OSAKA BRANCH    ", u"ﾔﾏﾀﾞ ﾀﾛｳ      ",
-    u"ｽｽﾞｷ ﾊﾅｺ     ", u"東京都千代田区 ", u"大阪府大阪市北区 ", u"山田太郎 ", u"鈴木花子 ", u"株式会社日本商事 ",
-    u"横浜支店 ", u"普通預金 ", u"振込入金のお知らせ ", u"システム利用料 ", u"0312345678 ", u"J ", u"JPY 000098400+",
+    u"0004711 ",
+    u"20240331",
+    u"000125000 ",
+    u"A-20418 ",
+    u"TOKYO ",
+    u"OSAKA BRANCH    ",
+    u"ﾔﾏﾀﾞ ﾀﾛｳ      ",
+    u"ｽｽﾞｷ ﾊﾅｺ     ",
+    u"東京都千代田区 ",
+    u"大阪府大阪市北区 ",
+    u"山田太郎 ",
+    u"鈴木花子 ",
+    u"株式会社日本商事 ",
+    u"横浜支店 ",
+    u"普通預金 ",
+    u"振込入金のお知らせ ",
+    u"システム利用料 ",
+    u"0312345678 ",
+    u"J ",
+    u"JPY 000098400+",
 };
 
 const Phrases& phrases_of(Script script) {
   switch (script) {
-    case Script::latin: return kLatin;
-    case Script::japanese: return kJapanese;
-    case Script::chinese: return kChinese;
-    default: return kRecords;
+    case Script::latin:
+      return kLatin;
+    case Script::japanese:
+      return kJapanese;
+    case Script::chinese:
+      return kChinese;
+    default:
+      return kRecords;
   }
 }
 

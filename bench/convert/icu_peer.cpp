@@ -132,8 +132,8 @@ PeerPtr icu_direct_peer(const Page& from, const Page& to) {
 std::string encode(const Page& page, const std::u16string& text) {
   std::string bytes(text.size() * 4 + 8, '\0');
   if (is_ucs2(page)) return {reinterpret_cast<const char*>(text.data()), text.size() * 2};
-  bytes.resize(FromUcs2(page).convert(reinterpret_cast<const char*>(text.data()), text.size() * 2, bytes.data(),
-                                      bytes.size()));
+  bytes.resize(
+      FromUcs2(page).convert(reinterpret_cast<const char*>(text.data()), text.size() * 2, bytes.data(), bytes.size()));
   return bytes;
 }
 

@@ -42,8 +42,9 @@ std::string compiler() {
 }  // namespace
 
 std::string machine_description(const std::string& peers) {
-  return "- Processor: " + processor() + ", " + std::to_string(sysconf(_SC_NPROCESSORS_ONLN)) + " online\n- System: " +
-         system_name() + "\n- Compiler: " + compiler() + "\n- Peers: " + peers + "\n- Date: " + today() + "\n";
+  return "- Processor: " + processor() + ", " + std::to_string(sysconf(_SC_NPROCESSORS_ONLN)) +
+         " online\n- System: " + system_name() + "\n- Compiler: " + compiler() + "\n- Peers: " + peers +
+         "\n- Date: " + today() + "\n";
 }
 
 }  // namespace lx::bench
