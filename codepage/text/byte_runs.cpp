@@ -115,40 +115,13 @@ __attribute__((target("avx2"))) size_t map_from_ascii_blocks(const uint8_t* tabl
   return done;
 }
 
-__attribute__((target("avx2"))) size_t map_bytes_avx2(const uint8_t* table, const uint8_t* in, size_t count,
-                                                      uint8_t* out) {
+__attribute__((target("avx2"))) size_t map_bytes_blocks(const uint8_t* table, const uint8_t* in, size_t count,
+                                                        uint8_t* out) {
   VectorTable vectors;
   load_rows(vectors, table, 16);
   size_t done = 0;
   for (; count - done >= kBlock; done += kBlock) store_block(out + done, look_up<16>(vectors, load_block(in + done)));
   return done;
-}
-
-// Newer processors look up bytes in a table of 128 with one instruction.
-#define LX_AVX512 __attribute__((target("avx512f,avx512bw,avx512vl,avx512vbmi")))
-
-LX_AVX512 size_t map_bytes_avx512(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
-  __m512i quarters[4];
-  for (unsigned i = 0; i < 4; ++i) quarters[i] = _mm512_loadu_si512(table + 64 * i);
-  size_t done = 0;
-  while (count - done >= kBlock) {
-    size_t size = count - done >= 2 * kBlock ? 2 * kBlock : kBlock;
-    __mmask64 here = size == kBlock ? 0xFFFFFFFFu : ~__mmask64{0};
-    __m512i block = _mm512_maskz_loadu_epi8(here, in + done);
-    __m512i lower = _mm512_permutex2var_epi8(quarters[0], block, quarters[1]);
-    __m512i upper = _mm512_permutex2var_epi8(quarters[2], block, quarters[3]);
-    _mm512_mask_storeu_epi8(out + done, here, _mm512_mask_blend_epi8(_mm512_movepi8_mask(block), lower, upper));
-    done += size;
-  }
-  return done;
-}
-
-size_t map_bytes_blocks(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
-  static_assert(kBlock == 32);
-  if (has_table_vectors()) {
-    return map_bytes_avx512(table, in, count, out);
-  }
-  return map_bytes_avx2(table, in, count, out);
 }
 
 // Bytes are mapped in pieces; a piece is done with before the next one begins, so that what is read back from it has
@@ -372,6 +345,7 @@ size_t map_from_ascii(const uint8_t* table, uint8_t from, const uint8_t* in, siz
 }
 
 void map_bytes(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
+  if (count >= kWorthVectors && has_table_vectors()) return map_bytes_vectors(table, in, count, out);
   size_t done = LX_BLOCKS(map_bytes_blocks(table, in, count, out));
   for (; done < count; ++done) out[done] = table[in[done]];
 }

@@ -124,6 +124,14 @@ bool has_table_vectors() {
          __builtin_cpu_supports("bmi2") != 0;
 }
 
+LX_VECTOR void map_bytes_vectors(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out) {
+  VectorTable vectors = table_of(table);
+  for (size_t done = 0; done < count; done += kBlock) {
+    uint64_t here = first(std::min(kBlock, count - done));
+    _mm512_mask_storeu_epi8(out + done, here, look_up(vectors, _mm512_maskz_loadu_epi8(here, in + done)));
+  }
+}
+
 LX_VECTOR void to_ucs2_vectors(const CodePage& page, Run<uint8_t, uint16_t>& run) {
   UnicodeTable table(page);
   auto count = static_cast<size_t>(std::min<ptrdiff_t>(run.in_end - run.in, run.out_end - run.out));
@@ -267,6 +275,7 @@ LX_VECTOR void decode_utf8(const uint8_t* text, size_t size, Utf8Block& block) {
 namespace lx {
 
 bool has_table_vectors() { return false; }
+void map_bytes_vectors(const uint8_t*, const uint8_t*, size_t, uint8_t*) {}
 void to_utf8_vectors(const CodePage&, Run<uint8_t, uint8_t>&) {}
 void from_utf8_vectors(const CodePage&, Run<uint8_t, uint8_t>&) {}
 void to_ucs2_vectors(const CodePage&, Run<uint8_t, uint16_t>&) {}

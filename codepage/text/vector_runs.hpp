@@ -13,6 +13,7 @@ inline constexpr size_t kWorthVectors = 16;
 bool has_table_vectors();
 
 // As their namesakes in byte_runs.hpp; the text to UCS-2 may be of any single-byte page. Only with has_table_vectors().
+void map_bytes_vectors(const uint8_t* table, const uint8_t* in, size_t count, uint8_t* out);
 void to_utf8_vectors(const CodePage& page, Run<uint8_t, uint8_t>& run);
 void from_utf8_vectors(const CodePage& page, Run<uint8_t, uint8_t>& run);
 void to_ucs2_vectors(const CodePage& page, Run<uint8_t, uint16_t>& run);
