@@ -4,6 +4,7 @@
 
 #include <pthread.h>
 
+#include <algorithm>
 #include <cstring>
 #include <new>
 
@@ -131,6 +132,13 @@ void fill_to_unicode(CodePage& page, const StateNumbers& numbers, uint16_t* node
         row[byte] = inside ? static_cast<uint16_t>(element(array, step.index + (byte & step.mask), 2)) : kUnassigned;
       }
     }
+  });
+  page.trail_low = 0xFF;
+  page.trail_high = 0;
+  numbers.for_each([&](const ToUnicodeState& step, uint16_t) {
+    if (&step == page.raw.states) return;
+    page.trail_low = std::min(page.trail_low, step.low);
+    page.trail_high = std::max(page.trail_high, step.high);
   });
   page.root = page.raw.state_count != 0 ? numbers.at(0) : uint16_t{0};
   page.nodes = nodes;

@@ -64,6 +64,9 @@ struct CodePage {
   const uint16_t* nodes;
   const uint16_t* rows;
 
+  uint8_t trail_low;  // bytes behind the first of a character lie between these
+  uint8_t trail_high;
+
   // What the first byte of a double-byte character leads to: its row, or one of the two marks. On shift-sensitive pages
   // it holds for the double-byte state, elsewhere for bytes that the length table gives two bytes.
   static constexpr uint16_t kOtherLength = 0x8000;  // ask decode and the length

@@ -146,26 +146,15 @@ struct MultibyteReader : VariableLengthReader {
   }
 
  private:
-  // What is no character ends before the first byte that could not follow: a lead byte before a control character or
-  // a line end does not swallow it.
+  // What is no character ends before the first byte that ends or continues none: a lead byte before a control character
+  // or a line end does not swallow it. A code without a character, on the other hand, is taken whole.
   Got next_strict(uint16_t& character, size_t length) {
-    size_t fits = well_formed_prefix(std::min(length, left()));
+    size_t fits = 1;
+    while (fits < length && fits < left() && at[fits] >= page->trail_low && at[fits] <= page->trail_high) ++fits;
     if (fits == left() && fits < length) return Got::partial;
-    take(fits < length ? fits : length);
+    take(fits);
     character = fits < length ? kUnassigned : page->decode(start);
     return Got::character;
-  }
-
-  // Bytes that some character of the page could begin with; at least one.
-  size_t well_formed_prefix(size_t count) const {
-    const ToUnicodeState* states = page->raw.states;
-    const ToUnicodeState* state = states;
-    for (size_t i = 0; i < count; ++i) {
-      if (states == nullptr || at[i] < state->low || at[i] > state->high) return i == 0 ? 1 : i;
-      if (state->final != 0) return count;
-      state = states + state->index + (at[i] & state->mask);
-    }
-    return count;
   }
 
   const uint16_t* lead_;
