@@ -105,6 +105,22 @@ void add(std::vector<uint16_t>& map, uint32_t first, uint32_t last, int differen
   for (uint32_t c = first; c <= last; ++c) map[c] = static_cast<uint16_t>(static_cast<int>(c) + difference);
 }
 
+// Tables of pairs: a code point and what it is mapped to.
+template <size_t N, class Store>
+void read_mappings(const fs::path& path, const Block (&tables)[N], Report& report, Store store) {
+  SourceFile source(path.string(), read_file(path), report);
+  BlockReader blocks(tables);
+  source.for_each_line(report, [&](Cursor& cursor) {
+    if (blocks.accept_table(cursor)) return;
+    uint16_t c = blocks.code_point(cursor);
+    cursor.expect(U' ');
+    uint16_t mapped = cursor.unicode_escape();
+    cursor.end();
+    store(*blocks.current(), c, mapped);
+  });
+  if (!blocks.complete()) report.error(source.name(), source.end(), "tables are missing");
+}
+
 }  // namespace
 
 // Mappings that follow a rule; the sources give the rest.
@@ -158,31 +174,15 @@ void UnicodeTables::read_types(const fs::path& path, Report& report) {
 }
 
 void UnicodeTables::read_cases(const fs::path& path, Report& report) {
-  SourceFile source(path.string(), read_file(path), report);
-  BlockReader blocks(kCaseBlocks);
-  source.for_each_line(report, [&](Cursor& cursor) {
-    if (blocks.accept_table(cursor)) return;
-    uint16_t c = blocks.code_point(cursor);
-    cursor.expect(U' ');
-    uint16_t mapped = cursor.unicode_escape();
-    cursor.end();
-    (blocks.current()->name[0] == 'l' ? lower_ : upper_)[c] = mapped;
+  read_mappings(path, kCaseBlocks, report, [&](const Block& block, uint16_t c, uint16_t mapped) {
+    (block.name[0] == 'l' ? lower_ : upper_)[c] = mapped;
   });
-  if (!blocks.complete()) report.error(source.name(), source.end(), "tables are missing");
 }
 
 void UnicodeTables::read_widths(const fs::path& path, Report& report) {
-  SourceFile source(path.string(), read_file(path), report);
-  BlockReader blocks(kWidthBlocks);
-  source.for_each_line(report, [&](Cursor& cursor) {
-    if (blocks.accept_table(cursor)) return;
-    uint16_t c = blocks.code_point(cursor);
-    cursor.expect(U' ');
-    uint16_t mapped = cursor.unicode_escape();
-    cursor.end();
-    if (blocks.current()->name[0] == 'H') full_width_[c] = mapped;
+  read_mappings(path, kWidthBlocks, report, [&](const Block& block, uint16_t c, uint16_t mapped) {
+    if (block.name[0] == 'H') full_width_[c] = mapped;
   });
-  if (!blocks.complete()) report.error(source.name(), source.end(), "tables are missing");
 }
 
 void UnicodeTables::read_digits(const fs::path& path, Report& report) {
