@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: Apache-2.0
 #include <algorithm>
 #include <iterator>
+#include <map>
 #include <sstream>
+#include <string_view>
 
 #include "lint.hpp"
 
@@ -10,7 +12,8 @@ namespace lx::compiler {
 namespace {
 
 constexpr size_t kLongestText = 31;  // bytes, in the buffers of a locale
-constexpr size_t kLongestSign = 3;
+constexpr size_t kLongestSign = 3;   // bytes, of the negative sign
+constexpr const char* kNegativeSignKey = "negative-sign";
 
 // The combinations that have a name among the locales of the operating system. These objects must exist, and the texts
 // must be representable in these code pages.
@@ -50,8 +53,9 @@ constexpr Home kHomes[] = {
     {"Turkish", "ISO-8859-9", "Turkey"},
 };
 
-// Where the host page of the country has "#" at another byte, which the formatting code would not recognise.
-constexpr uint16_t kMovedNumberSign[] = {32,  57,  68,  125, 152, 170, 188, 208, 218, 222, 246, 250, 320,
+// Where a host page of the country, or of a language it shares, has "#" at another byte, which the formatting code
+// would not recognise.
+constexpr uint16_t kMovedNumberSign[] = {32,  57,  68,  125, 152, 170, 188, 208, 218, 222, 233, 246, 250, 320,
                                          380, 484, 558, 578, 591, 600, 604, 724, 752, 757, 792, 858, 862};
 
 std::vector<std::string> words(const char* text) {
@@ -118,12 +122,15 @@ Spot spot_of(const T& object, const std::string& key) {
 
 // Formats consist of characters and the directives that the time functions know.
 std::string format_fault(const std::u16string& format, bool number_sign_allowed) {
-  constexpr std::u16string_view kDirectives = u"aAbBcdHIjmMpSUwWxXyY%";
+  constexpr std::u16string_view kDirectives = u"aAbBcdHIjmMpSUwWxXyY%", kFormatsThemselves = u"cxX";
+  if (format.empty()) return "a format is needed";
   for (size_t i = 0; i < format.size(); ++i) {
     if (format[i] != u'%') continue;
     bool number_sign = ++i < format.size() && format[i] == u'#';
     if (number_sign) ++i;
     if (i == format.size() || kDirectives.find(format[i]) == std::u16string_view::npos) return "an unknown directive";
+    if (kFormatsThemselves.find(format[i]) != std::u16string_view::npos)
+      return "%c, %x and %X stand for these formats and cannot be part of one";
     if (number_sign && !number_sign_allowed) return "\"#\" cannot be used: the host page of this territory moves it";
   }
   return "";
@@ -141,6 +148,11 @@ bool is_grouping(const std::u16string& text) {
   }
 }
 
+bool is_capitals(const std::u16string& text, size_t length) {
+  return text.size() == length &&
+         std::all_of(text.begin(), text.end(), [](char16_t c) { return c >= u'A' && c <= u'Z'; });
+}
+
 }  // namespace
 
 void lint_territory(const Territory& territory, Report& report) {
@@ -150,6 +162,7 @@ void lint_territory(const Territory& territory, Report& report) {
   for (unsigned i = 0; i < kSeparators; ++i) {
     char16_t c = territory.separators[i];
     if (c > 0x7E) error(kSeparatorKeys[i], "a separator must be an ASCII character: a locale keeps it in one byte");
+    if (c != 0 && c < u' ') error(kSeparatorKeys[i], "a separator cannot be a control character");
     if (c >= u'0' && c <= u'9') error(kSeparatorKeys[i], "a separator cannot be a digit");
   }
   auto pair = [&](unsigned decimal, unsigned thousands) {
@@ -171,9 +184,17 @@ void lint_territory(const Territory& territory, Report& report) {
       error(kTerritoryTextKeys[static_cast<unsigned>(which)], "expected group sizes that end in 0, such as 3;0");
     }
   }
-  if (territory.text(TerritoryText::negative_sign).size() > kLongestSign) {
-    error("negative-sign", "the sign is longer than 3 characters");
+  for (TerritoryText which : {TerritoryText::abbreviation, TerritoryText::currency_intl}) {
+    if (!is_capitals(territory.text(which), 3))
+      error(kTerritoryTextKeys[static_cast<unsigned>(which)], "expected three capitals");
   }
+  for (TerritoryText which : {TerritoryText::own_name, TerritoryText::currency}) {
+    if (territory.text(which).empty()) error(kTerritoryTextKeys[static_cast<unsigned>(which)], "a text is needed");
+  }
+  // A negative amount without a sign, and not in parentheses either, would read as a positive one.
+  const std::u16string& sign = territory.text(TerritoryText::negative_sign);
+  if (sign.empty() && territory.negative.sign_position != 0) error(kNegativeSignKey, "a sign is needed");
+  if (sign.size() > kLongestSign) error(kNegativeSignKey, "the sign is longer than 3 characters");
 }
 
 namespace {
@@ -183,7 +204,10 @@ class TreeLint {
   TreeLint(const SourceTree& tree, Report& report) : tree_(tree), report_(report), entries_(tree.entries()) {}
 
   void run() {
-    for (const Language& language : tree_.languages) default_ids(language);
+    for (const Language& language : tree_.languages) {
+      default_ids(language);
+      names(language);
+    }
     for (const Home& home : kHomes) home_locale(home);
     for (const Language& language : tree_.languages) lengths(language);
     for (const Territory& territory : tree_.territories) lengths(territory);
@@ -200,6 +224,26 @@ class TreeLint {
     need("default-territory", ObjectType::territory, language.default_territory);
     need("default-codepage", ObjectType::code_page, language.default_code_page);
     if (language.default_sort != 0) need("default-sort", ObjectType::sort, language.default_sort);
+  }
+
+  // Programs show the names, and find the day or month in a date by the name that stands there.
+  void names(const Language& language) {
+    auto error = [&](const std::string& key, const std::string& message) {
+      report_.error(language.file, spot_of(language, key), message);
+    };
+    std::map<std::pair<std::string, std::u16string>, std::string> keys;  // by kind of name ("day") and name
+    for (const NamedText& named : texts_of(language)) {
+      std::string key = named.key;
+      size_t dot = key.find('.');
+      if (language.spots.count(key) == 0) continue;  // no calendar here has a thirteenth month
+      if (named.text->empty()) {
+        error(key, "a text is needed");
+      } else if (dot != std::string::npos) {
+        auto [same, added] = keys.emplace(std::pair(key.substr(0, dot), *named.text), key);
+        if (!added) error(key, "the same name as " + same->second);
+      }
+    }
+    if (!is_capitals(language.texts[0], 2)) error("abbreviation", "expected two capitals");
   }
 
   template <class T>
@@ -237,9 +281,11 @@ class TreeLint {
   template <class T>
   void lengths(const T& object) {
     for (const NamedText& named : texts_of(object)) {
+      size_t longest = named.key == std::string_view(kNegativeSignKey) ? kLongestSign : kLongestText;
       for (const CodePage& page : tree_.code_pages) {
-        if (lacking(page, *named.text) != 0 || encoded_length(page, *named.text) <= kLongestText) continue;
-        report_.error(object.file, spot_of(object, named.key), "longer than 31 bytes in " + page.name);
+        if (lacking(page, *named.text) != 0 || encoded_length(page, *named.text) <= longest) continue;
+        report_.error(object.file, spot_of(object, named.key),
+                      "longer than " + std::to_string(longest) + " bytes in " + page.name);
         break;
       }
     }
