@@ -47,7 +47,7 @@ int32_t LXCpUnicodeToChar(const LXObjEntry* record, LXUChar ucs2, char* out) noe
 
 LXWChar LXCpUnicodeToCharW(const LXObjEntry* record, LXUChar ucs2) noexcept {
   const CodePage& page = code_page_of(*record);
-  return page.kind == PageKind::utf8 ? ShiftedWriter::utf8_packed(ucs2) : page.packed(ucs2);
+  return page.kind == PageKind::utf8 ? utf8_packed(ucs2) : page.packed(ucs2);
 }
 
 LXWChar LXCpMbHalfToFullW(const LXObjEntry* record, LXWChar packed) noexcept {

@@ -29,7 +29,8 @@ inline constexpr uint16_t kLocaleSingleByte = 0x040;  // every character of the 
 inline constexpr uint16_t kLocaleBinarySort = 0x080;
 inline constexpr uint16_t kLocaleShiftSensitive = 0x100;
 
-// The separators and strings that a locale has copies of, in the order of its fields.
+// The numbers, separators and strings that a locale has copies of, in the order of its fields.
+inline constexpr unsigned kLocaleNumbers = 5;
 inline constexpr unsigned kLocaleSeparators = 5;
 inline constexpr unsigned kLocaleStrings = 8;
 
@@ -55,6 +56,7 @@ struct LXObjEntry {
   std::atomic<const uint8_t*> section1;
   const uint8_t* more_sections[3];
   const lx::CodePage* code_page;
+  const LXUChar* const* texts;  // of a language or territory, in machine order: see objects/entry.hpp
 
   bool loaded() const { return section1.load(std::memory_order_acquire) != nullptr; }
 };
@@ -74,12 +76,8 @@ struct LXLocale {
   LXObjEntry* code_page;
   LXObjEntry* sort;  // null: binary
   uint32_t set_mask;
-  uint16_t fraction_digits;
-  uint16_t currency_digits;
-  uint16_t currency_intl_digits;
+  uint16_t numbers[lx::kLocaleNumbers];
   uint16_t flags;
-  uint8_t positive_sign_position;
-  uint8_t negative_sign_position;
   char separators[lx::kLocaleSeparators];
   char* strings[lx::kLocaleStrings];  // in the locale's code page
   uint16_t mirror_bits;               // which strings have a current UCS-2 copy

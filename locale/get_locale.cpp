@@ -3,9 +3,7 @@
 #include <cstring>
 
 #include "codepage/text/text_kinds.hpp"
-#include "frame/call.hpp"
 #include "frame/library.hpp"
-#include "frame/memory.hpp"
 #include "locale/locale.hpp"
 
 namespace lx {
@@ -14,7 +12,6 @@ namespace {
 TRC1_Unit trace_unit = {"Lexaro", "locale", 0};
 
 constexpr char kEnglish[] = "English";
-constexpr int32_t kUserNameRoom = 132;
 constexpr uint32_t kOptions = LX_GET_USER | LX_GET_SUBSTITUTE;
 
 // A part of a locale name, of either kind of text.
@@ -159,10 +156,10 @@ LXLocale* build_locale(const Unit* name, bool substitute, uint32_t& rc) {
 }
 
 LXLocale* build_user_locale(bool substitute, uint32_t& rc) {
-  char name[kUserNameRoom + 1] = {};
-  int32_t origin = LXGetUserLocale(name, kUserNameRoom);
+  char name[kLocaleNameRoom + 1] = {};
+  int32_t origin = LXGetUserLocale(name, kLocaleNameRoom);
   LXLocale* locale = build_locale(name, substitute, rc);
-  if (locale != nullptr && origin == 2) map_native_info("", *locale);
+  if (locale != nullptr && origin == 2) LXMapNativeInfo("", locale, 0);
   return locale;
 }
 

@@ -2,45 +2,71 @@
 // Parts of a locale that more than one file of this folder works on.
 #pragma once
 
-#include "frame/records.hpp"
-#include "objects/entry.hpp"
+#include "frame/call.hpp"
+#include "frame/memory.hpp"
+#include "locale/items.hpp"
 
 namespace lx {
 
-// The locale's own copies of texts, in the order of its fields.
-enum class LocaleText : unsigned {
-  grouping,           // item 62
-  currency,           // 64
-  monetary_grouping,  // 68
-  positive_sign,      // 71
-  negative_sign,      // 72
-  time_format,        // 79
-  short_date,         // 80
-  long_date,          // 81
-};
+inline constexpr int32_t kLocaleNameRoom = 132;  // of a locale name that is made from a native one
 
-// Bits of the set mask.
-inline constexpr uint32_t kSetFractionDigits = 0x001;
-inline constexpr uint32_t kSetCurrencyDigits = 0x002;
-inline constexpr uint32_t kSetCurrencyIntlDigits = 0x004;
-inline constexpr uint32_t kSetYesNo[] = {0x008, 0x010, 0x020, 0x040, 0x080, 0x100};  // items 73-76, 82, 83
-inline constexpr uint32_t kSetPositiveSignPosition = 0x200;
-inline constexpr uint32_t kSetNegativeSignPosition = 0x400;
-inline constexpr uint32_t kSetFirstSeparator = 0x800;  // items 59, 60, 61, 66, 67 in ascending bits,
-inline constexpr uint32_t kSetFirstText = 0x10000;     // then the texts
-
-// Bits of the mirror word: separators, then texts.
-inline constexpr uint16_t kMirrorFirstText = 0x20;
+// ---- Filling and changing ----
 
 // Takes the page's properties into the locale's flags.
 void note_code_page(LXLocale& locale);
 
-// Stores a text of the caller as the locale's own: `length` bytes of its code page, cut to whole characters, with a
-// UCS-2 copy. 0 or LX_E_MEMORY; on failure the former text stays.
-uint32_t store_text(LXLocale& locale, LocaleText which, const char* text, size_t length);
+// The byte that stands for a separator in the locale. What needs more bytes, or is not in the page, is replaced there;
+// its UCS-2 value in the record stays true.
+char separator_byte(const CodePage& page, LXUChar character);
 
-// The values that the system's locale of that name defines go into the locale; an empty name is the user's.
-void map_native_info(const char* native_name, LXLocale& locale);
+// A new text in a code page, without shift bytes; null: no memory.
+Owned<char> text_in_page(const CodePage& page, const LXUChar* text);
+
+// The locale's own text of a string item, from the territory. LX_OK or LX_E_MEMORY; on failure the former text stays.
+uint32_t fill_string(LXLocale& locale, const Item& item);
+
+// Makes another object the locale's. LX_OK or LX_E_MEMORY.
+uint32_t take_object(LXLocale& locale, uint8_t type, LXObjEntry* entry);
+
+// What a lookup without a result means for the one who set an id or a name. LX_OK: the binary sort.
+inline uint32_t lookup_status(const LXObjEntry* entry, uint32_t rc) {
+  if (entry != nullptr || rc == LX_OK) return LX_OK;
+  return rc == LX_E_MEMORY ? LX_E_MEMORY : LX_E_NOTFOUND;
+}
+
+// ---- Texts ----
+
+// A text in the locale's code page, and as UCS-2 where the bytes alone do not tell its characters.
+struct GivenText {
+  const char* bytes;
+  size_t length;
+  const LXUChar* ucs2 = nullptr;
+  size_t characters = 0;
+};
+
+// Stores a text of the caller as the locale's own, cut to whole characters, with a UCS-2 copy. LX_OK or LX_E_MEMORY; on
+// failure the former text stays.
+uint32_t store_string(LXLocale& locale, const Item& item, const GivenText& text);
+
+// Where the text of an item is. Bytes are of the locale's code page (form 2) or ASCII (form 3).
+struct ItemText {
+  uint32_t form = 0;
+  const char* bytes = nullptr;
+  size_t length = 0;
+  const LXUChar* ucs2 = nullptr;  // forms 1 and 2
+  size_t units = 0;
+};
+
+// LX_OK, LX_E_ITEM, or LX_E_NOTFOUND. The full name has no text of this kind.
+uint32_t find_text(const LXLocale& locale, uint32_t number, bool own, ItemText& text);
+
+inline constexpr size_t kFullNameRoom = 136;  // four names, what stands between them, and a terminator
+size_t write_full_name(const LXLocale& locale, char* buffer);
+
+// The page that ASCII names go through.
+const CodePage& ascii_code_page();
+
+// ---- The system's locale ----
 
 // The process-wide system locale, saved while it is switched to another.
 class SavedSystemLocale {
@@ -53,6 +79,7 @@ class SavedSystemLocale {
   SavedSystemLocale& operator=(const SavedSystemLocale&) = delete;
 
   bool saved() const { return saved_; }
+  void forget() { saved_ = false; }
 
  private:
   char name_[kRoom];

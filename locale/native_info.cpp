@@ -5,7 +5,6 @@
 #include <cstdio>
 #include <cstring>
 
-#include "frame/call.hpp"
 #include "locale/locale.hpp"
 
 namespace lx {
@@ -13,41 +12,36 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "native_info", 0};
 
-constexpr int32_t kLocaleNameRoom = 132;
 constexpr size_t kMaxGroupingText = 31;
 
 const char* non_null(const char* text) { return text != nullptr ? text : ""; }
 
 bool available(char value) { return value != CHAR_MAX; }
 
-void set_flag(LXLocale& locale, uint16_t flag, char value) {
+void take_number(LXLocale& locale, uint32_t number, char value) {
   if (!available(value)) return;
-  unsigned rest = locale.flags & ~unsigned{flag};
-  locale.flags = static_cast<uint16_t>(value != 0 ? rest | flag : rest);
-}
-
-void set_number(uint16_t& own, char value) {
-  if (available(value)) own = static_cast<uint16_t>(static_cast<unsigned char>(value));
-}
-
-void set_position(uint8_t& own, char value) {
-  if (available(value)) own = static_cast<uint8_t>(value);
+  const Item& item = item_of(number);
+  if (item.kind == ItemKind::yes_no) {
+    set_own_flag(locale, item, value != 0);
+  } else {
+    locale.numbers[item.index] = static_cast<uint8_t>(value);
+  }
 }
 
 void take_numbers(LXLocale& locale, const lconv& system) {
-  set_number(locale.currency_digits, system.frac_digits);
-  set_number(locale.currency_intl_digits, system.int_frac_digits);
-  set_flag(locale, kLocalePositivePrecedes, system.p_cs_precedes);
-  set_flag(locale, kLocalePositiveSpaced, system.p_sep_by_space);
-  set_flag(locale, kLocaleNegativePrecedes, system.n_cs_precedes);
-  set_flag(locale, kLocaleNegativeSpaced, system.n_sep_by_space);
-  set_position(locale.positive_sign_position, system.p_sign_posn);
-  set_position(locale.negative_sign_position, system.n_sign_posn);
+  take_number(locale, LX_ITEM_CURRENCY_DIGITS, system.frac_digits);
+  take_number(locale, LX_ITEM_CURRENCY_INTL_DIGITS, system.int_frac_digits);
+  take_number(locale, LX_ITEM_P_CS_PRECEDES, system.p_cs_precedes);
+  take_number(locale, LX_ITEM_P_SEP_BY_SPACE, system.p_sep_by_space);
+  take_number(locale, LX_ITEM_N_CS_PRECEDES, system.n_cs_precedes);
+  take_number(locale, LX_ITEM_N_SEP_BY_SPACE, system.n_sep_by_space);
+  take_number(locale, LX_ITEM_P_SIGN_POSN, system.p_sign_posn);
+  take_number(locale, LX_ITEM_N_SIGN_POSN, system.n_sign_posn);
 }
 
 // Group sizes as the locale spells them: "3;0", in the digits of its code page.
-void take_grouping(LXLocale& locale, LocaleText which, const char* sizes) {
-  if (*sizes == '\0') return;
+uint32_t take_grouping(LXLocale& locale, uint32_t number, const char* sizes) {
+  if (*sizes == '\0') return LX_OK;
   char text[kMaxGroupingText + 8];
   size_t length = 0;
   for (; *sizes != '\0' && available(*sizes); ++sizes) {
@@ -57,29 +51,31 @@ void take_grouping(LXLocale& locale, LocaleText which, const char* sizes) {
   }
   text[length++] = '0';
   const CodePage& page = code_page_of(*locale.code_page);
-  for (size_t i = 0; i < length; ++i) text[i] = static_cast<char>(page.byte_of_latin1[static_cast<uint8_t>(text[i])]);
-  store_text(locale, which, text, length);
+  for (size_t i = 0; i < length; ++i) text[i] = separator_byte(page, static_cast<uint8_t>(text[i]));
+  return store_string(locale, item_of(number), {text, length});
 }
 
 // Separators of one byte are taken as they are: the system vouches for them.
-void take_separator(LXLocale& locale, unsigned index, const char* text) {
+void take_separator(LXLocale& locale, uint32_t number, const char* text) {
   if (std::strlen(text) != 1) return;
+  unsigned index = item_of(number).index;
   locale.separators[index] = *text;
   locale.ucs2_separators[index] = code_page_of(*locale.code_page).to_unicode[static_cast<uint8_t>(*text)];
 }
 
-void take_text(LXLocale& locale, LocaleText which, const char* text) {
-  if (*text != '\0') store_text(locale, which, text, std::strlen(text));
+uint32_t take_text(LXLocale& locale, uint32_t number, const char* text) {
+  return *text != '\0' ? store_string(locale, item_of(number), {text, std::strlen(text)}) : LX_OK;
 }
 
-void take_texts(LXLocale& locale, const lconv& system) {
-  take_separator(locale, 0, system.decimal_point);
-  take_separator(locale, 1, system.thousands_sep);
-  take_separator(locale, 3, system.mon_decimal_point);
-  take_separator(locale, 4, system.mon_thousands_sep);
-  take_text(locale, LocaleText::currency, system.currency_symbol);
-  take_text(locale, LocaleText::positive_sign, system.positive_sign);
-  take_text(locale, LocaleText::negative_sign, system.negative_sign);
+uint32_t take_texts(LXLocale& locale, const lconv& system) {
+  take_separator(locale, LX_ITEM_DECIMAL, system.decimal_point);
+  take_separator(locale, LX_ITEM_THOUSANDS, system.thousands_sep);
+  take_separator(locale, LX_ITEM_MON_DECIMAL, system.mon_decimal_point);
+  take_separator(locale, LX_ITEM_MON_THOUSANDS, system.mon_thousands_sep);
+  // Either runs out of memory or not: what came before stays.
+  return take_text(locale, LX_ITEM_CURRENCY, system.currency_symbol) |
+         take_text(locale, LX_ITEM_POSITIVE_SIGN, system.positive_sign) |
+         take_text(locale, LX_ITEM_NEGATIVE_SIGN, system.negative_sign);
 }
 
 // The system's texts are usable only when they are in the locale's code page.
@@ -99,6 +95,22 @@ const char* environment_locale() {
   if (const char* name = std::setlocale(LC_ALL, "")) return name;
   if (const char* name = HSV1_GetEnv("LC_ALL", 0)) return name;
   return non_null(HSV1_GetEnv("LANG", 0));
+}
+
+uint32_t map_native_info(const char* native_name, LXLocale& locale) {
+  SavedSystemLocale saved;
+  if (!saved.saved()) return LX_OK;
+  const char* system_name = std::setlocale(LC_ALL, native_name);
+  if (system_name == nullptr) {
+    saved.forget();  // nothing was switched
+    return LX_OK;
+  }
+  const lconv& system = *std::localeconv();
+  take_numbers(locale, system);
+  uint32_t status = take_grouping(locale, LX_ITEM_GROUPING, system.grouping) |
+                    take_grouping(locale, LX_ITEM_MON_GROUPING, system.mon_grouping);
+  if (!same_code_page(*native_name != '\0' ? native_name : system_name, locale)) return status;
+  return status | take_texts(locale, system);
 }
 
 }  // namespace
@@ -121,23 +133,35 @@ SavedSystemLocale::~SavedSystemLocale() {
   LX_TRACE(TRC1_LEVEL_DETAIL, "Restored locale: [%d/%d] %s", static_cast<int>(std::strlen(name_)), kRoom, name_);
 }
 
-void map_native_info(const char* native_name, LXLocale& locale) {
-  SavedSystemLocale saved;
-  if (!saved.saved()) return;
-  const char* system_name = std::setlocale(LC_ALL, native_name);
-  if (system_name == nullptr) return;
-  const lconv& system = *std::localeconv();
-  take_numbers(locale, system);
-  take_grouping(locale, LocaleText::grouping, system.grouping);
-  take_grouping(locale, LocaleText::monetary_grouping, system.mon_grouping);
-  if (same_code_page(*native_name != '\0' ? native_name : system_name, locale)) take_texts(locale, system);
-}
-
 }  // namespace lx
 
 using namespace lx;
 
-extern "C" int32_t LXGetUserLocale(char* buffer, int32_t buffer_size) noexcept {
+extern "C" {
+
+void LXMapNativeInfo(const char* native_name, LXLocale* locale, uint32_t /*flag*/) noexcept {
+  exported(trace_unit, __func__, [&] {
+    locale = locale_or_default(locale);
+    if (locale == nullptr || native_name == nullptr) return;
+    locale->last_error = map_native_info(native_name, *locale);
+  });
+}
+
+LXLocale* LXConvertNativeLocale(const char* native_name, uint32_t options, uint32_t* rc) noexcept {
+  return exported(trace_unit, __func__, [&]() -> LXLocale* {
+    if (native_name == nullptr || (options & ~(LX_NATIVE_INFO | LX_GET_SUBSTITUTE)) != 0) {
+      set_status(rc, LX_E_ARGUMENT);
+      return nullptr;
+    }
+    char name[kLocaleNameRoom];
+    LXMapNativeLocale(native_name, name, kLocaleNameRoom);
+    LXLocale* locale = LXGetLocale(name, options & LX_GET_SUBSTITUTE, rc);
+    if (locale != nullptr) LXMapNativeInfo(native_name, locale, options & LX_NATIVE_INFO);
+    return locale;
+  });
+}
+
+int32_t LXGetUserLocale(char* buffer, int32_t buffer_size) noexcept {
   return exported(trace_unit, __func__, [&]() -> int32_t {
     if (buffer == nullptr || buffer_size < 1) return 0;
     if (const char* name = HSV1_GetEnv("LX_LANG", 0)) {
@@ -155,3 +179,5 @@ extern "C" int32_t LXGetUserLocale(char* buffer, int32_t buffer_size) noexcept {
     return 2;
   });
 }
+
+}  // extern "C"

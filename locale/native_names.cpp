@@ -3,7 +3,6 @@
 #include <cstdio>
 #include <string_view>
 
-#include "frame/call.hpp"
 #include "frame/text_view.hpp"
 #include "locale/locale.hpp"
 
@@ -132,5 +131,17 @@ extern "C" char* LXMapNativeLocale(const char* native_name, char* buffer, int32_
       write_name(buffer, size, row, row, row, row);
     }
     return buffer;
+  });
+}
+
+extern "C" int32_t LXEnumNativeNames(LXEnumNativeFn callback, void* context) noexcept {
+  return exported(trace_unit, __func__, [&]() -> int32_t {
+    if (callback == nullptr) return 0;
+    for (const NativeName& row : kNativeNames) {
+      char name[kLocaleNameRoom];
+      write_name(name, kLocaleNameRoom, row, row, row, row);
+      if (callback(context, row.native.data(), name) == 0) break;
+    }
+    return 0;
   });
 }

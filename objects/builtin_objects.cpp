@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-// Made by "lexaroc builtin data objects" from data/builtin/language.txt, data/builtin/territory.txt,
+// Made by "lexaroc builtin data ." from data/builtin/language.txt, data/builtin/territory.txt,
 // data/codepage/cp_00367.txt and data/unicode.
 // clang-format off
 #include "lexaro/lexaro.h"

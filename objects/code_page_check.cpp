@@ -121,6 +121,8 @@ const char* check_lengths(uint16_t id, const CodePageHeader& header) {
     unsigned needed = byte >= 0xE0 ? 3 : 2;
     if (byte < 0x80 ? length != 1 : (length > 1 && (byte < 0xC0 || length < needed))) return "character length table";
   }
+  // Behind shift bytes every character has two bytes: the readers and writers of such text count on it.
+  if (has_shift_states(header) && header.max_length != 2) return "maximum character length";
   if (has_shift_states(header) &&
       (header.enter_byte == 0 || header.leave_byte == 0 || header.enter_byte == header.leave_byte)) {
     return "shift bytes";

@@ -16,11 +16,13 @@ inline const TerritoryHeader& territory_of(const LXObjEntry& entry) {
   return *reinterpret_cast<const TerritoryHeader*>(entry.section1.load(std::memory_order_acquire));
 }
 
-// A zero-terminated UCS-2 text of a territory, in file order.
-inline const BeU16* territory_text(const LXObjEntry& entry, TerritoryText text) {
-  const TerritoryHeader& header = territory_of(entry);
-  return reinterpret_cast<const BeU16*>(reinterpret_cast<const uint8_t*>(&header) +
-                                        header.text_offsets[static_cast<unsigned>(text)]);
+// Texts in machine order. The separators of a territory stand behind its other texts.
+inline const LXUChar* language_text(const LXObjEntry& entry, unsigned slot) { return entry.texts[slot]; }
+inline const LXUChar* territory_text(const LXObjEntry& entry, TerritoryText text) {
+  return entry.texts[static_cast<unsigned>(text)];
+}
+inline const LXUChar* separator_text(const LXObjEntry& entry, unsigned separator) {
+  return entry.texts[kTerritoryTexts + separator];
 }
 
 inline bool is_loaded_code_page(const LXObjEntry* entry) {

@@ -8,6 +8,7 @@
 #include "objects/code_page_check.hpp"
 #include "objects/entry.hpp"
 #include "objects/file_format.hpp"
+#include "objects/native_texts.hpp"
 #include "objects/text_check.hpp"
 
 namespace lx {
@@ -23,6 +24,7 @@ struct Loading {
   uint32_t sizes[kMaxSections] = {};
   uint8_t flags = 0;
   Owned<CodePage> code_page;
+  Owned<const LXUChar* const> texts;
 
   SectionBytes bytes(unsigned section) const { return {sections[section].get(), sizes[section]}; }
 };
@@ -45,8 +47,7 @@ uint32_t read_header(const LXObjEntry& entry, LXFile* file, FileHeader& header) 
 uint32_t read_sections(const LXObjEntry& entry, LXFile* file, const FileHeader& header, Loading& loading) {
   for (unsigned i = 0; i < header.section_count; ++i) {
     uint32_t rc = LX_OK;
-    loading.sections[i].reset(
-        static_cast<uint8_t*>(LXLoadFile(file, header.offset_of(i), header.size_of(i), &rc)));
+    loading.sections[i].reset(static_cast<uint8_t*>(LXLoadFile(file, header.offset_of(i), header.size_of(i), &rc)));
     if (rc != LX_OK) return rc;
     loading.sizes[i] = header.size_of(i);
   }
@@ -91,18 +92,19 @@ uint32_t check_code_page_object(const LXObjEntry& entry, const FileHeader& heade
 }
 
 uint32_t check_object(const LXObjEntry& entry, const FileHeader& header, Loading& loading) {
+  const SectionBytes section = loading.bytes(0);
   const char* wrong = nullptr;
   switch (entry.type) {
     case LX_LANGUAGE:
-      wrong = check_language(loading.bytes(0));
-      break;
     case LX_TERRITORY:
-      wrong = check_territory(loading.bytes(0));
-      break;
+      wrong = entry.type == LX_LANGUAGE ? check_language(section) : check_territory(section);
+      if (wrong != nullptr) break;
+      loading.texts.reset(build_texts(entry.type, section.data));
+      return loading.texts ? LX_OK : LX_E_MEMORY;
     case LX_CODEPAGE:
       return check_code_page_object(entry, header, loading);
     default:
-      wrong = loading.sizes[0] >= kSortHeaderSize ? nullptr : "section 1 size";
+      wrong = section.size >= kSortHeaderSize ? nullptr : "section 1 size";
       break;
   }
   return wrong == nullptr ? LX_OK : corrupted(entry, wrong);
@@ -112,6 +114,7 @@ void publish(LXObjEntry& entry, Loading& loading) {
   entry.flags = loading.flags;
   for (unsigned i = 1; i < kMaxSections; ++i) entry.more_sections[i - 1] = loading.sections[i].give_up();
   entry.code_page = loading.code_page.give_up();
+  entry.texts = loading.texts.give_up();
   entry.section1.store(loading.sections[0].give_up(), std::memory_order_release);
 }
 
@@ -172,6 +175,8 @@ uint32_t LXUnloadObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
     }
     const CodePage* code_page = std::exchange(entry->code_page, nullptr);
     if (code_page != nullptr && !release(code_page)) result = LX_E_FREE;
+    // What was read, and the texts in machine order that stand for it, is given back without a look.
+    Owned<const LXUChar* const>(std::exchange(entry->texts, nullptr));
     entry->flags = 0;
     return result;
   });
@@ -186,6 +191,8 @@ uint32_t LXLoadDefaultObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
     if (entry->type == LX_CODEPAGE) {
       entry->more_sections[1] = LXDefCP3;
       entry->code_page = &built_in_code_page();
+    } else {
+      entry->texts = built_in_texts(entry->type);
     }
     entry->section1.store(kSections[entry->type], std::memory_order_release);
     return 0;

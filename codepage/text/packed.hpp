@@ -27,6 +27,18 @@ inline size_t unpacked_length(uint32_t value) {
   return size_t{1} + (value > 0xFFFFFF) + ((value & 0xFF0000) != 0) + ((value & 0xFF00) != 0);
 }
 
+// The same for values of which a zero middle byte counts.
+inline size_t packed_length(uint32_t value) {
+  return value > 0xFFFFFF ? 4u : (value & 0xFF0000) != 0 ? 3u : (value & 0xFF00) != 0 ? 2u : 1u;
+}
+
+// A character in UTF-8, by rule.
+inline uint32_t utf8_packed(uint16_t character) {
+  if (character < 0x80) return character;
+  if (character < 0x800) return 0xC080u | (character >> 6 & 0x1Fu) << 8 | (character & 0x3Fu);
+  return 0xE08080u | (character >> 12 & 0x0Fu) << 16 | (character >> 6 & 0x3Fu) << 8 | (character & 0x3Fu);
+}
+
 // Bytes of characters in UTF-8.
 inline size_t utf8_length(const uint16_t* characters, size_t count) {
   size_t length = count;

@@ -276,7 +276,7 @@ struct ShiftedReader : ByteReader {
   uint16_t decode() const {
     if (!double_byte) return page->to_unicode[*start];
     if (at - start < page->max_length) return kUnassigned;
-    return page->kind == PageKind::utf8 ? Utf8Reader::decode(start) : page->decode(start);
+    return page->decode(start);
   }
 
   Got next(uint16_t& character) {

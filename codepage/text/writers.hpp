@@ -136,23 +136,18 @@ struct ShiftedWriter : UnitWriter<uint8_t> {
 
   const CodePage* page;
   FromUnicode from;
-  bool by_rule;  // the double-byte characters are those of UTF-8
   bool double_byte;
   uint8_t* run = nullptr;  // where the double-byte run begins, behind its enter byte, when that was written here
 
   ShiftedWriter(const CodePage& code_page, uint8_t* out, size_t size, uint32_t state)
-      : UnitWriter(out, size),
-        page(&code_page),
-        from(code_page),
-        by_rule(code_page.kind == PageKind::utf8),
-        double_byte(state != 0) {}
+      : UnitWriter(out, size), page(&code_page), from(code_page), double_byte(state != 0) {}
   void advance_to(const ShiftedWriter& copy) {
     at = copy.at;
     double_byte = copy.double_byte;
     run = copy.run;
   }
-  uint32_t code(uint16_t character) const { return by_rule ? utf8_packed(character) : from.packed(character); }
-  bool stands_in(uint32_t code, uint16_t character) const { return !by_rule && from.stands_in(code, character); }
+  uint32_t code(uint16_t character) const { return from.packed(character); }
+  bool stands_in(uint32_t code, uint16_t character) const { return from.stands_in(code, character); }
   bool doubtful(uint32_t code) const { return code == from.substitution; }
   bool needs_shift(uint32_t code) const { return (code > 0xFF) != double_byte; }
   bool fits(uint32_t code) const { return room() >= unpacked_length(code) + (needs_shift(code) ? 1 : 0); }
@@ -185,13 +180,7 @@ struct ShiftedWriter : UnitWriter<uint8_t> {
     }
     return true;
   }
-  size_t fast_characters() const { return from.usual && !by_rule ? room() / (kMaxCharacterLength + 1) : 0; }
-
-  static uint32_t utf8_packed(uint16_t character) {
-    if (character < 0x80) return character;
-    if (character < 0x800) return 0xC080u | (character >> 6 & 0x1Fu) << 8 | (character & 0x3Fu);
-    return 0xE08080u | (character >> 12 & 0x0Fu) << 16 | (character >> 6 & 0x3Fu) << 8 | (character & 0x3Fu);
-  }
+  size_t fast_characters() const { return from.usual ? room() / (kMaxCharacterLength + 1) : 0; }
 
  private:
   void shift() {
@@ -208,7 +197,7 @@ struct WideWriter : UnitWriter<uint32_t> {
   WideWriter(const CodePage& code_page, uint32_t* out, size_t size)
       : UnitWriter(out, size), page(&code_page), from(code_page) {}
   uint32_t code(uint16_t character) const {
-    return page->kind == PageKind::utf8 ? ShiftedWriter::utf8_packed(character) : from.packed(character);
+    return page->kind == PageKind::utf8 ? utf8_packed(character) : from.packed(character);
   }
   bool fits(uint32_t) const { return at != end; }
   void put(uint32_t code) { *at++ = code; }

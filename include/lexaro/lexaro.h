@@ -93,12 +93,76 @@ typedef int32_t (*LXEnumUFn)(void* context, uint8_t type, const LXUChar* name);
 #define LX_INIT_NO_DEFAULTS 0x80000001u /* LXInit: never stand in with the built-in objects */
 #define LX_GET_USER 2u                  /* LXGetLocale: take the user's locale instead of the name */
 #define LX_GET_SUBSTITUTE 4u            /* LXGetLocale: replace unknown parts by English and the language's defaults */
+#define LX_NATIVE_INFO 1u               /* LXConvertNativeLocale: accepted; the values always come from the system */
+#define LX_OPT_OBJECT 1u                /* read the territory's own text instead of the locale's */
 #define LX_OPT_TERMINATE 8u             /* write and count a terminator */
 #define LX_OPT_CHARS 0x4000u            /* lengths and results count characters */
 
 #define LX_SEEK_SET 10u
 #define LX_SEEK_CUR 11u
 #define LX_SEEK_END 12u
+
+/*
+ * Items of a locale. N: a number (LXGetLocaleNumInfo); T: a text (LXGetLocaleTextInfo); s: can be set for one locale.
+ * Setting an id or the name of an object swaps that object.
+ */
+#define LX_ITEM_LANGUAGE_ID 1u            /* N s */
+#define LX_ITEM_LANGUAGE_NAME 2u          /* T s  name of the language object */
+#define LX_ITEM_LANGUAGE_ABBREVIATION 3u  /* T    ISO 639, upper case */
+#define LX_ITEM_LANGUAGE_OWN_NAME 4u      /* T    in the language itself */
+#define LX_ITEM_TERRITORY_ID 5u           /* N s */
+#define LX_ITEM_TERRITORY_NAME 6u         /* T s  name of the territory object */
+#define LX_ITEM_TERRITORY_ABBREVIATION 7u /* T    ISO 3166, three letters */
+#define LX_ITEM_TERRITORY_OWN_NAME 8u     /* T    in the territory's language */
+#define LX_ITEM_CODEPAGE_ID 9u            /* N s */
+#define LX_ITEM_CODEPAGE_NAME 10u         /* T s */
+#define LX_ITEM_SORT_ID 11u               /* N s  0: binary */
+#define LX_ITEM_SORT_NAME 12u             /* T s  "Binary" */
+#define LX_ITEM_DEFAULT_TERRITORY 13u     /* T    names of the language's default objects */
+#define LX_ITEM_DEFAULT_CODEPAGE 14u      /* T */
+#define LX_ITEM_DEFAULT_SORT 15u          /* T */
+#define LX_ITEM_DAY_1 16u                 /* T    16-22: days, Sunday first */
+#define LX_ITEM_ABDAY_1 23u               /* T    23-29: abbreviated */
+#define LX_ITEM_MON_1 30u                 /* T    30-42: months; the thirteenth is empty where there are twelve */
+#define LX_ITEM_ABMON_1 43u               /* T    43-55: abbreviated */
+#define LX_ITEM_AM 56u                    /* T */
+#define LX_ITEM_PM 57u                    /* T */
+#define LX_ITEM_TERRITORY_FLAG 58u        /* N    0 or 1 */
+#define LX_ITEM_DECIMAL 59u               /* T s  one character, as the other separators */
+#define LX_ITEM_THOUSANDS 60u             /* T s */
+#define LX_ITEM_LIST 61u                  /* T s  third separator: between the elements of a list */
+#define LX_ITEM_GROUPING 62u              /* T s  sizes of digit groups, "3;0" */
+#define LX_ITEM_FRACTION_DIGITS 63u       /* N s */
+#define LX_ITEM_CURRENCY 64u              /* T s */
+#define LX_ITEM_CURRENCY_INTL 65u         /* T    ISO 4217 */
+#define LX_ITEM_MON_DECIMAL 66u           /* T s */
+#define LX_ITEM_MON_THOUSANDS 67u         /* T s */
+#define LX_ITEM_MON_GROUPING 68u          /* T s */
+#define LX_ITEM_CURRENCY_DIGITS 69u       /* N s  fraction digits that go with item 64 */
+#define LX_ITEM_CURRENCY_INTL_DIGITS 70u  /* N s  and with item 65 */
+#define LX_ITEM_POSITIVE_SIGN 71u         /* T s */
+#define LX_ITEM_NEGATIVE_SIGN 72u         /* T s */
+#define LX_ITEM_P_CS_PRECEDES 73u         /* N s  73-76: 0 or 1; as localeconv() names them */
+#define LX_ITEM_P_SEP_BY_SPACE 74u        /* N s */
+#define LX_ITEM_N_CS_PRECEDES 75u         /* N s */
+#define LX_ITEM_N_SEP_BY_SPACE 76u        /* N s */
+#define LX_ITEM_P_SIGN_POSN 77u           /* N s  0 parentheses, 1 first, 2 last, 3 before the symbol, 4 after it */
+#define LX_ITEM_N_SIGN_POSN 78u           /* N s */
+#define LX_ITEM_TIME_FORMAT 79u           /* T s */
+#define LX_ITEM_SHORT_DATE 80u            /* T s */
+#define LX_ITEM_LONG_DATE 81u             /* T s */
+#define LX_ITEM_FLAG_82 82u               /* N s  0 or 1 */
+#define LX_ITEM_FLAG_83 83u               /* N s  0 or 1 */
+#define LX_ITEM_TERRITORY_VALUE 84u       /* N */
+#define LX_ITEM_MAX_CHAR_LENGTH 85u       /* N    bytes of the code page's longest character */
+#define LX_ITEM_ASCII_FAMILY 86u          /* N    1: ASCII; 0: EBCDIC */
+#define LX_ITEM_SHIFT_SENSITIVE 87u       /* N    1: double-byte runs stand between shift bytes */
+#define LX_ITEM_LOCALE_NAME 88u           /* T    Language_Territory.CodePage@Sort */
+
+/* Forms of a text (LXLocaleGetTextItem). */
+#define LX_FORM_UCS2 1u     /* LXUChar, terminated */
+#define LX_FORM_CODEPAGE 2u /* bytes of the locale's code page */
+#define LX_FORM_NAME 3u     /* ASCII */
 
 /* Character type bits (LXCharType.flags). */
 #define LX_CT_ALPHA 0x001u
@@ -244,10 +308,85 @@ LX_API uint32_t LXSetLocaleU(const LXUChar* name, uint32_t options) LX_NOEXCEPT;
 /* Name of the user's locale: 1 from LX_LANG (cut, perhaps unterminated, when it does not fit), 2 from the system's
    locale, 0 on failure. Set-up time only, as LX_GET_USER. */
 LX_API int32_t LXGetUserLocale(char* buffer, int32_t buffer_size) LX_NOEXCEPT;
+
+/*
+ * An item that is a number. source 0: as the locale has it; 1: as its territory defines it. -1 with LX_E_ARGUMENT
+ * (source) or LX_E_ITEM.
+ */
+LX_API int32_t LXGetLocaleNumInfo(LXLocale* locale, uint32_t item, uint32_t source) LX_NOEXCEPT;
+/*
+ * Sets it for this locale; the value then survives a change of the territory. Digit counts (63, 69, 70) are taken
+ * modulo 65536. 1, or 0 with LX_E_ITEM, LX_E_NOTFOUND (no such object, value out of range) or LX_E_MEMORY.
+ */
+LX_API int32_t LXSetLocaleNumInfo(LXLocale* locale, uint32_t item, int32_t value) LX_NOEXCEPT;
+
+/*
+ * Where the text of an item is, and its form. use_locale 0: the territory's own text. Separators of form 2 are one
+ * byte, not terminated. Null and form 0: unknown item, or LX_ITEM_LOCALE_NAME, which is stored nowhere. Valid until the
+ * item or the locale changes. `form` is optional.
+ */
+LX_API const void* LXLocaleGetTextItem(LXLocale* locale, uint32_t item, int32_t use_locale, uint32_t* form) LX_NOEXCEPT;
+/* The same as UCS-2, always terminated. Names and separators stand in a buffer of the thread until its next call. */
+LX_API const LXUChar* LXLocaleGetTextItemU(LXLocale* locale, uint32_t item, int32_t use_locale,
+                                           uint32_t* form) LX_NOEXCEPT;
+/*
+ * Copies the text of an item, cut to whole characters, and terminates it. Returns the units written with the
+ * terminator (size 0: 0); LX_OPT_CHARS: size and result count characters. options: LX_OPT_OBJECT, LX_OPT_CHARS.
+ * -1 with LX_E_ARGUMENT, LX_E_ITEM, or LX_E_NOTFOUND (a default object that the directory lacks).
+ */
+LX_API int32_t LXGetLocaleTextInfo(LXLocale* locale, uint32_t item, char* buffer, int32_t size,
+                                   uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXGetLocaleTextInfoW(LXLocale* locale, uint32_t item, LXWChar* buffer, int32_t size,
+                                    uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXGetLocaleTextInfoU(LXLocale* locale, uint32_t item, LXUChar* buffer, int32_t size,
+                                    uint32_t options) LX_NOEXCEPT;
+/* In a code page of choice (null: the locale's), with shift bytes; begins and ends in the single-byte state. */
+LX_API int32_t LXGetLocaleTextInfoEx(LXLocale* locale, uint32_t item, char* buffer, int32_t size,
+                                     const LXObjEntry* code_page, uint32_t options) LX_NOEXCEPT;
+/*
+ * Sets the text of an item for this locale, or swaps the object of that name. options: 0 or LX_OPT_CHARS (length counts
+ * characters). Length 0 and the empty text change nothing; an empty separator is set as one zero byte (60 and 67 only).
+ * A separator is one byte, no digit, and differs from its partner (59 and 60, 66 and 67).
+ * 1, or 0 with LX_E_ARGUMENT, LX_E_ITEM, LX_E_NOTFOUND (value refused, no such object) or LX_E_MEMORY.
+ */
+LX_API int32_t LXSetLocaleTextInfo(LXLocale* locale, uint32_t item, const char* text, int32_t length,
+                                   uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXSetLocaleTextInfoW(LXLocale* locale, uint32_t item, const LXWChar* text, int32_t length,
+                                    uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXSetLocaleTextInfoU(LXLocale* locale, uint32_t item, const LXUChar* text, int32_t length,
+                                    uint32_t options) LX_NOEXCEPT;
+/* The text is in a code page of choice (null: the locale's), with shift bytes. */
+LX_API int32_t LXSetLocaleTextInfoEx(LXLocale* locale, uint32_t item, const char* text, int32_t length,
+                                     const LXObjEntry* code_page, uint32_t options) LX_NOEXCEPT;
+/* "Language_Territory.CodePage@Sort" in buffer[136]; returns its length without the terminator, -1 without a locale. */
+LX_API int32_t LXLocaleGetLocaleString(LXLocale* locale, char* buffer) LX_NOEXCEPT;
+
 /* Fills every value of the locale that was not set explicitly from its territory: 0 or LX_E_MEMORY. */
 LX_API uint32_t LXLocaleSetModifiable(LXLocale* locale) LX_NOEXCEPT;
+/* Another territory or code page for the locale; values set explicitly stay. 0, or LX_E_MEMORY for any failure, after
+   which the locale is as before. The entry must be loaded. */
+LX_API uint32_t LXLocaleChangeTerritory(LXLocale* locale, LXObjEntry* territory) LX_NOEXCEPT;
+LX_API uint32_t LXLocaleChangeCodePage(LXLocale* locale, LXObjEntry* code_page) LX_NOEXCEPT;
+/* Frees the texts of `drop` that are not shared with `keep`. */
+LX_API void LXLocaleFreeOldText(const LXLocale* keep, LXLocale* drop) LX_NOEXCEPT;
+/* A new copy of the text in another code page, freed with lxfree_cbk; null: no memory, or no such code page. */
+LX_API char* LXLocaleCnvText(const LXObjEntry* from, const LXObjEntry* to, const char* text) LX_NOEXCEPT;
+
 /* Locale name for a system locale name such as "de_CH"; unknown parts read "Unknown". Returns buffer. */
 LX_API char* LXMapNativeLocale(const char* native_name, char* buffer, int32_t size) LX_NOEXCEPT;
+/*
+ * A new locale for a system locale name, with the values that the system defines for it. options: LX_NATIVE_INFO,
+ * LX_GET_SUBSTITUTE. Null with rc LX_E_ARGUMENT or a status of LXGetLocale. Set-up time only, as LX_GET_USER.
+ */
+LX_API LXLocale* LXConvertNativeLocale(const char* native_name, uint32_t options, uint32_t* rc) LX_NOEXCEPT;
+/*
+ * The system's name of the locale in buffer[12]. options: LX_GET_SUBSTITUTE (the nearest name, where there is no
+ * exact one), LX_NATIVE_INFO. 1, or 0 with LX_E_NATIVE or LX_E_ARGUMENT.
+ */
+LX_API int32_t LXConvertLocale(LXLocale* locale, char* buffer, uint32_t options) LX_NOEXCEPT;
+/* Takes the values that the system defines for the named locale (empty: the user's) over into the locale; an unknown
+   name changes nothing. `flag` is not consulted. Set-up time only, as LX_GET_USER. */
+LX_API void LXMapNativeInfo(const char* native_name, LXLocale* locale, uint32_t flag) LX_NOEXCEPT;
 /* Calls back for every object of the directory, in its order, until the callback returns 0. Returns 0. */
 LX_API int32_t LXEnumLocales(LXEnumFn callback, void* context, uint32_t reserved) LX_NOEXCEPT;
 LX_API int32_t LXEnumLocalesW(LXEnumWFn callback, void* context, uint32_t reserved) LX_NOEXCEPT;
@@ -355,6 +494,47 @@ LX_API int32_t LXComStrToUnicode(LXUChar* out, int32_t out_size, const char* in,
 LX_API int32_t LXComUnicodeToStr(char* out, int32_t out_size, const LXUChar* in, int32_t in_length,
                                  uint32_t flags) LX_NOEXCEPT;
 
+/* ---- Unicode tables ---- */
+
+/*
+ * What the library knows about UCS-2 characters, beginning with the character named behind each array. Characters
+ * outside follow rules.
+ */
+
+/* Type words: LX_CT_ bits; from bit 10 one bit for the direction; from bit 22 bits for the form. Unassigned: 0x400. */
+extern LX_API const uint32_t LX_UNICODE_Ctype1[1786]; /* U+0000 */
+extern LX_API const uint32_t LX_UNICODE_Ctype2[1501]; /* U+0901 */
+extern LX_API const uint32_t LX_UNICODE_Ctype3[346];  /* U+10A0 */
+extern LX_API const uint32_t LX_UNICODE_Ctype4[1024]; /* U+1E00 */
+extern LX_API const uint32_t LX_UNICODE_Ctype5[1229]; /* U+22F2 */
+extern LX_API const uint32_t LX_UNICODE_Ctype6[1023]; /* U+3000 */
+extern LX_API const uint32_t LX_UNICODE_Ctype7[211];  /* U+FB00 */
+extern LX_API const uint32_t LX_UNICODE_Ctype8[706];  /* U+FD3E */
+/* Lower case; the character itself where it has none. */
+extern LX_API const uint16_t LX_UNICODE_Lower1[255]; /* U+0100 */
+extern LX_API const uint16_t LX_UNICODE_Lower2[118]; /* U+0200 */
+extern LX_API const uint16_t LX_UNICODE_Lower3[111]; /* U+0380 */
+extern LX_API const uint16_t LX_UNICODE_Lower4[249]; /* U+0400 */
+extern LX_API const uint16_t LX_UNICODE_Lower5[249]; /* U+1E00 */
+extern LX_API const uint16_t LX_UNICODE_Lower6[253]; /* U+1F00 */
+/* Upper case. */
+extern LX_API const uint16_t LX_UNICODE_Upper1[256]; /* U+0100 */
+extern LX_API const uint16_t LX_UNICODE_Upper2[147]; /* U+0200 */
+extern LX_API const uint16_t LX_UNICODE_Upper3[82];  /* U+03A0 */
+extern LX_API const uint16_t LX_UNICODE_Upper4[202]; /* U+0430 */
+extern LX_API const uint16_t LX_UNICODE_Upper5[250]; /* U+1E00 */
+extern LX_API const uint16_t LX_UNICODE_Upper6[244]; /* U+1F00 */
+/* Full-width form. */
+extern LX_API const uint16_t LX_UNICODE_H2F1[16];  /* U+00A0 */
+extern LX_API const uint16_t LX_UNICODE_H2F2[143]; /* U+FF60 */
+/* Half-width form. */
+extern LX_API const uint16_t LX_UNICODE_F2H1[204]; /* U+2500 */
+extern LX_API const uint16_t LX_UNICODE_F2H2[253]; /* U+3000 */
+extern LX_API const uint16_t LX_UNICODE_F2H3[53];  /* U+3130 */
+extern LX_API const uint16_t LX_UNICODE_F2H4[7];   /* U+FFE0 */
+/* Digits in ascending order, each with the ASCII digit that it stands for. */
+extern LX_API const uint16_t LXDigits[179][2];
+
 /* ---- Extensions ---- */
 
 LX_API const char* LXVersion(void) LX_NOEXCEPT; /* "1.0.0" */
@@ -368,6 +548,10 @@ LX_API const char* LXGetObjName(const LXObjEntry* entry) LX_NOEXCEPT;
 /* Calls back with every alias and its code page, in the order of alias.txt, until the callback returns 0. Returns 0. */
 typedef int32_t (*LXEnumAliasFn)(void* context, const char* alias, const char* code_page);
 LX_API int32_t LXEnumAliases(LXObjMgr* manager, LXEnumAliasFn callback, void* context) LX_NOEXCEPT;
+/* Calls back with every native name that LXMapNativeLocale knows and the locale it means, until the callback returns 0.
+   Returns 0. */
+typedef int32_t (*LXEnumNativeFn)(void* context, const char* native_name, const char* locale_name);
+LX_API int32_t LXEnumNativeNames(LXEnumNativeFn callback, void* context) LX_NOEXCEPT;
 
 typedef struct LXCodePageInfo {
   uint16_t id;

@@ -3,72 +3,12 @@
 // caller has as it was.
 #include <gtest/gtest.h>
 
-#include <functional>
-
-#include "frame/records.hpp"
-#include "support/counting_allocator.hpp"
+#include "faults/each_allocation.hpp"
 #include "support/environment.hpp"
-#include "support/object_builder.hpp"
 #include "support/session.hpp"
 
 namespace lx::test {
 namespace {
-
-const DataDirectory& small_directory() {
-  static const DataDirectory directory;
-  static const bool written = [] { return write_small_directory(directory), true; }();
-  return written ? directory : directory;
-}
-
-constexpr uint32_t kFailed = 0xFFFF;
-
-// `call` returns its status, or kFailed where there is none; `undo` frees what a successful call has made.
-struct Operation {
-  const char* name;
-  std::function<uint32_t()> call;
-  std::function<void()> undo = [] {};
-  uint32_t failure = LX_E_MEMORY;
-  std::function<void()> after_failure = [] {};
-};
-
-// Every allocation of the call fails once, alone or with all behind it; each time in a new library.
-void fail_each_allocation(
-    const Operation& operation, const std::function<void()>& prepare = [] {},
-    const std::function<void()>& clean_up = [] {}) {
-  for (bool all_after : {false, true}) {
-    bool failed = true;
-    int failures = 0;
-    for (int n = 0; failed; ++n) {
-      SCOPED_TRACE(std::string(operation.name) + ", allocation " + std::to_string(n) + (all_after ? " and on" : ""));
-      CountingAllocator allocator;
-      ASSERT_EQ(allocator.init(small_directory().path(), LX_INIT_NO_DEFAULTS), LX_OK);
-      prepare();
-      int before = allocator.live;
-      allocator.arm(n, all_after);
-      uint32_t status = operation.call();
-      failed = allocator.has_failed();
-      allocator.disarm();
-      EXPECT_EQ(status, failed ? operation.failure : LX_OK);
-      if (status == LX_OK) {
-        operation.undo();
-      } else {
-        ++failures;
-        operation.after_failure();
-        if (n == 0) {
-          EXPECT_EQ(allocator.live, before);
-        }
-        // With memory it works.
-        EXPECT_EQ(operation.call(), LX_OK);
-        operation.undo();
-      }
-      clean_up();
-      EXPECT_EQ(LXTerm(), LX_OK);
-      ASSERT_EQ(allocator.live, 0);
-      ASSERT_LT(n, 1000);
-    }
-    EXPECT_GT(failures, 0) << operation.name << " takes no memory";
-  }
-}
 
 constexpr char kName[] = "German_Germany.Small@BINARY";
 const LXWChar kWideName[] = {'G', 'e', 'r', 'm', 'a', 'n', '.', 't', 'i', 'n', 'y', 0};
@@ -139,24 +79,6 @@ TEST(Allocation, OfConversions) {
        },
        [] { EXPECT_EQ(LXCloseConversion(std::exchange(g_conversion, nullptr)), LX_OK); }},
       [] { g_locale = LXGetLocale(kName, 0, nullptr); }, release_locale);
-}
-
-std::string texts_of(const LXLocale& locale) {
-  std::string all;
-  for (const char* text : locale.strings) all += (text != nullptr ? text : "null") + std::string("|");
-  return all;
-}
-
-TEST(Allocation, OfTheTextsOfALocale) {
-  static std::string texts;
-  auto same = [] { EXPECT_EQ(texts_of(*g_locale), texts); };
-  fail_each_allocation(
-      {"LXLocaleSetModifiable", [] { return LXLocaleSetModifiable(g_locale); }, same, LX_E_MEMORY, same},
-      [] {
-        g_locale = LXGetLocale(kName, 0, nullptr);
-        texts = texts_of(*g_locale);
-      },
-      release_locale);
 }
 
 TEST(Allocation, OfFiles) {
@@ -264,29 +186,6 @@ TEST(Allocation, OfObjectsThatHaveStandIns) {
     if (g_locale != nullptr) {
       char out[16];
       EXPECT_EQ(LXConvertString(g_locale, out, 16, g_locale, "abc", 3, 0), 3);
-    }
-    release_locale();
-    EXPECT_EQ(LXTerm(), LX_OK);
-    ASSERT_EQ(allocator.live, 0);
-  }
-}
-
-// The system's values are an extra: without memory for them the locale keeps its territory's.
-TEST(Allocation, OfTheUsersLocale) {
-  Variable lang("LX_LANG", nullptr);
-  Variable all("LC_ALL", "C");
-  bool failed = true;
-  for (int n = 0; failed; ++n) {
-    SCOPED_TRACE(n);
-    CountingAllocator allocator;
-    ASSERT_EQ(allocator.init(small_directory().path(), LX_INIT_NO_DEFAULTS), LX_OK);
-    allocator.arm(n, n % 2 == 1);
-    g_locale = LXGetLocale(nullptr, LX_GET_USER, &g_rc);
-    failed = allocator.has_failed();
-    allocator.disarm();
-    EXPECT_EQ(got_locale(), g_locale != nullptr ? LX_OK : LX_E_MEMORY);
-    if (g_locale != nullptr) {
-      EXPECT_EQ(texts_of(*g_locale).find("null"), std::string::npos);
     }
     release_locale();
     EXPECT_EQ(LXTerm(), LX_OK);

@@ -60,8 +60,7 @@ TEST(DefaultLocale, ReleaseReportsTheFreeCallback) {
   EXPECT_EQ(allocator.live, 0);
 }
 
-// ---- The user's locale
-// ------------------------------------------------------------------------------------------------
+// ---- The user's locale ----------------------------------------------------------------------------------------------
 
 class UserLocaleTest : public testing::Test {
  protected:

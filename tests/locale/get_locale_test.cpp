@@ -164,8 +164,7 @@ TEST(GetLocale, FlagsOfTheCodePage) {
   }
 }
 
-// ---- Directories of our own
-// -------------------------------------------------------------------------------------------
+// ---- Directories of our own -----------------------------------------------------------------------------------------
 
 TEST(GetLocale, ObjectNamesGoBeforeAliases) {
   DataDirectory directory;

@@ -1,48 +1,40 @@
 // SPDX-License-Identifier: Apache-2.0
-// What the system's locale names mean here.
+// What the system's locale names mean here, and the system's names for locales.
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <set>
+
+#include "locale/native_rows.hpp"
+#include "support/locale_source.hpp"
+#include "support/object_builder.hpp"
 #include "support/session.hpp"
 
 namespace lx::test {
 namespace {
 
-TEST(NativeLocale, Names) {
+// ---- From names of the system ---------------------------------------------------------------------------------------
+
+TEST(NativeNames, Mapped) {
   struct Case {
     const char* native;
-    const char* name;
+    std::string name;
   };
-  const Case cases[] = {
-      {"C", "English_UnitedStates.US-ASCII@Binary"},
-      {"POSIX", "English_UnitedStates.US-ASCII@Binary"},
-      {"de", "German_Germany.Latin1@Default"},
-      {"de_CH", "German_German-Switzerland.Latin1@Default"},
-      {"es_CO", "Spanish_Columbia.Latin1@Spanish"},
-      {"en_US", "English_UnitedStates.Latin1@Default"},
-      {"en_US.utf-8", "English_UnitedStates.UTF-8@Default"},
-      {"en_US.UTF-8", "Unknown"},
-      {"en_UK", "English_UnitedKingdom.Latin1@Default"},
+  std::vector<Case> cases = {
+      {"en_US.UTF-8", "Unknown"},  // though it is the system's name for that locale
       {"en_GB", "Unknown"},
-      {"fr_CA", "CanadianFrench_French-Canada.Latin1@Default"},
-      {"iso_8859_1", "English_UnitedStates.Latin1@Binary"},
-      {"ja", "Japanese_Japan.JapanEUC@Binary"},
-      {"japanese", "Japanese_Japan.JapanEUC@Binary"},
-      {"ja_JP.PCK", "Japanese_Japan.MS932@Binary"},
-      {"ko.UTF-8", "Korean_Korea.UTF-8@Binary"},
-      {"et", "Estonian_Estonia.ISO-8859-2@Czech"},
-      {"no", "Norwegian_Norway.Latin1@Danish"},
-      {"su", "Finnish_Finland.Latin1@Finnish"},
-      {"tw", "TraditionalChinese_Taiwan.EUC-TW@Binary"},
-      {"zh_TW.BIG5", "TraditionalChinese_Taiwan.MS950@Binary"},
-      {"zh", "SimplifiedChinese_China.MS936@Binary"},
       {"", "Unknown"},
       {"c", "Unknown"},
-      {"de_", "Unknown"},
       {"DE", "Unknown"},
+      {"de_", "Unknown"},
+      {"de_CH.utf8", "Unknown"},
+      {"en_US.utf-8x", "Unknown"},
       {"LC_CTYPE=C;LC_NUMERIC=de_CH", "Unknown"},
+      {"es_CO", "Spanish_Columbia.Latin1@Spanish"},
       // A name for each category: code page, territory, language, sort.
       {"/ja/C/de/C/C/C", "German_UnitedStates.JapanEUC@Binary"},
       {"/de_CH/fr/es/it", "Spanish_France.Latin1@Default"},
+      {"/en_US.utf-8/ja_JP.PCK/ko.UTF-8/et", "Korean_Japan.UTF-8@Czech"},
       {"/ja/C/de", "German_UnitedStates.JapanEUC@Unknown"},
       {"/ja", "Unknown_Unknown.JapanEUC@Unknown"},
       {"/", "Unknown_Unknown.Unknown@Unknown"},
@@ -50,21 +42,12 @@ TEST(NativeLocale, Names) {
       {"/xx/C/de/C", "German_UnitedStates.Unknown@Binary"},
       {"/japanesex/C/d/C", "Unknown_UnitedStates.Unknown@Binary"},
   };
+  for (const NativeRow& row : kNativeRows) cases.push_back({row.native, row.locale_name()});
   for (const Case& one : cases) {
-    Guarded buffer(132);
-    EXPECT_EQ(LXMapNativeLocale(one.native, buffer.data(), 132), buffer.data());
-    EXPECT_STREQ(buffer.data(), one.name) << one.native;
-  }
-}
-
-TEST(NativeLocale, NameIsCutToItsRoom) {
-  for (const char* native : {"de_CH", "xx", "/de/de/de/de"}) {
-    char whole[132];
-    LXMapNativeLocale(native, whole, sizeof whole);
-    for (int32_t size : {1, 2, 7, 8, 9, 40}) {
-      Guarded buffer(static_cast<size_t>(size));
-      EXPECT_EQ(LXMapNativeLocale(native, buffer.data(), size), buffer.data());
-      EXPECT_EQ(std::string(buffer.data()), std::string(whole).substr(0, static_cast<size_t>(size - 1))) << native;
+    for (size_t size = 1; size <= one.name.size() + 2; ++size) {
+      Guarded buffer(size);
+      EXPECT_EQ(LXMapNativeLocale(one.native, buffer.data(), static_cast<int32_t>(size)), buffer.data());
+      EXPECT_EQ(std::string(buffer.data()), one.name.substr(0, size - 1)) << one.native;
     }
   }
   char kept[] = "kept";
@@ -75,23 +58,196 @@ TEST(NativeLocale, NameIsCutToItsRoom) {
   EXPECT_EQ(LXMapNativeLocale("C", nullptr, 5), nullptr);
 }
 
-// Every name of a locale that is mapped is one that the data has, or the user gets no locale.
-TEST(NativeLocale, LanguagesAndTerritoriesExist) {
-  Session session;
-  for (const char* native :
-       {"C",     "da",    "de",    "de_AT", "de_CH",      "el",    "en_AU",     "en_CA", "en_IE",    "en_NZ",
-        "en_UK", "en_US", "es",    "es_AR", "es_BO",      "es_CL", "es_CO",     "es_CR", "es_EC",    "es_GT",
-        "es_MX", "es_NI", "es_PA", "es_PE", "es_PY",      "es_SV", "es_UY",     "es_VE", "et",       "fr",
-        "fr_BE", "fr_CA", "fr_CH", "hu",    "it",         "ja",    "ja_JP.PCK", "ko",    "ko.UTF-8", "lt",
-        "lv",    "nl",    "nl_BE", "no",    "pl",         "pt",    "pt_BR",     "ru",    "su",       "sv",
-        "tr",    "tw",    "zh",    "zh_TW", "zh_TW.BIG5", "cz"}) {
-    char name[132];
-    LXMapNativeLocale(native, name, sizeof name);
-    std::string without_sort(name, std::string_view(name).find('@'));
-    uint32_t rc = 99;
-    Locale locale(LXGetLocale((without_sort + "@BINARY").c_str(), 0, &rc));
-    EXPECT_NE(locale, nullptr) << native << " " << name << " " << rc;
+TEST(NativeNames, Listed) {
+  struct Listing {
+    std::string text;
+    int left;
+  };
+  auto note = [](void* context, const char* native, const char* name) -> int32_t {
+    auto& listing = *static_cast<Listing*>(context);
+    listing.text += std::string(native) + "=" + name + " ";
+    return --listing.left;
+  };
+  for (int count : {1, 2, 60, 100}) {
+    std::string wanted;
+    for (int i = 0; i < count && i < 60; ++i) {
+      wanted += kNativeRows[i].native + std::string("=") + kNativeRows[i].locale_name() + " ";
+    }
+    Listing listing{"", count};
+    EXPECT_EQ(LXEnumNativeNames(note, &listing), 0);
+    EXPECT_EQ(listing.text, wanted);
   }
+  EXPECT_EQ(LXEnumNativeNames(nullptr, nullptr), 0);
+}
+
+// ---- To names of the system -----------------------------------------------------------------------------------------
+
+struct IdRow {
+  int32_t ids[4];  // language, territory, code page, sort
+  const char* native;
+};
+constexpr IdRow kIdRows[] = {
+    {{1, 840, 367, 0}, "C"},           {{1, 840, 819, 1}, "en_US"},  {{1, 840, 57352, 1}, "en_US.UTF-8"},
+    {{1, 36, 819, 1}, "en_AU"},        {{1, 124, 819, 1}, "en_CA"},  {{1, 826, 819, 1}, "en_UK"},
+    {{2, 40, 819, 1}, "de_AT"},        {{2, 276, 819, 1}, "de"},     {{2, 756, 819, 1}, "de_CH"},
+    {{3, 57, 819, 1}, "fr_BE"},        {{3, 250, 819, 1}, "fr"},     {{3, 757, 819, 1}, "fr_CH"},
+    {{4, 724, 819, 2}, "es"},          {{4, 32, 819, 2}, "es_AR"},   {{4, 152, 819, 2}, "es_CL"},
+    {{4, 484, 819, 2}, "es_MX"},       {{5, 380, 819, 1}, "it"},     {{6, 76, 819, 1}, "pt_BR"},
+    {{6, 620, 819, 1}, "pt"},          {{7, 578, 819, 4}, "no"},     {{8, 752, 819, 5}, "sv"},
+    {{9, 208, 819, 4}, "da"},          {{10, 246, 819, 6}, "su"},    {{11, 392, 954, 0}, "ja"},
+    {{11, 392, 932, 0}, "ja_JP.PCK"},  {{12, 125, 819, 1}, "fr_CA"}, {{13, 158, 964, 0}, "zh_TW"},
+    {{13, 158, 949, 0}, "zh_TW.BIG5"}, {{14, 156, 936, 0}, "zh"},    {{21, 203, 912, 8}, "cz"},
+    {{22, 56, 819, 1}, "nl_BE"},       {{22, 528, 819, 1}, "nl"},    {{23, 233, 819, 9}, "et"},
+    {{25, 300, 813, 1}, "el"},         {{27, 348, 912, 10}, "hu"},   {{28, 410, 57352, 0}, "ko.UTF-8"},
+    {{28, 410, 949, 0}, "ko"},         {{29, 428, 57346, 11}, "lv"}, {{30, 442, 57346, 12}, "lt"},
+    {{33, 643, 915, 1}, "ru"},         {{39, 792, 920, 17}, "tr"},
+};
+
+// The shipped objects together with sorts of the names that the system's locales ask for.
+class NativeLocales : public testing::Test {
+ protected:
+  static constexpr std::pair<uint16_t, const char*> kSorts[] = {
+      {1, "Default"},  {2, "Spanish"},    {4, "Danish"},   {5, "Swedish"},     {6, "Finnish"}, {8, "Czech"},
+      {9, "Estonian"}, {10, "Hungarian"}, {11, "Latvian"}, {12, "Lithuanian"}, {17, "Turkish"}};
+
+  static int32_t note(void* context, uint8_t type, const char* name) {
+    LXObjEntry* entry = LXGetObjFromName(LXGetObjManager(), type, name, -1, 1, nullptr);
+    static_cast<std::vector<ObjectRecord>*>(context)->push_back({type, LXGetObjId(entry), name});
+    return 1;
+  }
+  void SetUp() override {
+    std::vector<ObjectRecord> records;
+    ASSERT_EQ(LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, 0), LX_OK);
+    LXEnumLocales(note, &records, 0);
+    LXTerm();
+    std::erase_if(records, [](const ObjectRecord& record) { return record.type == LX_SORT; });
+    for (const auto& [id, name] : kSorts) records.push_back({LX_SORT, id, name});
+    directory_.write_control(records);
+    for (const ObjectRecord& record : records) {
+      const std::string name = directory_.object_name(record.type, record.id);
+      if (record.type == LX_SORT) {
+        directory_.write(name, object_file({Bytes(1036)}));
+      } else {
+        std::filesystem::create_symlink(std::string(LEXARO_DATA) + "/" + name, directory_.file(name));
+      }
+    }
+    ASSERT_EQ(LXInit(directory_.path(), nullptr, nullptr, nullptr, 0), LX_OK);
+  }
+  void TearDown() override { LXTerm(); }
+
+  DataDirectory directory_;
+};
+
+std::string full_name(LXLocale* locale) {
+  char name[136];
+  return LXLocaleGetLocaleString(locale, name) > 0 ? name : "";
+}
+
+TEST_F(NativeLocales, FromAllNames) {
+  for (const NativeRow& row : kNativeRows) {
+    for (uint32_t options : {0u, LX_NATIVE_INFO, LX_GET_SUBSTITUTE, LX_NATIVE_INFO | LX_GET_SUBSTITUTE}) {
+      uint32_t rc = 99;
+      Locale locale(LXConvertNativeLocale(row.native, options, &rc));
+      ASSERT_NE(locale, nullptr) << row.native << rc;
+      EXPECT_EQ(rc, LX_OK);
+      EXPECT_EQ(full_name(locale.get()), row.locale_name());
+    }
+  }
+  Locale composite(LXConvertNativeLocale("/ja/C/de/C/C/C", 0, nullptr));
+  EXPECT_EQ(full_name(composite.get()), "German_UnitedStates.JapanEUC@Binary");
+  for (const char* unknown : {"en_US.UTF-8", "", "/xx/C/xx/C"}) {
+    uint32_t rc = 99;
+    EXPECT_EQ(LXConvertNativeLocale(unknown, 0, &rc), nullptr);
+    EXPECT_EQ(rc, LX_E_LANGUAGE) << unknown;
+    Locale locale(LXConvertNativeLocale(unknown, LX_GET_SUBSTITUTE, &rc));
+    EXPECT_EQ(full_name(locale.get()), "English_UnitedStates.Latin1@Binary") << unknown;
+  }
+  for (uint32_t options : {2u, 8u, 6u, 0x80000000u}) {
+    uint32_t rc = 99;
+    EXPECT_EQ(LXConvertNativeLocale("C", options, &rc), nullptr);
+    EXPECT_EQ(rc, LX_E_ARGUMENT);
+  }
+  uint32_t rc = 99;
+  Locale of_none(LXConvertNativeLocale(nullptr, 0, &rc));
+  EXPECT_EQ(of_none == nullptr, rc != LX_OK);
+}
+
+// The row that a locale has, or with substitution the nearest: the first that agrees in as many parts, from the left.
+const char* native_name(const int32_t (&ids)[4], bool substitute) {
+  std::vector<const IdRow*> rows;
+  for (const IdRow& row : kIdRows) rows.push_back(&row);
+  for (size_t part = 0; part < 4; ++part) {
+    const IdRow* first = rows[0];
+    std::erase_if(rows, [&](const IdRow* row) { return row->ids[part] != ids[part]; });
+    if (rows.empty()) return substitute ? first->native : nullptr;
+  }
+  return rows[0]->native;
+}
+
+std::string converted(LXLocale* locale, uint32_t options) {
+  Guarded buffer(12);
+  if (LXConvertLocale(locale, buffer.data(), options) == 1) {
+    EXPECT_EQ(LXGetError(locale), LX_OK);
+    return buffer.data();
+  }
+  return std::to_string(LXGetError(locale));
+}
+
+TEST_F(NativeLocales, ToNames) {
+  std::set<int32_t> pages = {37}, sorts = {0};
+  for (const IdRow& row : kIdRows) pages.insert(row.ids[2]);
+  for (const auto& [id, name] : kSorts) sorts.insert(id);
+  Locale locale(LXGetLocale("English_UnitedStates.US-ASCII@BINARY", 0, nullptr));
+  int32_t before = 0;
+  for (const IdRow& row : kIdRows) {
+    // All pages and sorts of the row, and once of each language a territory that it does not have.
+    for (int32_t territory : {row.ids[1], row.ids[0] != before ? 372 : 0}) {
+      for (int32_t page : pages) {
+        for (int32_t sort : sorts) {
+          if (territory == 0 || (page != row.ids[2] && sort > 1)) continue;
+          const int32_t ids[4] = {row.ids[0], territory, page, sort};
+          const uint32_t items[] = {1, 5, 9, 11};
+          for (size_t i = 0; i < 4; ++i) ASSERT_EQ(LXSetLocaleNumInfo(locale.get(), items[i], ids[i]), 1) << ids[i];
+          const char* exact = native_name(ids, false);
+          for (uint32_t option : {0u, LX_NATIVE_INFO}) {
+            EXPECT_EQ(converted(locale.get(), option), exact != nullptr ? exact : "32") << full_name(locale.get());
+            EXPECT_EQ(converted(locale.get(), option | LX_GET_SUBSTITUTE), native_name(ids, true));
+          }
+        }
+      }
+    }
+    before = row.ids[0];
+  }
+  EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_LANGUAGE_ID, 31), 1);  // a language without any name
+  EXPECT_EQ(converted(locale.get(), 0), "32");
+  EXPECT_EQ(converted(locale.get(), LX_GET_SUBSTITUTE), "C");
+}
+
+TEST_F(NativeLocales, BadArguments) {
+  Locale locale(LXGetLocale("English_UnitedStates.US-ASCII@BINARY", 0, nullptr));
+  for (uint32_t options : {2u, 8u, 6u, 0x80000000u}) EXPECT_EQ(converted(locale.get(), options), "2");
+  EXPECT_EQ(LXConvertLocale(locale.get(), nullptr, 0), 0);
+  EXPECT_EQ(LXGetError(locale.get()), LX_E_ARGUMENT);
+  char kept[12] = "kept";
+  EXPECT_EQ(LXConvertLocale(nullptr, kept, 0), 0);
+  EXPECT_STREQ(kept, "kept");
+  ASSERT_EQ(LXSetLocale("English_UnitedStates.UTF-8@Default", 0), LX_OK);
+  EXPECT_EQ(converted(nullptr, 0), "en_US.UTF-8");
+}
+
+// Sorts are objects like all others.
+TEST_F(NativeLocales, SortsCanBeSet) {
+  Locale locale(LXGetLocale("German_Germany.Latin1@BINARY", 0, nullptr));
+  EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_SORT_ID, 17), 1);
+  EXPECT_EQ(full_name(locale.get()), "German_Germany.Latin1@Turkish");
+  EXPECT_EQ(LXSetLocaleTextInfo(locale.get(), LX_ITEM_SORT_NAME, "dEFAULT", -1, 0), 1);
+  EXPECT_EQ(full_name(locale.get()), "German_Germany.Latin1@Default");
+  EXPECT_EQ(LXGetLocaleNumInfo(locale.get(), LX_ITEM_SORT_ID, 1), 1);
+  EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_SORT_ID, 3), 0);
+  EXPECT_EQ(LXGetError(locale.get()), LX_E_NOTFOUND);
+  EXPECT_EQ(full_name(locale.get()), "German_Germany.Latin1@Default");
+  EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_SORT_ID, 0), 1);
+  EXPECT_EQ(full_name(locale.get()), "German_Germany.Latin1@Binary");
 }
 
 }  // namespace

@@ -120,6 +120,7 @@ TEST_F(LoadingTest, FileThatIsBroken) {
       {"no enter byte", LX_CODEPAGE, with1(mixed, 8, 0), LX_E_HEADER},
       {"no leave byte", LX_CODEPAGE, with1(mixed, 9, 0), LX_E_HEADER},
       {"shift bytes alike", LX_CODEPAGE, with1(mixed, 9, 0x0E), LX_E_HEADER},
+      {"three bytes between shift bytes", LX_CODEPAGE, with1(mixed, 5, 3), LX_E_HEADER},
       {"older layout too small", LX_CODEPAGE, with(with(old_single, 10, 0x11), 11, 0x09), LX_E_HEADER},
       {"older layout, table before the variable part", LX_CODEPAGE, with1(old, 4364, 0), LX_E_HEADER},
       {"older layout without types", LX_CODEPAGE, with1(with1(old, 4366, 0), 4367, 0), LX_OK},
@@ -270,19 +271,19 @@ TEST(OlderLayout, SingleBytePage) {
 // A mixed page of the older layout has nowhere to name its shift bytes: they are those of the hosts.
 TEST(OlderLayout, ShiftBytes) {
   Bytes file = multibyte_page_file(true);
-  file[76 + 4361] = 1 | 2;
-  DataDirectory directory;
-  write_small_directory(directory);
-  directory.write_object(LX_CODEPAGE, 902, file);
-  Session session(directory.path());
-  uint32_t rc = 0;
-  LXObjEntry* page = LXGetObjFromName(LXGetObjManager(), LX_CODEPAGE, "OldSmall", -1, 0, &rc);
-  ASSERT_EQ(rc, LX_OK);
-  LXCodePageInfo info;
-  ASSERT_EQ(LXGetCodePageInfo(page, &info), LX_OK);
-  EXPECT_EQ(info.shift_sensitive, 1);
-  EXPECT_EQ(info.enter_byte, 0x0E);
-  EXPECT_EQ(info.leave_byte, 0x0F);
+  const size_t size1 = size_t{file[10]} << 8 | file[11];
+  const size_t size2 = size_t{file[16]} << 8 | file[17];
+  for (bool mixed : {false, true}) {
+    file[76 + 4361] = mixed ? 1 | 2 : 1;
+    uint8_t* made2 = nullptr;
+    uint8_t* made1 =
+        LXCpV1toV2(&file[76], static_cast<uint16_t>(size1), &file[76 + size1], static_cast<uint16_t>(size2), &made2);
+    ASSERT_NE(made1, nullptr);
+    EXPECT_EQ(made1[8], mixed ? 0x0E : 0);
+    EXPECT_EQ(made1[9], mixed ? 0x0F : 0);
+    lxfree_cbk(nullptr, made1);
+    lxfree_cbk(nullptr, made2);
+  }
 }
 
 // Called directly, it believes the sizes that it is given, and no table of the page.

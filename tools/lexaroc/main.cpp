@@ -54,10 +54,12 @@ int run_check(const std::vector<fs::path>& paths) {
 
 int run_builtin(const fs::path& sources, const fs::path& output) {
   Report report;
-  std::string made = make_builtin_source(sources, report);
+  std::string objects = make_builtin_source(sources, report);
+  std::string tables = report.clean() ? make_unicode_source(sources, report) : std::string();
   report.print(std::cerr);
   if (!report.clean()) return kBadData;
-  write_file(output / "builtin_objects.cpp", made);
+  write_file(output / "objects/builtin_objects.cpp", objects);
+  write_file(output / "codepage/unicode_tables.cpp", tables);
   return kDone;
 }
 
@@ -87,9 +89,9 @@ int run(int argc, char** argv) {
   check->add_option("PATH", paths, "Directories or files")->required();
   check->callback([&] { result = run_check(paths); });
 
-  CLI::App* builtin = app.add_subcommand("builtin", "Make the C++ source of the built-in objects");
+  CLI::App* builtin = app.add_subcommand("builtin", "Make the C++ sources of the built-in objects and tables");
   builtin->add_option("SOURCE_DIR", sources, "Directory of the sources")->required();
-  builtin->add_option("OUTPUT_DIR", output, "Where builtin_objects.cpp is written")->required();
+  builtin->add_option("OUTPUT_DIR", output, "Root of the project: its objects/ and codepage/ are written to")->required();
   builtin->callback([&] { result = run_builtin(sources, output); });
 
   try {

@@ -14,18 +14,23 @@ namespace {
 
 // The library tabulates these blocks and types everything else by rule.
 struct Block {
-  const char* name;
+  const char* name;   // in the sources
+  const char* array;  // in the library, behind LX_UNICODE_
   uint16_t first, last;
 };
-constexpr Block kTypeBlocks[] = {{"1", 0x0000, 0x06F9}, {"2", 0x0901, 0x0EDD}, {"3", 0x10A0, 0x11F9},
-                                 {"4", 0x1E00, 0x21FF}, {"5", 0x22F2, 0x27BE}, {"6", 0x3000, 0x33FE},
-                                 {"7", 0xFB00, 0xFBD2}, {"8", 0xFD3E, 0xFFFF}};
-constexpr Block kCaseBlocks[] = {{"lower 1", 0x0100, 0x01FE}, {"lower 2", 0x0200, 0x0275}, {"lower 3", 0x0380, 0x03EE},
-                                 {"lower 4", 0x0400, 0x04F8}, {"lower 5", 0x1E00, 0x1EF8}, {"lower 6", 0x1F00, 0x1FFC},
-                                 {"upper 1", 0x0100, 0x01FF}, {"upper 2", 0x0200, 0x0292}, {"upper 3", 0x03A0, 0x03F1},
-                                 {"upper 4", 0x0430, 0x04F9}, {"upper 5", 0x1E00, 0x1EF9}, {"upper 6", 0x1F00, 0x1FF3}};
-constexpr Block kWidthBlocks[] = {{"H2F1", 0x00A0, 0x00AF}, {"H2F2", 0xFF60, 0xFFEE}, {"F2H1", 0x2500, 0x25CB},
-                                  {"F2H2", 0x3000, 0x30FC}, {"F2H3", 0x3130, 0x3164}, {"F2H4", 0xFFE0, 0xFFE6}};
+constexpr Block kTypeBlocks[] = {{"1", "Ctype1", 0x0000, 0x06F9}, {"2", "Ctype2", 0x0901, 0x0EDD},
+                                 {"3", "Ctype3", 0x10A0, 0x11F9}, {"4", "Ctype4", 0x1E00, 0x21FF},
+                                 {"5", "Ctype5", 0x22F2, 0x27BE}, {"6", "Ctype6", 0x3000, 0x33FE},
+                                 {"7", "Ctype7", 0xFB00, 0xFBD2}, {"8", "Ctype8", 0xFD3E, 0xFFFF}};
+constexpr Block kCaseBlocks[] = {{"lower 1", "Lower1", 0x0100, 0x01FE}, {"lower 2", "Lower2", 0x0200, 0x0275},
+                                 {"lower 3", "Lower3", 0x0380, 0x03EE}, {"lower 4", "Lower4", 0x0400, 0x04F8},
+                                 {"lower 5", "Lower5", 0x1E00, 0x1EF8}, {"lower 6", "Lower6", 0x1F00, 0x1FFC},
+                                 {"upper 1", "Upper1", 0x0100, 0x01FF}, {"upper 2", "Upper2", 0x0200, 0x0292},
+                                 {"upper 3", "Upper3", 0x03A0, 0x03F1}, {"upper 4", "Upper4", 0x0430, 0x04F9},
+                                 {"upper 5", "Upper5", 0x1E00, 0x1EF9}, {"upper 6", "Upper6", 0x1F00, 0x1FF3}};
+constexpr Block kWidthBlocks[] = {{"H2F1", "H2F1", 0x00A0, 0x00AF}, {"H2F2", "H2F2", 0xFF60, 0xFFEE},
+                                  {"F2H1", "F2H1", 0x2500, 0x25CB}, {"F2H2", "F2H2", 0x3000, 0x30FC},
+                                  {"F2H3", "F2H3", 0x3130, 0x3164}, {"F2H4", "F2H4", 0xFFE0, 0xFFE6}};
 
 constexpr const char* kClasses[] = {"alpha", "upper", "lower", "digit", "xdigit",
                                     "punct", "space", "blank", "cntrl", "ascii"};
@@ -121,12 +126,17 @@ void read_mappings(const fs::path& path, const Block (&tables)[N], Report& repor
   if (!blocks.complete()) report.error(source.name(), source.end(), "tables are missing");
 }
 
+template <class Value>
+UnicodeArray cut(const Block& block, const std::vector<Value>& map) {
+  return {std::string("LX_UNICODE_") + block.array, block.first, {&map[block.first], &map[block.last] + 1}};
+}
+
 }  // namespace
 
 // Mappings that follow a rule; the sources give the rest.
-UnicodeTables::UnicodeTables() : type_(65536), lower_(65536), upper_(65536), full_width_(65536) {
+UnicodeTables::UnicodeTables() : type_(65536), lower_(65536), upper_(65536), full_width_(65536), half_width_(65536) {
   for (uint32_t c = 0; c < 65536; ++c) type_[c] = type_by_rule(c);
-  for (auto* map : {&lower_, &upper_, &full_width_}) add(*map, 0, 0xFFFF, 0);
+  for (auto* map : {&lower_, &upper_, &full_width_, &half_width_}) add(*map, 0, 0xFFFF, 0);
   constexpr struct {
     uint16_t first, last;
     int difference;
@@ -181,7 +191,7 @@ void UnicodeTables::read_cases(const fs::path& path, Report& report) {
 
 void UnicodeTables::read_widths(const fs::path& path, Report& report) {
   read_mappings(path, kWidthBlocks, report, [&](const Block& block, uint16_t c, uint16_t mapped) {
-    if (block.name[0] == 'H') full_width_[c] = mapped;
+    (block.name[0] == 'H' ? full_width_ : half_width_)[c] = mapped;
   });
 }
 
@@ -199,6 +209,7 @@ void UnicodeTables::read_digits(const fs::path& path, Report& report) {
     if (digit < 0x30 || digit > 0x39) throw SourceError(spot, "expected an ASCII digit");
     cursor.end();
     listed[c] = true;
+    digits_.push_back({c, digit});
   });
   for (uint32_t c = 0; c < 65536; ++c) {
     if ((type_[c] & kDigit) != 0 && !listed[c]) {
@@ -214,6 +225,20 @@ UnicodeTables UnicodeTables::read(const fs::path& directory, Report& report) {
   tables.read_widths(directory / "width.txt", report);
   tables.read_digits(directory / "digits.txt", report);
   return tables;
+}
+
+std::vector<UnicodeArray> UnicodeTables::type_arrays() const {
+  std::vector<UnicodeArray> arrays;
+  for (const Block& block : kTypeBlocks) arrays.push_back(cut(block, type_));
+  return arrays;
+}
+
+std::vector<UnicodeArray> UnicodeTables::map_arrays() const {
+  std::vector<UnicodeArray> arrays;
+  for (const Block& block : kCaseBlocks) arrays.push_back(cut(block, block.name[0] == 'l' ? lower_ : upper_));
+  for (const Block& block : kWidthBlocks)
+    arrays.push_back(cut(block, block.name[0] == 'H' ? full_width_ : half_width_));
+  return arrays;
 }
 
 }  // namespace lx::compiler

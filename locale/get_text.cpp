@@ -1,0 +1,124 @@
+// SPDX-License-Identifier: Apache-2.0
+// The texts of a locale, delivered into the caller's buffer.
+#include "codepage/one_shot.hpp"
+#include "locale/locale.hpp"
+
+namespace lx {
+namespace {
+
+TRC1_Unit trace_unit = {"Lexaro", "get_text", 0};
+
+// A text on its way: the bytes of the locale as they are, or its characters.
+struct Delivery {
+  const CodePage& page;  // of the locale
+  const ItemText& text;
+  const Target& target;
+  bool as_bytes;
+
+  template <class Out>
+  int32_t bytes_to(Out out) const {
+    Source<uint8_t> source(bytes_of(text.bytes), static_cast<int32_t>(text.length));
+    return with_reader(page, {}, source.text, source.length,
+                       [&](auto in) { return convert_source(source, in, out, target, AsPacked()).count; });
+  }
+  template <class Out>
+  int32_t characters_to(Out out) const {
+    Source<LXUChar> source(text.ucs2, static_cast<int32_t>(text.units));
+    return convert_source(source, Ucs2Reader(source.text, source.length), out, target).count;
+  }
+};
+
+int32_t write(const Delivery& from, char* buffer, const CodePage& page, Shifts shifts) {
+  size_t room = from.target.byte_room();
+  if (from.as_bytes) return from.bytes_to(PackedWriter(bytes_of(buffer), room));
+  return with_writer(page, shifts, bytes_of(buffer), room, [&](auto out) { return from.characters_to(out); });
+}
+
+int32_t write(const Delivery& from, LXWChar* buffer, const CodePage& page, Shifts) {
+  WideWriter out(page, buffer, from.target.text_size());
+  return from.as_bytes ? from.bytes_to(out) : from.characters_to(out);
+}
+
+int32_t write(const Delivery& from, LXUChar* buffer, const CodePage&, Shifts) {
+  return from.characters_to(Ucs2Writer(buffer, from.target.text_size()));
+}
+
+// The bytes that the locale holds are what the caller gets, wherever they tell the characters by themselves: not where
+// double-byte characters stand without shift bytes. Names are good in every ASCII page; of separators, only the plain
+// form wants no more than the byte.
+bool goes_as_bytes(const ItemText& text, bool separator, bool plain, const CodePage& own) {
+  if (text.form == LX_FORM_UCS2) return false;
+  if (text.form == LX_FORM_NAME) return own.ascii_family;
+  if (own.shift_sensitive) return plain && text.units == text.length;
+  return plain || !separator;
+}
+
+template <class Unit>
+int32_t get_text(const char* function, LXLocale* locale, uint32_t number, Unit* buffer, int32_t size,
+                 const LXObjEntry* code_page, Shifts shifts, uint32_t options) {
+  return locale_call(
+      trace_unit, function, locale, options, LX_OPT_OBJECT | LX_OPT_CHARS, int32_t{-1},
+      [&](LocaleCall& call) -> int32_t {
+        if (code_page == nullptr) code_page = call.locale.code_page;
+        if (buffer == nullptr || !is_loaded_code_page(code_page)) return call.fail(LX_E_ARGUMENT, -1);
+        if (size <= 0) return 0;
+
+        const Item& item = item_of(number);
+        ItemText text;
+        char full_name[kFullNameRoom];
+        if (item.kind == ItemKind::full_name) {
+          text = {.form = LX_FORM_NAME, .bytes = full_name, .length = write_full_name(call.locale, full_name)};
+        } else {
+          uint32_t status = find_text(call.locale, number, (options & LX_OPT_OBJECT) == 0, text);
+          if (status != LX_OK) return call.fail(status, -1);
+        }
+        LXUChar name[kFullNameRoom];
+        if (text.form == LX_FORM_NAME) {
+          const CodePage& ascii = ascii_code_page();
+          for (; text.units < text.length; ++text.units) {
+            name[text.units] = ascii.to_unicode[static_cast<uint8_t>(text.bytes[text.units])];
+          }
+          text.ucs2 = name;
+        }
+
+        const CodePage& own = code_page_of(*call.locale.code_page);
+        const CodePage& wanted = code_page_of(*code_page);
+        bool separator = item.kind == ItemKind::separator;
+        bool plain = std::same_as<Unit, char> && !shifts.followed;
+        // A separator that needs more than a byte is none in the plain form.
+        if (separator && plain && text.units != 0 && WideWriter(own, nullptr, 0).code(*text.ucs2) > 0xFF)
+          text.units = 0;
+        bool as_bytes = !std::same_as<Unit, LXUChar> && &own == &wanted && goes_as_bytes(text, separator, plain, own);
+        Target target(buffer, size, LX_OPT_TERMINATE | (options & LX_OPT_CHARS));
+        Delivery delivery = {own, text, target, as_bytes};
+        return write(delivery, buffer, wanted, shifts);
+      });
+}
+
+}  // namespace
+}  // namespace lx
+
+using namespace lx;
+
+extern "C" {
+
+int32_t LXGetLocaleTextInfo(LXLocale* locale, uint32_t item, char* buffer, int32_t size, uint32_t options) noexcept {
+  return get_text(__func__, locale, item, buffer, size, nullptr, {}, options);
+}
+
+int32_t LXGetLocaleTextInfoEx(LXLocale* locale, uint32_t item, char* buffer, int32_t size, const LXObjEntry* code_page,
+                              uint32_t options) noexcept {
+  return get_text(__func__, locale, item, buffer, size, code_page, {true, 0}, options);
+}
+
+int32_t LXGetLocaleTextInfoW(LXLocale* locale, uint32_t item, LXWChar* buffer, int32_t size,
+                             uint32_t options) noexcept {
+  return get_text(__func__, locale, item, buffer, size, nullptr, {}, options);
+}
+
+int32_t LXGetLocaleTextInfoU(LXLocale* locale, uint32_t item, LXUChar* buffer, int32_t size,
+                             uint32_t options) noexcept {
+  return get_text(__func__, locale, item, buffer, size, nullptr, {}, options);
+}
+
+}  // extern "C"

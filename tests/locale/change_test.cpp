@@ -1,0 +1,192 @@
+// SPDX-License-Identifier: Apache-2.0
+// Locales that get another territory or code page.
+#include <gtest/gtest.h>
+
+#include "support/locale_model.hpp"
+#include "support/session.hpp"
+
+namespace lx::test {
+namespace {
+
+LXObjEntry* entry(uint8_t type, std::string_view name) {
+  return LXGetObjFromName(LXGetObjManager(), type, name.data(), static_cast<int32_t>(name.size()), 0, nullptr);
+}
+
+// The ways to the same change: by id, by name in the current page, by the object.
+enum class Way { id, name, object };
+
+class Changing {
+ public:
+  explicit Changing(const LocaleModel& start) : model(start), locale(LXGetLocale(start.name().c_str(), 0, nullptr)) {}
+
+  void set_text(uint32_t item, std::u16string_view text) {
+    LXUChar units[64] = {};
+    std::copy(text.begin(), text.end(), units);
+    EXPECT_EQ(LXSetLocaleTextInfoU(locale.get(), item, units, static_cast<int32_t>(text.size()), 0), 1) << item;
+    model.texts[item] = model.through_page(text);
+  }
+  void set_number(uint32_t item, int32_t value) {
+    EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), item, value), 1) << item;
+    model.numbers[item] = value;
+  }
+  void change(uint8_t type, const std::string& name) {
+    SCOPED_TRACE(model.name() + " to " + name);
+    const bool territory = type == LX_TERRITORY;
+    switch (way_) {
+      case Way::id:
+        EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), territory ? 5 : 9, LocaleSource::id_of(type, name)), 1);
+        break;
+      case Way::name: {
+        static const std::vector<TextForm> forms = text_forms(false);
+        const TextForm& form = forms[++names_ % forms.size()];
+        Units units = form.spell(*model.page, std::u16string(name.begin(), name.end()));
+        units.push_back(0);
+        EXPECT_EQ(form.set(locale.get(), territory ? 6 : 10, form.raw(units).data(), -1, 0), 1) << form.name;
+        break;
+      }
+      case Way::object:
+        EXPECT_EQ(territory ? LXLocaleChangeTerritory(locale.get(), entry(type, name))
+                            : LXLocaleChangeCodePage(locale.get(), entry(type, name)),
+                  LX_OK);
+    }
+    EXPECT_EQ(LXGetError(locale.get()), LX_OK);
+    way_ = static_cast<Way>((static_cast<int>(way_) + 1) % 3);
+    territory ? model.set_territory(name) : model.set_page(name);
+    ASSERT_EQ(model.difference(locale.get()), "");
+  }
+
+  LocaleModel model;
+  Locale locale;
+
+ private:
+  Way way_ = Way::id;
+  size_t names_ = 0;
+};
+
+constexpr uint32_t kNumbers[] = {63, 69, 70, 73, 74, 75, 76, 77, 78, 82, 83};
+constexpr uint32_t kStrings[] = {62, 64, 68, 71, 72, 79, 80, 81};
+
+void set_some(Changing& one) {
+  one.set_text(59, u"'");
+  one.set_text(67, u" ");
+  one.set_text(64, u"Fr.");
+  one.set_text(81, u"%Y");
+  one.set_number(63, 5);
+  one.set_number(73, 1);
+  one.set_number(78, 2);
+}
+
+void set_all(Changing& one) {
+  const char16_t* separators[] = {u"'", u"/", u"+", u"!", u" "};
+  for (uint32_t i = 0; i < 5; ++i) one.set_text(i < 3 ? 59 + i : 63 + i, separators[i]);
+  for (uint32_t item : kStrings) one.set_text(item, u"text " + std::u16string(item % 7, u'*'));
+  for (uint32_t item : kNumbers) one.set_number(item, item == 77 ? 4 : item < 73 ? 9 : 1);
+}
+
+// Texts and numbers that were set stay, all others come from the new territory in the new page.
+TEST(Change, ThroughPagesAndTerritories) {
+  Session session;
+  for (auto* set : {+[](Changing&) {}, +set_some, +set_all}) {
+    Changing one(LocaleModel("German", "Germany", "Latin1"));
+    set(one);
+    ASSERT_EQ(one.model.difference(one.locale.get()), "");
+    for (const char* page : {"UTF-8", "IBM037", "MS932", "IBM930", "US-ASCII", "JapanEUC", "Latin1"}) {
+      one.change(LX_CODEPAGE, page);
+      for (const char* territory : {"Japan", "Russia", "German-Switzerland", "Germany"}) {
+        one.change(LX_TERRITORY, territory);
+        if (HasFatalFailure()) return;
+      }
+    }
+  }
+}
+
+// What the caller has set goes through all pages that have its characters unharmed.
+TEST(Change, TextsOfTheCallerComeBack) {
+  Session session;
+  struct Case {
+    const char* language;
+    const char* territory;
+    std::vector<const char*> pages;
+    const char16_t* text;
+    const char16_t* separator;
+  };
+  const Case cases[] = {
+      {"French", "France", {"Latin1", "UTF-8", "IBM037", "IBM500", "Latin1"}, u"\u00E9t\u00E9 \u00A3", u"\u00B7"},
+      {"Japanese", "Japan", {"UTF-8", "MS932", "IBM930", "JapanEUC", "UTF-8"}, u"\u5186ab\u30AB\u30CA\u6708", u"'"},
+      {"Russian", "Russia", {"ISO-8859-5", "UTF-8", "MS932", "IBM930", "ISO-8859-5"}, u"\u0440\u0443\u0431.", u"!"},
+  };
+  for (const Case& one : cases) {
+    Changing changing(LocaleModel(one.language, one.territory, one.pages[0]));
+    for (uint32_t item : kStrings) changing.set_text(item, one.text);
+    for (uint32_t item : {59u, 61u, 66u}) changing.set_text(item, one.separator);
+    for (const char* page : one.pages) changing.change(LX_CODEPAGE, page);
+  }
+}
+
+TEST(Change, LanguageLeavesTheRest) {
+  Session session;
+  Changing one(LocaleModel("German", "Germany", "Latin1"));
+  set_some(one);
+  one.model.language = &LocaleSource::of(LX_LANGUAGE, "Japanese");
+  EXPECT_EQ(LXSetLocaleNumInfo(one.locale.get(), LX_ITEM_LANGUAGE_ID, 11), 1);
+  EXPECT_EQ(one.model.difference(one.locale.get()), "");
+}
+
+TEST(Change, RefilledOnRequest) {
+  EXPECT_EQ(LXLocaleSetModifiable(nullptr), LX_E_ARGUMENT);
+  Session session;
+  Changing one(LocaleModel("Japanese", "Japan", "IBM930"));
+  set_some(one);
+  for (int i = 0; i < 2; ++i) EXPECT_EQ(LXLocaleSetModifiable(one.locale.get()), LX_OK);
+  EXPECT_EQ(one.model.difference(one.locale.get()), "");
+}
+
+TEST(Change, BadArguments) {
+  Session session;
+  Changing one(LocaleModel("German", "Germany", "Latin1"));
+  LXLocale* locale = one.locale.get();
+  LXObjEntry* german = entry(LX_LANGUAGE, "German");
+  LXObjEntry* utf8 = entry(LX_CODEPAGE, "UTF-8");
+  LXObjEntry* japan = entry(LX_TERRITORY, "Japan");
+  for (LXObjEntry* wrong : {static_cast<LXObjEntry*>(nullptr), german, utf8}) {
+    EXPECT_NE(LXLocaleChangeTerritory(locale, wrong), LX_OK);
+  }
+  for (LXObjEntry* wrong : {static_cast<LXObjEntry*>(nullptr), german, japan}) {
+    EXPECT_NE(LXLocaleChangeCodePage(locale, wrong), LX_OK);
+  }
+  EXPECT_NE(LXLocaleChangeTerritory(nullptr, japan), LX_OK);
+  EXPECT_NE(LXLocaleChangeCodePage(nullptr, utf8), LX_OK);
+  LXLocaleFreeOldText(locale, locale);
+  LXLocaleFreeOldText(locale, nullptr);
+  EXPECT_EQ(one.model.difference(locale), "") << "its texts are its own still";
+}
+
+TEST(Change, TextBetweenPages) {
+  Session session;
+  struct Case {
+    const char* from;
+    const char* to;
+    const char* text;
+    const char* result;
+  };
+  const Case cases[] = {
+      {"Latin1", "IBM037", "a1", "\x81\xF1"},
+      {"Latin1", "UTF-8", "\xE9", "\xC3\xA9"},
+      {"UTF-8", "US-ASCII", "\xE5\x86\x86z", "\x1Az"},
+      {"MS932", "UTF-8", "\x89\x7E", "\xE5\x86\x86"},
+      {"US-ASCII", "US-ASCII", "", ""},
+  };
+  for (const Case& one : cases) {
+    char* text = LXLocaleCnvText(entry(LX_CODEPAGE, one.from), entry(LX_CODEPAGE, one.to), one.text);
+    EXPECT_STREQ(text, one.result);
+    LXUnloadFile(text);
+  }
+  const LXObjEntry* page = entry(LX_CODEPAGE, "Latin1");
+  EXPECT_EQ(LXLocaleCnvText(nullptr, page, "x"), nullptr);
+  EXPECT_EQ(LXLocaleCnvText(page, nullptr, "x"), nullptr);
+  EXPECT_EQ(LXLocaleCnvText(page, entry(LX_TERRITORY, "Japan"), "x"), nullptr);
+  EXPECT_EQ(LXLocaleCnvText(page, page, nullptr), nullptr);
+}
+
+}  // namespace
+}  // namespace lx::test

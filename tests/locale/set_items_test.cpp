@@ -1,0 +1,311 @@
+// SPDX-License-Identifier: Apache-2.0
+// Values that are set for one locale: what is taken, what is refused, and what the locale then reports.
+#include <gtest/gtest.h>
+
+#include "support/edge_buffer.hpp"
+#include "support/locale_model.hpp"
+#include "support/session.hpp"
+#include "support/trace_capture.hpp"
+
+namespace lx::test {
+namespace {
+
+const char* const kPages[] = {"US-ASCII", "Latin1", "UTF-8", "MS932", "IBM037", "IBM930"};
+constexpr uint32_t kSeparators[] = {59, 60, 61, 66, 67};
+constexpr uint32_t kStrings[] = {62, 64, 68, 71, 72, 79, 80, 81};
+
+// A locale and what it must report.
+struct Pair {
+  explicit Pair(const char* page, const char* language = "German", const char* territory = "Germany")
+      : model(language, territory, page), locale(LXGetLocale(model.name().c_str(), 0, nullptr)) {}
+  LocaleModel model;
+  Locale locale;
+  uint32_t error() const { return LXGetError(locale.get()); }
+};
+
+class SetItems : public testing::TestWithParam<const char*> {
+ protected:
+  Session session_;
+  EdgeBuffer edge_{4096};
+};
+INSTANTIATE_TEST_SUITE_P(, SetItems, testing::ValuesIn(kPages), [](const auto& param) {
+  std::string name = param.param;
+  std::erase(name, '-');
+  return name;
+});
+
+// ---- Numbers --------------------------------------------------------------------------------------------------------
+
+TEST(SetItemsOf, Numbers) {
+  struct Case {
+    std::vector<uint32_t> items;
+    std::vector<int32_t> good, bad;
+    uint32_t error;
+  };
+  const Case cases[] = {
+      {{63, 69, 70}, {0, 1, 7, 65535, 65536, 65536 + 9, -1, INT32_MIN + 3}, {}, 0},
+      {{73, 74, 75, 76, 82, 83}, {0, 1}, {-1, 2, 256, 65536, 65537, INT32_MIN}, LX_E_NOTFOUND},
+      {{77, 78}, {0, 1, 2, 3, 4}, {-1, 5, 256, 65536, INT32_MAX}, LX_E_NOTFOUND},
+      {{1}, {11, 2}, {0, 3000, -1, 65536 + 1, INT32_MIN}, LX_E_NOTFOUND},
+      {{5}, {392, 276}, {0, 1, 3000, -1, 65536 + 276}, LX_E_NOTFOUND},
+      {{9}, {930, 819}, {0, 1, 1200, -1, 65536 + 819}, LX_E_NOTFOUND},
+      {{11}, {0}, {1, 9999, -1, 65536}, LX_E_NOTFOUND},
+      {{0, 2, 10, 58, 59, 62, 64, 79, 80, 81, 84, 85, 86, 87, 88, 89, 65536 + 63, 0xFFFFFFFF}, {}, {0, 1}, LX_E_ITEM},
+  };
+  Session session;
+  Pair pair("Latin1");
+  LXLocale* locale = pair.locale.get();
+  for (const Case& one : cases) {
+    for (uint32_t item : one.items) {
+      for (int32_t value : one.good) {
+        EXPECT_EQ(LXSetLocaleNumInfo(locale, item, value), 1) << item << " " << value;
+        EXPECT_EQ(pair.error(), LX_OK);
+        const auto kept = static_cast<uint16_t>(value);
+        if (item >= 63) pair.model.numbers[item] = kept;
+        if (item == 1) pair.model.language = &LocaleSource::of(LX_LANGUAGE, LocaleSource::name_of(LX_LANGUAGE, kept));
+        if (item == 5) pair.model.set_territory(LocaleSource::name_of(LX_TERRITORY, kept));
+        if (item == 9) pair.model.page = &PageSource::of(kept);
+        EXPECT_EQ(pair.model.difference(locale), "") << item << " " << value;
+      }
+      for (int32_t value : one.bad) {
+        EXPECT_EQ(LXSetLocaleNumInfo(locale, item, value), 0) << item << " " << value;
+        EXPECT_EQ(pair.error(), one.error) << item << " " << value;
+      }
+      EXPECT_EQ(pair.model.difference(locale), "") << item;
+    }
+  }
+}
+
+// ---- Strings --------------------------------------------------------------------------------------------------------
+
+// Each text once in each form, with a length and terminated; what the locale reports is read in all forms.
+TEST_P(SetItems, Strings) {
+  const std::u16string texts[] = {
+      u"7;0", u"Fr.", u"x", u"%H\u00E9\u00A3%M", u"\u5186\u30AB\u30CA ab\u6708z", std::u16string(60, u'y'), u"-"};
+  Pair pair(GetParam());
+  for (const TextForm& form : text_forms()) {
+    const PageSource& own = *pair.model.page;
+    for (size_t i = 0; i < std::size(kStrings) * std::size(texts); ++i) {
+      const uint32_t item = kStrings[i % std::size(kStrings)];
+      const std::u16string& text = texts[i % std::size(texts)];
+      const PageSource& page = form.page != nullptr ? *form.page : own;
+      if (form.kind == Form::plain && own.mixed() && form.spell(own, text).size() != text.size()) continue;
+      std::u16string arrives;
+      for (char16_t c : text)
+        arrives += form.kind == Form::ucs2 ? c : static_cast<char16_t>(page.decode(page.encode(c)));
+      Units units = form.spell(own, text);
+      const auto length = static_cast<int32_t>(units.size());
+      const bool characters = i % 3 == 1, terminated = i % 3 == 2;
+      if (terminated) units.push_back(0);
+      const char* at = edge_.text(form.raw(units));
+      const bool counts = form.kind == Form::plain || form.kind == Form::shifted;
+      EXPECT_EQ(form.set(pair.locale.get(), item, at,
+                         terminated             ? -1
+                         : characters && counts ? static_cast<int32_t>(text.size())
+                                                : length,
+                         characters ? LX_OPT_CHARS : 0),
+                1)
+          << form.name << item;
+      EXPECT_EQ(pair.error(), LX_OK);
+      pair.model.texts[item] = pair.model.through_page(arrives);
+      ASSERT_EQ(pair.model.text_difference(pair.locale.get(), item, text.size() < 20 && i % 2 == 0), "")
+          << "set through " << form.name;
+    }
+    ASSERT_EQ(pair.model.difference(pair.locale.get()), "") << "set through " << form.name;
+  }
+}
+
+TEST(SetItemsOf, LengthInsideACharacter) {
+  Session session;
+  EdgeBuffer edge(16);
+  struct Case {
+    const char* page;
+    const char* bytes;
+    const char* kept;
+  };
+  for (const Case& one : {Case{"MS932", "A\x89", "A"},
+                          {"UTF-8", "\xE5\x86\x86\xE5\x86", "\xE5\x86\x86"},
+                          {"UTF-8", "ab\xC3", "ab"},
+                          {"MS932", "\x89", ""}}) {
+    Pair pair(one.page);
+    const auto length = static_cast<int32_t>(std::strlen(one.bytes));
+    EXPECT_EQ(LXSetLocaleTextInfo(pair.locale.get(), 64, edge.text(one.bytes), length, 0), 1);
+    pair.model.texts[64] = u"";
+    for (const char* at = one.kept; *at != '\0';) {
+      size_t size = pair.model.page->length_of(static_cast<uint8_t>(*at));
+      pair.model.texts[64] += static_cast<char16_t>(pair.model.page->decode({at, size}));
+      at += size;
+    }
+    EXPECT_EQ(pair.model.difference(pair.locale.get()), "");
+  }
+}
+
+// ---- Separators -----------------------------------------------------------------------------------------------------
+
+// The rules, byte for byte. The partner of a separator is the one of the same kind of number.
+bool takes(const LocaleModel& model, uint32_t item, uint8_t byte) {
+  const PageSource& page = *model.page;
+  if (page.lengths[byte] != 1) return false;
+  if (item == 61) return true;
+  const uint8_t zero = page.ascii_family ? 0x30 : 0xF0;
+  if (byte >= zero && byte <= zero + 9) return false;
+  if (byte == 0) return item == 60 || item == 67;
+  const uint32_t partner = item == 59 ? 60 : item == 60 ? 59 : item == 66 ? 67 : 66;
+  const std::u16string other = *model.text(partner);
+  return other.empty() || page.encode(other[0]) != std::string(1, static_cast<char>(byte));
+}
+
+TEST_P(SetItems, SeparatorsOfAllBytes) {
+  Pair pair(GetParam());
+  const PageSource& page = *pair.model.page;
+  for (uint32_t item : kSeparators) {
+    for (unsigned byte = 0; byte < 256; ++byte) {
+      const uint16_t unicode = page.decode(std::string(1, static_cast<char>(byte)));
+      if (unicode == kNoCharacter && page.lengths[byte] == 1) continue;  // nothing reads it back
+      if (page.mixed() && (byte == page.enter || byte == page.leave)) continue;
+      const bool taken = takes(pair.model, item, static_cast<uint8_t>(byte));
+      const LXWChar packed = byte;
+      const char* plain = edge_.text(std::string(1, static_cast<char>(byte)));
+      EXPECT_EQ(byte % 2 == 1 ? LXSetLocaleTextInfoW(pair.locale.get(), item, &packed, 1, 0)
+                              : LXSetLocaleTextInfo(pair.locale.get(), item, plain, 1, 0),
+                taken ? 1 : 0)
+          << item << " byte " << byte;
+      EXPECT_EQ(pair.error(), taken ? LX_OK : LX_E_NOTFOUND) << item << " byte " << byte;
+      if (taken) pair.model.texts[item] = unicode == 0 ? u"" : std::u16string(1, unicode);
+      ASSERT_EQ(pair.model.text_difference(pair.locale.get(), item), "") << item << " byte " << byte;
+    }
+    ASSERT_EQ(pair.model.difference(pair.locale.get()), "") << item;
+  }
+}
+
+// A text in another encoding is first brought into the page; of several characters the first is taken.
+TEST_P(SetItems, SeparatorsInOtherForms) {
+  const std::u16string texts[] = {u"'", u"#;", u" ", u"5", u"\uFF0C", u"\u00B7", u":", u"\u6708", u"/"};
+  for (uint32_t item : kSeparators) {
+    Pair pair(GetParam());
+    for (const std::u16string& text : texts) {
+      for (const TextForm& form : text_forms()) {
+        const PageSource& own = *pair.model.page;
+        const PageSource& page = form.page != nullptr ? *form.page : own;
+        std::u16string first(1, text[0]);
+        if (form.kind != Form::ucs2) first[0] = static_cast<char16_t>(page.decode(page.encode(text[0])));
+        const std::string code = own.encode(first[0]);
+        if (own.mixed() && code.size() > 1) continue;  // there, each of its bytes is one
+        const Units units = form.spell(own, text);
+        const bool taken = code.size() == 1 && takes(pair.model, item, static_cast<uint8_t>(code[0]));
+        EXPECT_EQ(form.set(pair.locale.get(), item, edge_.text(form.raw(units)), static_cast<int32_t>(units.size()), 0),
+                  taken ? 1 : 0)
+            << item << form.name << code;
+        EXPECT_EQ(pair.error(), taken ? LX_OK : LX_E_NOTFOUND);
+        if (taken) pair.model.texts[item] = pair.model.through_page(first);
+        ASSERT_EQ(pair.model.text_difference(pair.locale.get(), item), "") << item << form.name << code;
+      }
+    }
+  }
+}
+
+// ---- Objects by name ------------------------------------------------------------------------------------------------
+
+TEST_P(SetItems, Names) {
+  struct Case {
+    uint32_t item;
+    std::u16string name;
+    const char* found;  // null: there is none
+  };
+  const Case cases[] = {
+      {2, u"Japanese", "Japanese"},
+      {2, u"gERMAN", "German"},
+      {2, u"Germ", nullptr},
+      {2, u"Germany", nullptr},
+      {6, u"Austria", "Austria"},
+      {6, u"austria", "Austria"},
+      {6, u"German-Switzerland", "German-Switzerland"},
+      {6, u"Atlantis", nullptr},
+      {6, u"\u6708", nullptr},
+      {10, u"NoSuchPage", nullptr},
+      {10, u"ascii", nullptr},  // aliases are for the names of locales
+      {12, u"Binary", ""},
+      {12, u"BINARY", ""},
+      {12, u"Default", nullptr},
+      {6, std::u16string(33, u'x'), nullptr},
+      {6, std::u16string(300, u'x'), nullptr},
+  };
+  for (const TextForm& form : text_forms()) {
+    Pair pair(GetParam());
+    for (const Case& one : cases) {
+      const Units units = form.spell(*pair.model.page, one.name);
+      EXPECT_EQ(
+          form.set(pair.locale.get(), one.item, edge_.text(form.raw(units)), static_cast<int32_t>(units.size()), 0),
+          one.found != nullptr ? 1 : 0)
+          << form.name << one.item << one.found;
+      EXPECT_EQ(pair.error(), one.found != nullptr ? LX_OK : LX_E_NOTFOUND) << form.name << one.item;
+      if (one.found != nullptr && one.item == 2) pair.model.language = &LocaleSource::of(LX_LANGUAGE, one.found);
+      if (one.found != nullptr && one.item == 6) pair.model.set_territory(one.found);
+      ASSERT_EQ(pair.model.text_difference(pair.locale.get(), LX_ITEM_LOCALE_NAME), "") << form.name << one.item;
+    }
+    EXPECT_EQ(pair.model.difference(pair.locale.get()), "") << form.name;
+  }
+}
+
+// ---- Arguments ------------------------------------------------------------------------------------------------------
+
+TEST_P(SetItems, RefusedArguments) {
+  Pair pair(GetParam());
+  LXLocale* locale = pair.locale.get();
+  const PageSource& own = *pair.model.page;
+  for (const TextForm& form : text_forms()) {
+    const std::string text = form.raw(form.spell(own, u"#")) + std::string(4, '\0');
+    const char* at = edge_.text(text);
+    for (uint32_t options : {1u, 8u, 0x4001u, 0x80000000u}) {
+      EXPECT_EQ(form.set(locale, 64, at, 1, options), 0) << form.name;
+      EXPECT_EQ(pair.error(), LX_E_ARGUMENT);
+    }
+    EXPECT_EQ(form.set(locale, 64, nullptr, 1, 0), 0) << form.name;
+    EXPECT_EQ(pair.error(), LX_E_ARGUMENT);
+    for (uint32_t item : {0u, 1u, 3u, 5u, 7u, 8u, 9u, 11u, 13u, 16u, 58u, 63u, 65u, 69u, 73u, 84u, 88u, 89u, ~0u}) {
+      EXPECT_EQ(form.set(locale, item, at, 1, 0), 0) << form.name << item;
+      EXPECT_EQ(pair.error(), LX_E_ITEM) << form.name << item;
+    }
+    // Nothing is nothing, whatever the item.
+    for (uint32_t item : {2u, 6u, 59u, 60u, 64u, 81u, 999u}) {
+      for (uint32_t options : {0u, LX_OPT_CHARS}) {
+        EXPECT_EQ(form.set(locale, item, at, 0, options), 1) << form.name << item;
+        EXPECT_EQ(form.set(locale, item, edge_.text({"\0\0\0", 4}), -1, options), 1) << form.name << item;
+        EXPECT_EQ(pair.error(), LX_OK);
+        at = edge_.text(text);
+      }
+    }
+    EXPECT_EQ(form.set(nullptr, 64, at, 1, 0), 0) << "no default locale";
+  }
+  EXPECT_EQ(LXSetLocaleTextInfoEx(locale, 64, "x", 1, LXGetLocaleObject(locale, LX_TERRITORY), 0), 0);
+  EXPECT_EQ(LXSetLocaleNumInfo(nullptr, 63, 1), 0);
+  EXPECT_EQ(pair.model.difference(locale), "");
+}
+
+// The message shows what was given, and reads no further.
+TEST(SetItemsOf, TextIsTraced) {
+  Session session;
+  EdgeBuffer edge(64);
+  Pair pair("UTF-8");
+  for (const TextForm& form : text_forms(false)) {
+    TraceCapture trace;
+    const Units text = form.spell(*pair.model.page, u"abc");
+    EXPECT_EQ(form.set(pair.locale.get(), 64, edge.text(form.raw(text)), 3, 0), 1);
+    EXPECT_TRUE(trace.has("type = 64, buffer size = 3, data = abc")) << form.name << "\n" << trace.all();
+    for (int32_t length : {-1, 3}) form.set(pair.locale.get(), 64, nullptr, length, 0);
+  }
+}
+
+TEST(SetItemsOf, TheDefaultLocale) {
+  Session session;
+  ASSERT_EQ(LXSetLocale("German_Germany.UTF-8", 0), LX_OK);
+  LocaleModel model("German", "Germany", "UTF-8");
+  EXPECT_EQ(LXSetLocaleNumInfo(nullptr, 63, 5), 1);
+  EXPECT_EQ(LXSetLocaleTextInfo(nullptr, 64, "Taler", -1, 0), 1);
+  model.numbers[63] = 5;
+  model.texts[64] = u"Taler";
+  EXPECT_EQ(model.difference(nullptr), "");
+}
+
+}  // namespace
+}  // namespace lx::test

@@ -1,0 +1,46 @@
+// SPDX-License-Identifier: Apache-2.0
+// Locales of the operating system, made with its own tool in a directory that LOCPATH names as long as this lives.
+#pragma once
+
+#include <cstdlib>
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include "support/environment.hpp"
+#include "support/object_builder.hpp"
+
+namespace lx::test {
+
+struct SystemLocale {
+  const char* native;
+  const char* source;
+  const char* charset;
+};
+
+class SystemLocales {
+ public:
+  explicit SystemLocales(const std::vector<SystemLocale>& locales) {
+    std::string command = "cd " + std::string(directory_.path()) + " && { ";
+    for (const SystemLocale& one : locales) {
+      command += std::string("localedef -i ") + one.source + " -f " + one.charset + " ./" + one.native + " & ";
+    }
+    made_ = std::system((command + "wait; } >log 2>&1").c_str()) == 0;
+    for (const SystemLocale& one : locales) {
+      made_ = made_ && std::filesystem::exists(directory_.file(one.native) + "/LC_MONETARY");
+    }
+  }
+  // False where the tool or its sources are not installed.
+  bool made() const { return made_; }
+  // A further name for one of them.
+  void add_name(const char* native, const std::string& name) const {
+    std::filesystem::create_directory_symlink(directory_.file(native), directory_.file(name));
+  }
+
+ private:
+  DataDirectory directory_;
+  Variable location_{"LOCPATH", directory_.path()};
+  bool made_;
+};
+
+}  // namespace lx::test
