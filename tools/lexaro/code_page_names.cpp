@@ -1,14 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "tools/lexaro/code_page_names.hpp"
 
-#include <algorithm>
 #include <charconv>
-#include <map>
-#include <numeric>
-#include <utility>
-#include <vector>
 
 #include "tools/lexaro/failure.hpp"
+#include "tools/lexaro/near_names.hpp"
 
 namespace lx::tool {
 namespace {
@@ -21,69 +17,6 @@ LXObjEntry* find_by_number(const std::string& digits) {
   return LXGetObjFromID(LXGetObjManager(), LX_CODEPAGE, id, 1, &rc);
 }
 
-LXObjEntry* find_entry(const std::string& wanted) {
-  LXObjMgr* manager = LXGetObjManager();
-  uint32_t rc = 0;
-  if (auto* entry = LXGetObjFromName(manager, LX_CODEPAGE, wanted.c_str(), -1, 1, &rc)) return entry;
-  if (const char* name = LXGetCodepageFromAlias(manager, wanted.c_str())) {
-    if (auto* entry = LXGetObjFromName(manager, LX_CODEPAGE, name, -1, 1, &rc)) return entry;
-  }
-  return find_by_number(wanted);
-}
-
-// Letters and digits in lower case: "IBM_930", "ibm-930" and "Ibm 930" look alike to whoever mistypes them.
-std::string plain_letters(const std::string& name) {
-  std::string plain;
-  for (char c : name) {
-    if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
-    if ((c >= 'a' && c <= 'z') || (c >= '0' && c <= '9')) plain.push_back(c);
-  }
-  return plain;
-}
-
-// Insertions, deletions and replacements that turn one name into the other.
-std::size_t edit_distance(const std::string& a, const std::string& b) {
-  std::vector<std::size_t> row(b.size() + 1);
-  std::iota(row.begin(), row.end(), std::size_t{0});
-  for (std::size_t i = 0; i < a.size(); ++i) {
-    std::size_t diagonal = std::exchange(row[0], i + 1);
-    for (std::size_t j = 0; j < b.size(); ++j) {
-      const std::size_t replaced = diagonal + (a[i] != b[j]);
-      diagonal = row[j + 1];
-      row[j + 1] = std::min({replaced, diagonal + 1, row[j] + 1});
-    }
-  }
-  return row[b.size()];
-}
-
-// Collects the pages whose name or alias is close to a wanted one.
-struct NearNames {
-  explicit NearNames(const std::string& name) : wanted(plain_letters(name)), limit(1 + wanted.size() / 4) {}
-
-  void offer(const char* name, const char* page) {
-    const std::size_t distance = edit_distance(wanted, plain_letters(name));
-    if (distance > limit || distance >= wanted.size()) return;
-    const auto [known, fresh] = distances.try_emplace(page, distance);
-    if (!fresh) known->second = std::min(known->second, distance);
-  }
-
-  std::vector<std::string> best() const {
-    std::vector<std::pair<std::size_t, std::string>> ranked;
-    for (const auto& [page, distance] : distances) ranked.emplace_back(distance, page);
-    std::sort(ranked.begin(), ranked.end());
-    std::vector<std::string> pages;
-    for (const auto& [distance, page] : ranked) {
-      if (distance > ranked.front().first || pages.size() == 4) break;
-      pages.push_back(page);
-    }
-    return pages;
-  }
-
-  std::string wanted;
-  std::size_t limit;
-  std::map<std::string, std::size_t> distances;
-};
-
 int32_t offer_page(void* context, uint8_t type, const char* name) {
   if (type == LX_CODEPAGE) static_cast<NearNames*>(context)->offer(name, name);
   return 1;
@@ -92,19 +25,6 @@ int32_t offer_page(void* context, uint8_t type, const char* name) {
 int32_t offer_alias(void* context, const char* alias, const char* page) {
   static_cast<NearNames*>(context)->offer(alias, page);
   return 1;
-}
-
-std::string near_names(const std::string& wanted) {
-  NearNames names(wanted);
-  LXEnumLocales(offer_page, &names, 0);
-  LXEnumAliases(LXGetObjManager(), offer_alias, &names);
-  const std::vector<std::string> pages = names.best();
-  std::string text;
-  for (std::size_t i = 0; i < pages.size(); ++i) {
-    if (i != 0) text += i + 1 == pages.size() ? " or " : ", ";
-    text += pages[i];
-  }
-  return text;
 }
 
 // Encodings of two and four byte units have no code page, which deserves a better answer than "unknown".
@@ -117,6 +37,18 @@ bool is_wide_encoding(const std::string& wanted) {
   return plain == "1200" || plain == "1201" || plain == "unicode" || plain == "wchart";
 }
 
+}  // namespace
+
+LXObjEntry* find_code_page(const std::string& wanted) {
+  LXObjMgr* manager = LXGetObjManager();
+  uint32_t rc = 0;
+  if (auto* entry = LXGetObjFromName(manager, LX_CODEPAGE, wanted.c_str(), -1, 1, &rc)) return entry;
+  if (const char* name = LXGetCodepageFromAlias(manager, wanted.c_str())) {
+    if (auto* entry = LXGetObjFromName(manager, LX_CODEPAGE, name, -1, 1, &rc)) return entry;
+  }
+  return find_by_number(wanted);
+}
+
 Failure unknown_code_page(const std::string& wanted) {
   const std::string shown = display_name(wanted);
   if (is_wide_encoding(wanted)) {
@@ -124,16 +56,16 @@ Failure unknown_code_page(const std::string& wanted) {
                                        " is not a code page: texts of two or four byte units are not converted; "
                                        "the Unicode page is UTF-8"};
   }
-  std::string message = "unknown code page \"" + shown + "\"";
-  if (const std::string names = near_names(wanted); !names.empty()) message += "; did you mean " + names + "?";
-  return {ExitStatus::kCodePage, message + "\n\"lexaro list codepages --aliases\" shows all names."};
+  NearNames names(wanted);
+  LXEnumLocales(offer_page, &names, 0);
+  LXEnumAliases(LXGetObjManager(), offer_alias, &names);
+  return {ExitStatus::kCodePage, "unknown code page \"" + shown + "\"" + names.question() +
+                                     "\n\"lexaro list codepages --aliases\" shows all names."};
 }
-
-}  // namespace
 
 CodePage open_code_page(const std::string& wanted) {
   // "@" would end the code page's part of a locale name.
-  LXObjEntry* entry = wanted.empty() || wanted.find('@') != std::string::npos ? nullptr : find_entry(wanted);
+  LXObjEntry* entry = wanted.empty() || wanted.find('@') != std::string::npos ? nullptr : find_code_page(wanted);
   if (!entry) throw unknown_code_page(wanted);
 
   CodePage page;

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <string>
 
+#include "tools/lexaro/failure.hpp"
 #include "tools/lexaro/library_session.hpp"
 
 namespace lx::tool {
@@ -15,6 +16,10 @@ struct CodePage {
   uint16_t id = 0;
   LocalePtr locale;
 };
+
+// The directory's entry of a name, alias or number, not loaded; null when there is none.
+LXObjEntry* find_code_page(const std::string& wanted);
+Failure unknown_code_page(const std::string& wanted);
 
 CodePage open_code_page(const std::string& wanted);
 

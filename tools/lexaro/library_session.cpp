@@ -6,13 +6,29 @@
 
 namespace lx::tool {
 
-LibrarySession::LibrarySession(const std::optional<std::string>& locale_directory)
-    : directory_(find_data_directory(locale_directory)) {
-  const uint32_t status = LXInit(directory_.c_str(), nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
-  if (status == LX_OK) return;
+namespace {
+
+// The directory, or nothing when the built-in objects have to serve.
+std::optional<std::string> data_directory(const std::optional<std::string>& wanted, WithoutData without_data) {
+  try {
+    return find_data_directory(wanted);
+  } catch (const Failure& failure) {
+    if (wanted || without_data == WithoutData::kFail) throw;
+    complain(std::string(failure.what()) + "\nThe built-in English, UnitedStates and US-ASCII serve.");
+    return std::nullopt;
+  }
+}
+
+}  // namespace
+
+LibrarySession::LibrarySession(const std::optional<std::string>& locale_directory, WithoutData without_data) {
+  const auto directory = data_directory(locale_directory, without_data);
+  const uint32_t status = directory ? LXInit(directory->c_str(), nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS)
+                                    : LXInit(nullptr, nullptr, nullptr, nullptr, 0);
+  if (status == LX_OK || (status == LX_E_DEFAULTS && !directory)) return;
   if (status == LX_E_DEFAULTS) LXTerm();
-  throw Failure(ExitStatus::kCodePage,
-                display_name(directory_) + ": the locale data cannot be used (" + describe_status(status) + ")");
+  throw Failure(ExitStatus::kCodePage, display_name(directory.value_or("built-in objects")) +
+                                           ": the locale data cannot be used (" + describe_status(status) + ")");
 }
 
 std::string describe_status(uint32_t status) {

@@ -11,19 +11,18 @@
 
 namespace lx::tool {
 
-// The library runs on the locale data of one directory while this lives, and never on built-in stand-ins: a
-// conversion through the wrong page would be worse than none.
+enum class WithoutData { kFail, kBuiltIn };
+
+// The library runs on the locale data of one directory while this lives, and never on stand-ins for a part of them: a
+// conversion through the wrong page would be worse than none. Where there are no data at all, the built-in objects can
+// serve; standard error then tells it.
 class LibrarySession {
  public:
-  explicit LibrarySession(const std::optional<std::string>& locale_directory);
+  explicit LibrarySession(const std::optional<std::string>& locale_directory,
+                          WithoutData without_data = WithoutData::kFail);
   LibrarySession(const LibrarySession&) = delete;
   LibrarySession& operator=(const LibrarySession&) = delete;
   ~LibrarySession() { LXTerm(); }
-
-  const std::string& directory() const { return directory_; }
-
- private:
-  std::string directory_;
 };
 
 struct LocaleDeleter {

@@ -1,165 +1,59 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <algorithm>
-#include <cstdio>
-#include <map>
 #include <memory>
-#include <nlohmann/json.hpp>
 #include <string>
 #include <vector>
 
 #include "tools/lexaro/command.hpp"
-#include "tools/lexaro/library_session.hpp"
+#include "tools/lexaro/lists.hpp"
 #include "tools/lexaro/output_file.hpp"
 
 namespace lx::tool {
 namespace {
 
-using Json = nlohmann::ordered_json;
-
-constexpr char kExplanation[] = R"(What can be listed:
-  lexaro list codepages             the code pages: number, name, kind, family
-  lexaro list codepages --aliases   with the other names that are understood
-  lexaro list codepages --json      for programs
+constexpr char kExplanation[] = R"(What can be listed, each as a table or with --json:
+  lexaro list codepages    the code pages: number, name, kind, family (--aliases: and their other names)
+  lexaro list aliases      the other names of code pages, one a line
+  lexaro list languages    the languages and their defaults
+  lexaro list territories  the territories and their currencies
+  lexaro list sorts        the sort orders
+  lexaro list native       the system names that are known, and what they mean
 )";
 
-struct Page {
-  std::string name;
-  uint16_t id = 0;
-  std::string trouble;  // why it could not be loaded
-  LXCodePageInfo info{};
-  std::vector<std::string> aliases;
-
-  const char* kind() const {
-    if (info.shift_sensitive) return "mixed";
-    return info.max_length > 1 ? "multibyte" : "single-byte";
-  }
-  const char* family() const { return info.ascii_family ? "ASCII" : "EBCDIC"; }
+struct Listing {
+  const char* name;
+  const char* help;
+  ExitStatus (*run)(const CommonOptions& common, bool json);
 };
-
-int32_t collect_name(void* context, uint8_t type, const char* name) {
-  if (type == LX_CODEPAGE) static_cast<std::vector<std::string>*>(context)->emplace_back(name);
-  return 1;
-}
-
-using AliasMap = std::map<std::string, std::vector<std::string>>;
-
-int32_t collect_alias(void* context, const char* alias, const char* page) {
-  (*static_cast<AliasMap*>(context))[page].emplace_back(alias);
-  return 1;
-}
-
-Page load_page(const std::string& name) {
-  Page page;
-  page.name = name;
-  uint32_t rc = 0;
-  LXObjEntry* entry = LXGetObjFromName(LXGetObjManager(), LX_CODEPAGE, name.c_str(), -1, 1, &rc);
-  if (entry) {
-    page.id = LXGetObjId(entry);
-    entry = LXLoadObj(LXGetObjManager(), entry, &rc);
-  }
-  if (entry && rc == LX_OK) rc = LXGetCodePageInfo(entry, &page.info);
-  if (!entry || rc != LX_OK) page.trouble = describe_status(rc);
-  return page;
-}
-
-std::vector<Page> load_pages(bool aliases) {
-  std::vector<std::string> names;
-  LXEnumLocales(collect_name, &names, 0);
-  AliasMap by_page;
-  if (aliases) LXEnumAliases(LXGetObjManager(), collect_alias, &by_page);
-  std::vector<Page> pages;
-  for (const std::string& name : names) {
-    pages.push_back(load_page(name));
-    pages.back().aliases = by_page[name];
-  }
-  return pages;
-}
-
-Json page_json(const Page& page, bool aliases) {
-  Json json;
-  json["id"] = page.id;
-  json["name"] = page.name;
-  if (!page.trouble.empty()) {
-    json["error"] = page.trouble;
-    return json;
-  }
-  json["kind"] = page.kind();
-  json["family"] = page.family();
-  json["max_length"] = page.info.max_length;
-  json["substitution"] = page.info.substitution;
-  if (aliases) json["aliases"] = page.aliases;
-  return json;
-}
-
-// Words in lines of a fixed width, indented.
-std::string wrapped(const std::vector<std::string>& words, std::size_t indent) {
-  constexpr std::size_t kWidth = 100;
-  std::string text;
-  std::size_t column = kWidth;
-  for (const std::string& word : words) {
-    if (column + 1 + word.size() > kWidth) {
-      text += (text.empty() ? "" : "\n") + std::string(indent, ' ');
-      column = indent;
-    } else {
-      text += ' ';
-      ++column;
-    }
-    text += word;
-    column += word.size();
-  }
-  return text.empty() ? text : text + "\n";
-}
-
-std::string page_table(const std::vector<Page>& pages) {
-  std::size_t width = 4;
-  for (const Page& page : pages) width = std::max(width, page.name.size());
-  const auto row = [&](const std::string& id, const std::string& name, const std::string& kind, const char* family) {
-    return std::string(id.size() < 5 ? 5 - id.size() : 0, ' ') + id + "  " + name +
-           std::string(width - name.size() + 2, ' ') + kind +
-           (*family ? std::string(kind.size() < 13 ? 13 - kind.size() : 1, ' ') + family : "") + "\n";
-  };
-  std::string text = row("ID", "NAME", "KIND", "FAMILY");
-  for (const Page& page : pages) {
-    const std::string id = std::to_string(page.id);
-    text += page.trouble.empty() ? row(id, page.name, page.kind(), page.family())
-                                 : row(id, page.name, "unusable: " + page.trouble, "");
-    text += wrapped(page.aliases, 9);
-  }
-  return text;
-}
+constexpr Listing kListings[] = {
+    {"aliases", "List the other names of code pages", list_aliases},
+    {"languages", "List the languages", list_languages},
+    {"territories", "List the territories", list_territories},
+    {"sorts", "List the sort orders", list_sorts},
+    {"native", "List the system names of locales", list_native_names},
+};
 
 }  // namespace
 
-ExitStatus list_code_pages(const CommonOptions& common, bool aliases, bool json) {
-  const LibrarySession session(common.locale_directory);
-  const std::vector<Page> pages = load_pages(aliases);
-  if (json) {
-    Json list = Json::array();
-    for (const Page& page : pages) list.push_back(page_json(page, aliases));
-    print(list.dump(2, ' ', false, Json::error_handler_t::replace) + "\n");
-  } else {
-    print(page_table(pages));
-  }
-  ExitStatus status = ExitStatus::kExact;
-  for (const Page& page : pages) {
-    if (page.trouble.empty()) continue;
-    complain("code page " + page.name + ": " + page.trouble);
-    status = ExitStatus::kCodePage;
-  }
-  return status;
-}
-
 Command add_list_command(CLI::App& program) {
   CLI::App* app = program.add_subcommand("list", "List what the locale data hold");
-  CLI::App* pages = app->add_subcommand("codepages", "List the code pages in the order of the directory");
   auto aliases = std::make_shared<bool>(false);
   auto json = std::make_shared<bool>(false);
+  const auto add = [&](const char* name, const char* help) {
+    CLI::App* list = app->add_subcommand(name, help);
+    list->add_flag("--json", *json, "Write JSON");
+    return list;
+  };
+  CLI::App* pages = add("codepages", "List the code pages in the order of the directory");
   pages->add_flag("--aliases", *aliases, "Show the other names that are understood");
-  pages->add_flag("--json", *json, "Write JSON");
+  std::vector<CLI::App*> lists;
+  for (const Listing& listing : kListings) lists.push_back(add(listing.name, listing.help));
   app->require_subcommand(0, 1);
   app->footer(kExplanation);
-  return {app, [pages, aliases, json](const CommonOptions& common) {
+  return {app, [pages, lists, aliases, json](const CommonOptions& common) {
             if (pages->parsed()) return list_code_pages(common, *aliases, *json);
+            for (std::size_t i = 0; i < lists.size(); ++i) {
+              if (lists[i]->parsed()) return kListings[i].run(common, *json);
+            }
             print(kExplanation);
             return ExitStatus::kExact;
           }};

@@ -26,6 +26,7 @@ names, else from the installation that the program belongs to.
 Examples:
   lexaro convert -f IBM-1047 -t UTF-8 report.dat > report.txt
   lexaro list codepages
+  lexaro locale German_Austria.UTF-8
   lexaro help convert
 )";
 
@@ -96,14 +97,14 @@ std::vector<std::string> parser_arguments(int argument_count, char** arguments) 
 }
 
 ExitStatus run(int argument_count, char** arguments) {
-  CLI::App program("Converts text between code pages.", "lexaro");
+  CLI::App program("Converts text between code pages and shows what locales know.", "lexaro");
   CommonOptions common;
   program.add_option("--locale-dir", common.locale_directory, "Directory of the locale data")->type_name("DIR");
   program.set_version_flag("--version", std::string("lexaro ") + LXVersion());
   program.footer(kProgramNotes);
 
   const std::vector<Command> commands = {add_convert_command(program), add_list_command(program),
-                                         add_help_command(program)};
+                                         add_locale_command(program), add_help_command(program)};
   program.require_subcommand(1);
   program.fallthrough();
   for (const Command& command : commands) command.app->fallthrough();

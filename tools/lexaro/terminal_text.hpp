@@ -1,0 +1,37 @@
+// SPDX-License-Identifier: Apache-2.0
+// Text for people: UTF-8 inside the program, the terminal's encoding where it leaves.
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "lexaro/lexaro.h"
+
+namespace lx::tool {
+
+std::string utf8_of(const std::vector<LXUChar>& text);
+
+// Columns of a terminal: East Asian wide characters take two, combining ones none.
+std::size_t display_width(std::string_view utf8);
+
+// Writes UTF-8 text to standard output in the encoding of the user's terminal: what that lacks becomes "?". Control
+// characters from data do not reach it.
+void print_text(std::string_view utf8);
+
+// A table with columns as wide as their widest cell; columns of numbers stand at the right.
+class TextTable {
+ public:
+  using Row = std::vector<std::string>;
+
+  explicit TextTable(Row headings) { rows_.push_back(std::move(headings)); }
+  void add(Row row) { rows_.push_back(std::move(row)); }
+  std::string text() const;
+
+ private:
+  std::vector<Row> rows_;
+};
+
+}  // namespace lx::tool
