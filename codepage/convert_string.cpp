@@ -42,7 +42,7 @@ int32_t convert_string(const char* function, LXLocale* target_locale, char* out,
         if (source == nullptr) return -1;
         const CodePage& from = page_of(*source);
         return convert_bytes(page_of(call.locale), to_shifts, bytes_of(out), Target(out, out_size, flags), from,
-                             from_shifts, byte_source(from, in, from_shifts.state, in_length, flags))
+                             from_shifts, byte_source(from, in, from_shifts, in_length, flags))
             .count;
       });
 }

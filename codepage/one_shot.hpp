@@ -2,7 +2,7 @@
 // What all conversions of whole strings share: how lengths and options are read, where they stop, how they end.
 #pragma once
 
-#include "codepage/lengths.hpp"
+#include "codepage/text/kinds.hpp"
 #include "codepage/transcode.hpp"
 
 namespace lx {
@@ -28,11 +28,13 @@ struct Source {
 };
 
 // The same for bytes, whose length may be given in characters.
-inline Source<uint8_t> byte_source(const CodePage& page, const char* text, uint32_t state, int32_t length,
+inline Source<uint8_t> byte_source(const CodePage& page, const char* text, Shifts shifts, int32_t length,
                                    uint32_t flags) {
   Source<uint8_t> source(bytes_of(text), length);
   if ((flags & LX_OPT_CHARS) != 0 && !source.measured && source.length != 0) {
-    source.length = bytes_of_characters(page, source.text, state, source.length);
+    Text<char> given = {text, 0, shifts.state};
+    source.length = shifts.followed ? ShiftedKind::length_of_characters(page, given, source.length)
+                                    : PlainKind::length_of_characters(page, given, source.length);
   }
   return source;
 }

@@ -2,29 +2,10 @@
 // The primitives of a code page. They stand in inner loops of callers: nothing is checked or traced.
 #include <cstring>
 
+#include "codepage/text/page_forms.hpp"
 #include "codepage/text/text_kinds.hpp"
 #include "frame/records.hpp"
 #include "objects/entry.hpp"
-
-namespace lx {
-namespace {
-
-// The walk is proved for bytes that begin a multibyte character; the others have their types in a table of bytes.
-const LXCharType& type_entry(const CodePage& page, const uint8_t* bytes) {
-  static const LXCharType kNoType = {kUnassignedType, 0};
-  const TypeState* state = page.raw.type_states;
-  if (state == nullptr || (!page.shift_sensitive && page.char_length[*bytes] < 2)) return kNoType;
-  while (state->final == 0) {
-    state = page.raw.type_states + state->index + (*bytes & state->mask);
-    ++bytes;
-  }
-  return page.types[state->index + (*bytes & state->mask)];
-}
-
-uint32_t other_case(uint32_t packed, const LXCharType& type) { return packed + static_cast<uint32_t>(type.delta); }
-
-}  // namespace
-}  // namespace lx
 
 using namespace lx;
 
@@ -51,32 +32,11 @@ LXWChar LXCpUnicodeToCharW(const LXObjEntry* record, LXUChar ucs2) noexcept {
 }
 
 LXWChar LXCpMbHalfToFullW(const LXObjEntry* record, LXWChar packed) noexcept {
-  const CheckedCodePage& raw = code_page_of(*record).raw;
-  if (raw.half_to_full_count == 0) return 0;
-  uint32_t low = 0;
-  uint32_t high = raw.half_to_full_count - 1;
-  while (high > low) {
-    uint32_t middle = (low + high) / 2;
-    if (packed > raw.half_to_full[middle].half) {
-      low = middle + 1;
-    } else {
-      high = middle;
-    }
-  }
-  return raw.half_to_full[high].half == packed ? LXWChar{raw.half_to_full[high].full} : 0;
+  return full_width(code_page_of(*record), packed);
 }
 
 LXWChar LXCpFullToHalfW(const LXObjEntry* record, LXWChar packed) noexcept {
-  const CheckedCodePage& raw = code_page_of(*record).raw;
-  if (raw.full_width != nullptr) {
-    for (uint32_t byte = 0; byte < 256; ++byte) {
-      if (raw.full_width[byte] == packed) return byte;
-    }
-  }
-  for (uint32_t i = 0; i < raw.half_to_full_count; ++i) {
-    if (raw.half_to_full[i].full == packed) return raw.half_to_full[i].half;
-  }
-  return 0;
+  return code_page_of(*record).half_width(packed);
 }
 
 LXWChar LXMbToW(const LXObjEntry* record, const char* bytes) noexcept {

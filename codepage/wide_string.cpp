@@ -20,7 +20,7 @@ struct AsPackedText {
 
 OneShotResult pack_text(const CodePage& page, LXWChar* out, int32_t out_size, const char* in, Shifts shifts,
                         int32_t in_length, uint32_t flags) {
-  Source<uint8_t> source = byte_source(page, in, shifts.state, in_length, flags);
+  Source<uint8_t> source = byte_source(page, in, shifts, in_length, flags);
   Target target(out, out_size, flags);
   return with_reader(page, shifts, source.text, source.length, [&](auto reader) {
     return convert_source(source, reader, WideWriter(page, out, target.text_size()), target, AsPackedText());

@@ -9,8 +9,9 @@
 
 namespace lx {
 
-struct CodePage;  // native tables of a code page, objects/code_page.hpp
-struct Alias;     // objects/aliases.hpp
+struct CodePage;   // native tables of a code page, objects/code_page.hpp
+class SortTables;  // of a sort object, objects/sort_object.hpp
+struct Alias;      // objects/aliases.hpp
 
 inline constexpr unsigned kObjectTypes = 4;
 
@@ -56,10 +57,16 @@ struct LXObjEntry {
   std::atomic<const uint8_t*> section1;
   const uint8_t* more_sections[3];
   const lx::CodePage* code_page;
+  const lx::SortTables* sort;
   const LXUChar* const* texts;  // of a language or territory, in machine order: see objects/entry.hpp
 
   bool loaded() const { return section1.load(std::memory_order_acquire) != nullptr; }
 };
+
+// Places for the code page pairs that a manager was asked for, each a block of its own (nls1/translate.cpp).
+namespace lx {
+inline constexpr unsigned kPairPlaces = 64;
+}
 
 struct LXObjMgr {
   LXObjEntry* entries;
@@ -68,6 +75,7 @@ struct LXObjMgr {
   char directory[256];  // empty on built-in data
   lx::Alias* aliases;
   char* alias_text;
+  std::atomic<const void*> pairs[lx::kPairPlaces];
 };
 
 struct LXLocale {

@@ -199,7 +199,7 @@ uint32_t set_wide(LXLocale& locale, uint32_t number, const Source<LXWChar>& sour
 }
 
 uint32_t set_bytes(LXLocale& locale, uint32_t number, const char* text, int32_t length, uint32_t options) {
-  Source<uint8_t> source = byte_source(code_page_of(*locale.code_page), text, 0, length, options);
+  Source<uint8_t> source = byte_source(code_page_of(*locale.code_page), text, {}, length, options);
   return set_text(locale, number, {text, source.length});
 }
 
@@ -267,7 +267,7 @@ int32_t LXSetLocaleTextInfoEx(LXLocale* locale, uint32_t item, const char* text,
     const CodePage& page = code_page_of(*code_page);
     // A text of the locale's own page without shift states is just a text.
     if (code_page == own.code_page && !page.shift_sensitive) return set_bytes(own, item, text, length, options);
-    Source<uint8_t> source = byte_source(page, text, 0, length, options);
+    Source<uint8_t> source = byte_source(page, text, {true, 0}, length, options);
     return with_reader(page, {true, 0}, source.text, source.length,
                        [&](auto in) { return set_read(own, item, in, source.length); });
   });

@@ -5,6 +5,7 @@
 #include <pthread.h>
 
 #include <algorithm>
+#include <bit>
 #include <cstring>
 #include <new>
 
@@ -222,6 +223,30 @@ void fill_types(CodePage& page, LXCharType* types) {
   }
 }
 
+uint32_t bits_for_half_forms(const CheckedCodePage& checked) {
+  uint32_t forms = (checked.full_width != nullptr ? 256 : 0) + checked.half_to_full_count;
+  return forms != 0 ? static_cast<uint32_t>(std::bit_width(forms)) + 1 : 0;
+}
+
+void fill_half_forms(CodePage& page, uint64_t* forms, uint32_t bits) {
+  if (bits == 0) return;
+  page.half_forms = forms;
+  page.half_form_bits = bits;
+  for (size_t i = 0; i < size_t{1} << bits; ++i) forms[i] = CodePage::kNoHalfForm;
+  // Of several half-width forms the first one stays: a byte, then the lowest pair.
+  auto add = [&](uint32_t full, uint32_t form) {
+    size_t at = page.half_form_place(full);
+    while (static_cast<uint32_t>(forms[at]) != CodePage::kNoHalfForm) {
+      if (forms[at] >> 32 == full) return;
+      at = page.next_half_form(at);
+    }
+    forms[at] = uint64_t{full} << 32 | form;
+  };
+  const CheckedCodePage& raw = page.raw;
+  for (uint32_t byte = 0; raw.full_width != nullptr && byte < 256; ++byte) add(raw.full_width[byte], byte);
+  for (uint32_t i = 0; i < raw.half_to_full_count; ++i) add(raw.half_to_full[i].full, i + 256);
+}
+
 void fill_header(CodePage& page, uint16_t id) {
   const CodePageHeader& header = *page.raw.header;
   page.id = id;
@@ -240,14 +265,20 @@ struct BlockPlan {
   size_t nodes_size;
   size_t rows_size;
   size_t types_size;
+  uint32_t half_form_bits;
+  size_t half_forms_size;
 
   BlockPlan(uint16_t id, const CheckedCodePage& checked)
       : numbers(checked),
         from(checked, id == kUtf8Id),
         nodes_size(aligned(numbers.nodes() * kPageSize * sizeof(uint16_t))),
         rows_size(aligned(numbers.rows() * kPageSize * sizeof(uint16_t))),
-        types_size(checked.type_entry_count * sizeof(LXCharType)) {}
-  size_t size() const { return aligned(sizeof(CodePage)) + nodes_size + rows_size + from.size() + types_size; }
+        types_size(aligned(checked.type_entry_count * sizeof(LXCharType))),
+        half_form_bits(bits_for_half_forms(checked)),
+        half_forms_size(half_form_bits != 0 ? sizeof(uint64_t) << half_form_bits : 0) {}
+  size_t size() const {
+    return aligned(sizeof(CodePage)) + nodes_size + rows_size + from.size() + types_size + half_forms_size;
+  }
 };
 
 CodePage* place(uint8_t* block, uint16_t id, const CheckedCodePage& checked, const BlockPlan& plan) {
@@ -268,7 +299,9 @@ CodePage* place(uint8_t* block, uint16_t id, const CheckedCodePage& checked, con
   } else {
     fill_from_unicode(*page, reinterpret_cast<uint16_t*>(from_pages), page->from_narrow);
   }
-  fill_types(*page, reinterpret_cast<LXCharType*>(from_pages + plan.from.size()));
+  uint8_t* types = from_pages + plan.from.size();
+  fill_types(*page, reinterpret_cast<LXCharType*>(types));
+  fill_half_forms(*page, reinterpret_cast<uint64_t*>(types + plan.types_size), plan.half_form_bits);
   note_ascii(*page);
   return page;
 }

@@ -80,6 +80,12 @@ struct CodePage {
 
   const LXCharType* types;  // native copies of the type entries
 
+  // Half-width forms, found by the hash of the full-width character: it is in the upper half, in the lower one stands
+  // where the half-width form is, a byte, or a pair and 256. Null: the page has none.
+  static constexpr uint32_t kNoHalfForm = UINT32_MAX;
+  const uint64_t* half_forms;
+  uint32_t half_form_bits;  // the table has 1 << bits places, half of them free
+
   uint32_t packed(uint16_t ucs2) const {
     const uint16_t* narrow = from_narrow[ucs2 >> 8];
     return narrow != nullptr ? narrow[ucs2 & 0xFF] : from_wide[ucs2 >> 8][ucs2 & 0xFF];
@@ -87,6 +93,18 @@ struct CodePage {
   // Whether a packed value stands for the wanted character or merely in its place.
   bool stands_in(uint32_t packed_value, uint16_t ucs2) const {
     return packed_value == substitution && to_unicode[substitution] != ucs2;
+  }
+
+  size_t half_form_place(uint32_t full) const { return full * 0x9E3779B1u >> (32 - half_form_bits); }
+  size_t next_half_form(size_t place) const { return (place + 1) & ((size_t{1} << half_form_bits) - 1); }
+  // 0: none.
+  uint32_t half_width(uint32_t full) const {
+    if (half_forms == nullptr) return 0;
+    for (size_t at = half_form_place(full);; at = next_half_form(at)) {
+      auto form = static_cast<uint32_t>(half_forms[at]);
+      if (form == kNoHalfForm) return 0;
+      if (half_forms[at] >> 32 == full) return form < 256 ? form : uint32_t{raw.half_to_full[form - 256].half};
+    }
   }
 
   // The value of the character at `bytes`, of which the tables never read more than its length.

@@ -29,6 +29,9 @@ inline bool is_loaded_code_page(const LXObjEntry* entry) {
   return entry != nullptr && entry->type == LX_CODEPAGE && entry->loaded();
 }
 
+// Forgets the pairs of code pages that the manager keeps. False: a free callback failed.
+bool drop_pairs(LXObjMgr& manager);
+
 inline const CodePage& code_page_of(const LXObjEntry& entry) { return *entry.code_page; }
 
 }  // namespace lx

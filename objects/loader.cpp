@@ -9,14 +9,13 @@
 #include "objects/entry.hpp"
 #include "objects/file_format.hpp"
 #include "objects/native_texts.hpp"
+#include "objects/sort_object.hpp"
 #include "objects/text_check.hpp"
 
 namespace lx {
 namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "loader", 0};
-
-constexpr uint32_t kSortHeaderSize = 1036;
 
 // An object on its way into its entry. Sections become visible to readers only by publish().
 struct Loading {
@@ -25,6 +24,7 @@ struct Loading {
   uint8_t flags = 0;
   Owned<CodePage> code_page;
   Owned<const LXUChar* const> texts;
+  Owned<const SortTables> sort;
 
   SectionBytes bytes(unsigned section) const { return {sections[section].get(), sizes[section]}; }
 };
@@ -104,10 +104,12 @@ uint32_t check_object(const LXObjEntry& entry, const FileHeader& header, Loading
     case LX_CODEPAGE:
       return check_code_page_object(entry, header, loading);
     default:
-      wrong = section.size >= kSortHeaderSize ? nullptr : "section 1 size";
-      break;
+      wrong = check_sort(section);
+      if (wrong != nullptr) break;
+      loading.sort.reset(build_sort_tables(section.data));
+      return loading.sort ? LX_OK : LX_E_MEMORY;
   }
-  return wrong == nullptr ? LX_OK : corrupted(entry, wrong);
+  return corrupted(entry, wrong);
 }
 
 void publish(LXObjEntry& entry, Loading& loading) {
@@ -115,6 +117,7 @@ void publish(LXObjEntry& entry, Loading& loading) {
   for (unsigned i = 1; i < kMaxSections; ++i) entry.more_sections[i - 1] = loading.sections[i].give_up();
   entry.code_page = loading.code_page.give_up();
   entry.texts = loading.texts.give_up();
+  entry.sort = loading.sort.give_up();
   entry.section1.store(loading.sections[0].give_up(), std::memory_order_release);
 }
 
@@ -164,10 +167,12 @@ LXObjEntry* LXLoadObj(LXObjMgr* manager, LXObjEntry* entry, uint32_t* rc) noexce
   });
 }
 
-uint32_t LXUnloadObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
+uint32_t LXUnloadObj(LXObjMgr* manager, LXObjEntry* entry) noexcept {
   return exported(trace_unit, __func__, [&]() -> uint32_t {
     if (entry == nullptr || (entry->flags & kEntryBuiltIn) != 0) return LX_OK;
     uint32_t result = LX_OK;
+    if (manager == nullptr) manager = LXGetObjManager();
+    if (manager != nullptr && entry->code_page != nullptr && !drop_pairs(*manager)) result = LX_E_FREE;
     for (unsigned i = kMaxSections; i-- > 0;) {
       const uint8_t* section = i == 0 ? entry->section1.exchange(nullptr, std::memory_order_acq_rel)
                                       : std::exchange(entry->more_sections[i - 1], nullptr);
@@ -175,8 +180,9 @@ uint32_t LXUnloadObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
     }
     const CodePage* code_page = std::exchange(entry->code_page, nullptr);
     if (code_page != nullptr && !release(code_page)) result = LX_E_FREE;
-    // What was read, and the texts in machine order that stand for it, is given back without a look.
+    // What was read, and what was made to stand for it, is given back without a look.
     Owned<const LXUChar* const>(std::exchange(entry->texts, nullptr));
+    Owned<const SortTables>(std::exchange(entry->sort, nullptr));
     entry->flags = 0;
     return result;
   });

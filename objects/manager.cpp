@@ -57,6 +57,15 @@ size_t name_size(const char* name, int32_t length) {
 }
 
 }  // namespace
+bool drop_pairs(LXObjMgr& manager) {
+  bool all = true;
+  for (std::atomic<const void*>& place : manager.pairs) {
+    const void* pair = place.exchange(nullptr, std::memory_order_acq_rel);
+    if (pair != nullptr && !release(pair)) all = false;
+  }
+  return all;
+}
+
 }  // namespace lx
 
 using namespace lx;
@@ -101,6 +110,7 @@ uint32_t LXTermObjManager(LXObjMgr* manager) noexcept {
       LXObjEntry& entry = manager->entries[i];
       if (entry.loaded() && (entry.flags & kEntryBuiltIn) == 0) result = LXUnloadObj(manager, &entry);
     }
+    if (!drop_pairs(*manager)) result = 1;
     if (manager->entries != nullptr && !release(manager->entries)) result = 1;
     if (!release(manager)) result = 1;
     return result;

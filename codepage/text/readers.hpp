@@ -246,8 +246,10 @@ struct ShiftedReader : ByteReader {
   static constexpr bool kShifted = true;
 
   bool double_byte;
-  bool past_shift = false;             // the character begins here, whatever its first byte
-  const uint8_t* odd_shift = nullptr;  // a shift byte that changed nothing, until somebody takes note of it
+  bool past_shift = false;                // the character begins here, whatever its first byte
+  bool all_shifts = false;                // a shift byte is never a character, however many there are
+  const uint8_t* behind_shift = nullptr;  // where the last shift byte ended
+  const uint8_t* odd_shift = nullptr;     // a shift byte that changed nothing, until somebody takes note of it
 
   ShiftedReader(const CodePage& code_page, const uint8_t* text, size_t length, uint32_t state)
       : ByteReader(code_page, text, length),
@@ -272,6 +274,9 @@ struct ShiftedReader : ByteReader {
   }
 
   bool at_shift() const { return *at == page->enter_byte || *at == page->leave_byte; }
+  void skip_shifts() {
+    for (; !done() && at_shift(); ++at) double_byte = *at == page->enter_byte;
+  }
   size_t length_here() const { return double_byte ? page->max_length : size_t{1}; }
   uint16_t decode() const {
     if (!double_byte) return page->to_unicode[*start];
@@ -311,7 +316,7 @@ struct ShiftedReader : ByteReader {
   bool turn() {
     if (*at != (double_byte ? leave_ : enter_) || at[1] == enter_ || at[1] == leave_) return false;
     double_byte = !double_byte;
-    ++at;
+    behind_shift = ++at;
     return true;
   }
   bool ascii_ahead() const {
@@ -320,13 +325,15 @@ struct ShiftedReader : ByteReader {
 
  private:
   Got find_character() {
-    if (!past_shift && !done() && at_shift()) {
+    while (!past_shift && !done() && at_shift()) {
       bool enters = *at == page->enter_byte;
       if (enters == double_byte) odd_shift = at;
       double_byte = enters;
-      ++at;
+      behind_shift = ++at;
+      if (all_shifts) continue;
       if (strict && !done() && at_shift()) return Got::shift;
       past_shift = !strict;
+      break;
     }
     if (done()) return Got::end;
     size_t length = length_here();

@@ -49,6 +49,11 @@ typedef struct LXCharType {
   int32_t delta;  /* added to the character's packed value it gives the other case */
 } LXCharType;
 
+typedef struct LXSpecialWeight {
+  uint16_t position;
+  uint16_t weight;
+} LXSpecialWeight;
+
 typedef void* (*LXAllocFn)(void* context, size_t size);                     /* null: no memory */
 typedef int (*LXFreeFn)(void* context, void* block);                        /* non-zero: success */
 typedef int32_t (*LXEnumFn)(void* context, uint8_t type, const char* name); /* 0 stops the enumeration */
@@ -175,6 +180,37 @@ typedef int32_t (*LXEnumUFn)(void* context, uint8_t type, const LXUChar* name);
 #define LX_CT_BLANK 0x080u
 #define LX_CT_CNTRL 0x100u
 #define LX_CT_ASCII 0x200u
+
+/* Classes of character types (LXGetCharType): the LX_CT_ bits, the bidirectional class, the script bits. */
+#define LX_CTYPE_1 0x80000010u
+#define LX_CTYPE_2 0x80000011u
+#define LX_CTYPE_3 0x80000012u
+
+/* Line ends: the code page's line bytes 1 to 4 (line feed; 2: carriage return and line feed), in U text U+000A,
+   U+000D U+000A, U+2028 and U+2029. */
+#define LX_EOL_1 0x100u
+#define LX_EOL_21 0x200u
+#define LX_EOL_3 0x400u
+#define LX_EOL_4 0x800u
+#define LX_EOL_DEFAULT 0x1000u  /* writing: line byte 1 */
+#define LX_EOL_NONE 0x80000030u /* found: none */
+#define LX_EOL_BAD 0x80000031u  /* bad flags */
+
+#define LX_TRUNC_STRIP 0x800000u /* strip trailing blanks */
+
+#define LX_MAP_H2F 0x80000021u /* half width to full width */
+#define LX_MAP_F2H 0x80000022u
+#define LX_MAP_COPY 0x80000023u
+#define LX_MAP_LOWER 0x80000024u
+#define LX_MAP_UPPER 0x80000025u
+#define LX_MAP_PLAIN 0x2000u /* with the two before: without the language's special pairs */
+#define LX_MAP_DIGITS 16u    /* digits of other scripts to ASCII */
+
+#define LX_CMP_NOCASE 0x80000040u
+#define LX_CMP_NOWIDTH 0x80000041u
+#define LX_CMP_TRIM 0x200000u
+#define LX_STR_LAST 0x80000020u /* the last occurrence */
+#define LX_COLL_TRIM 1u         /* ignore trailing blanks (LXStrcoll, LXStrcollEx) */
 
 /* ---- Library state ---- */
 
@@ -534,6 +570,254 @@ extern LX_API const uint16_t LX_UNICODE_F2H3[53];  /* U+3130 */
 extern LX_API const uint16_t LX_UNICODE_F2H4[7];   /* U+FFE0 */
 /* Digits in ascending order, each with the ASCII digit that it stands for. */
 extern LX_API const uint16_t LXDigits[179][2];
+
+/* ---- Characters of a text ---- */
+/*
+ * `s` points at a character of the locale's code page. The Ex forms follow shift states on shift-sensitive code pages
+ * (0 single-byte, 1 double-byte) and equal the plain ones elsewhere. Nothing looks behind the character or text that is
+ * given. Every out pointer is optional. Failure values are null, -1 and 0, with LX_E_ARGUMENT for bad options.
+ */
+
+/* Entry of the code page's length table for the first byte; 0: it begins no character (walks then step by one). */
+LX_API int32_t LXByteLength(LXLocale* locale, const char* s) LX_NOEXCEPT;
+/* Bytes of a packed character, 1 to 4. */
+LX_API int32_t LXByteLengthW(LXLocale* locale, LXWChar value) LX_NOEXCEPT;
+LX_API int32_t LXByteLengthEx(LXLocale* locale, const char* s, uint32_t state) LX_NOEXCEPT;
+/* The next character, and the one before `current` in the text that begins at `start`. */
+LX_API char* LXNextChar(LXLocale* locale, const char* s) LX_NOEXCEPT;
+LX_API char* LXNextCharEx(LXLocale* locale, const char* s, uint32_t state, uint32_t* new_state) LX_NOEXCEPT;
+LX_API char* LXPrevChar(LXLocale* locale, const char* start, const char* current) LX_NOEXCEPT;
+LX_API char* LXPrevCharEx(LXLocale* locale, const char* start, const char* current, uint32_t state,
+                          uint32_t* new_state) LX_NOEXCEPT;
+/* Whole characters; shift bytes are none. */
+LX_API int32_t LXNumChars(LXLocale* locale, const char* s, int32_t byte_length) LX_NOEXCEPT;
+LX_API int32_t LXNumCharsEx(LXLocale* locale, const char* s, uint32_t state, int32_t byte_length) LX_NOEXCEPT;
+/* The last character start that is not more than `count` bytes (LX_OPT_CHARS: characters) away. */
+LX_API char* LXMoveStringPointer(LXLocale* locale, const char* s, int32_t count, uint32_t flags) LX_NOEXCEPT;
+LX_API char* LXMoveStringPointerEx(LXLocale* locale, const char* s, uint32_t state, int32_t count,
+                                   uint32_t flags) LX_NOEXCEPT;
+/* One character, packed. */
+LX_API LXWChar LXGetChar(LXLocale* locale, const char* s) LX_NOEXCEPT;
+LX_API LXWChar LXGetCharEx(LXLocale* locale, const char* s, uint32_t state) LX_NOEXCEPT;
+LX_API void LXPutChar(LXLocale* locale, char* out, LXWChar packed) LX_NOEXCEPT;
+LX_API void LXPutCharEx(LXLocale* locale, char* out, LXWChar packed, uint32_t state) LX_NOEXCEPT;
+LX_API void LXInitState(LXLocale* locale, uint32_t* state) LX_NOEXCEPT;
+/* Bytes of the character that are there before a terminator. */
+LX_API int32_t LXValidChar(LXLocale* locale, const char* s) LX_NOEXCEPT;
+LX_API int32_t LXValidCharEx(LXLocale* locale, const char* s, uint32_t state) LX_NOEXCEPT;
+/* Type bits of a character in one of the classes LX_CTYPE_; another class gives LX_E_ARGUMENT and the bits of
+   LX_CTYPE_1 all the same. */
+LX_API uint32_t LXGetCharType(LXLocale* locale, const char* s, uint32_t class_id) LX_NOEXCEPT;
+LX_API uint32_t LXGetCharTypeW(LXLocale* locale, LXWChar packed, uint32_t class_id) LX_NOEXCEPT;
+LX_API uint32_t LXGetCharTypeU(LXLocale* locale, LXUChar ch, uint32_t class_id) LX_NOEXCEPT;
+LX_API uint32_t LXGetCharTypeEx(LXLocale* locale, const char* s, uint32_t state, uint32_t class_id) LX_NOEXCEPT;
+/*
+ * The position behind the first line end of the kinds in `flags` (LX_EOL_1 to LX_EOL_4; 0: LX_EOL_1; LX_OPT_CHARS), its
+ * kind and its length in units. Null with LX_EOL_NONE: there is none; null with LX_EOL_BAD: bad flags.
+ */
+LX_API char* LXGetEol(LXLocale* locale, const char* s, int32_t length, uint32_t* type, int32_t* eol_length,
+                      uint32_t flags) LX_NOEXCEPT;
+LX_API LXUChar* LXGetEolU(LXLocale* locale, const LXUChar* s, int32_t length, uint32_t* type, int32_t* eol_length,
+                          uint32_t flags) LX_NOEXCEPT;
+LX_API LXWChar* LXGetEolW(LXLocale* locale, const LXWChar* s, int32_t length, uint32_t* type, int32_t* eol_length,
+                          uint32_t flags) LX_NOEXCEPT;
+LX_API char* LXGetEolEx(LXLocale* locale, const char* s, uint32_t state, int32_t length, uint32_t* type,
+                        int32_t* eol_length, uint32_t flags) LX_NOEXCEPT;
+/* Writes line ends, of several flags in the order 4, 3, 1, 2; 0: LX_EOL_DEFAULT. Returns the position behind them. */
+LX_API char* LXPutEol(LXLocale* locale, char* out, uint32_t flags) LX_NOEXCEPT;
+LX_API LXUChar* LXPutEolU(LXLocale* locale, LXUChar* out, uint32_t flags) LX_NOEXCEPT;
+LX_API LXWChar* LXPutEolW(LXLocale* locale, LXWChar* out, uint32_t flags) LX_NOEXCEPT;
+LX_API char* LXPutEolEx(LXLocale* locale, char* out, uint32_t state, uint32_t flags) LX_NOEXCEPT;
+/* Returns shift-sensitive output to the single-byte state, with LX_OPT_TERMINATE also terminates it: bytes written. */
+LX_API int32_t LXTerminateStringEx(LXLocale* locale, char* out, uint32_t state, uint32_t flags) LX_NOEXCEPT;
+/*
+ * Cuts a string so that it fits in `size` bytes with its terminator, and strips trailing blanks (LX_TRUNC_STRIP; with
+ * LX_CMP_NOWIDTH full-width ones too; LX_OPT_CHARS). Returns the size used, or 0 for a string that fits and was left
+ * alone. On multibyte code pages a last single-byte character does not end a run of blanks: "Plan A" is stripped to
+ * "Plan".
+ */
+LX_API int32_t LXTruncateString(LXLocale* locale, char* string, int32_t size, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXTruncateStringEx(LXLocale* locale, char* string, uint32_t state, int32_t size,
+                                  uint32_t flags) LX_NOEXCEPT;
+
+/* ---- Unicode character mapping ---- */
+
+LX_API LXUChar LXUnicodeToLower(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
+LX_API LXUChar LXUnicodeToUpper(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
+/* The full-width and the half-width form. */
+LX_API LXUChar LXUnicodeToH2F(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
+LX_API LXUChar LXUnicodeToF2H(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
+/*
+ * Maps a whole text: LX_MAP_, or 0 (copy), with LX_OPT_CHARS. Case mapping follows the special pairs of the language,
+ * unless LX_MAP_PLAIN is set. A measured length includes the terminator. Returns the units (characters) written; what
+ * does not fit is left out. With LX_OPT_CHARS no more than 512 bytes of output are made.
+ */
+LX_API int32_t LXMapString(LXLocale* locale, char* out, int32_t out_size, const char* in, int32_t in_len,
+                           uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXMapStringEx(LXLocale* locale, char* out, int32_t out_size, const char* in, uint32_t state,
+                             int32_t in_len, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXMapStringW(LXLocale* locale, LXWChar* out, int32_t out_size, const LXWChar* in, int32_t in_len,
+                            uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXMapStringU(LXLocale* locale, LXUChar* out, int32_t out_size, const LXUChar* in, int32_t in_len,
+                            uint32_t flags) LX_NOEXCEPT;
+
+/* ---- Strings ---- */
+/*
+ * No function here cuts a character. Lengths count units, with LX_OPT_CHARS characters; negative ones are measured,
+ * with the terminator where the text is copied or searched, without it where it is spanned, joined or cut into tokens.
+ */
+
+/*
+ * Compares in code page order: less than, equal to or greater than 0. options: 0, LX_CMP_NOCASE or LX_CMP_NOWIDTH,
+ * LX_CMP_TRIM (ignore trailing blanks), LX_OPT_CHARS. 0 with LX_E_ARGUMENT or LX_E_MEMORY on failure.
+ */
+LX_API int32_t LXStrcmp(LXLocale* locale, const char* str1, int32_t len1, const char* str2, int32_t len2,
+                        uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcmpEx(LXLocale* locale, const char* str1, uint32_t state1, int32_t len1, const char* str2,
+                          uint32_t state2, int32_t len2, uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXWcscmp(LXLocale* locale, const LXWChar* wstr1, int32_t len1, const LXWChar* wstr2, int32_t len2,
+                        uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcmpU(LXLocale* locale, const LXUChar* ustr1, int32_t len1, const LXUChar* ustr2, int32_t len2,
+                         uint32_t options) LX_NOEXCEPT;
+/* Bytes of whole characters in `len` bytes of shift-sensitive text. */
+LX_API int32_t AdjustLength(LXLocale* locale, const char* str, uint32_t state, int32_t len) LX_NOEXCEPT;
+/* Copies whole characters, without adding a terminator: units (characters) copied. */
+LX_API int32_t LXStrcpy(LXLocale* locale, char* dst, int32_t dst_size, const char* src, int32_t src_len,
+                        uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcpyEx(LXLocale* locale, char* dst, int32_t dst_size, const char* src, uint32_t state,
+                          int32_t src_len, uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXWcscpy(LXLocale* locale, LXWChar* dst, int32_t dst_size, const LXWChar* src, int32_t src_len,
+                        uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcpyU(LXLocale* locale, LXUChar* dst, int32_t dst_size, const LXUChar* src, int32_t src_len,
+                         uint32_t options) LX_NOEXCEPT;
+/* Appends to a terminated text, which must have the room; LX_OPT_TERMINATE, or a measured length, terminates it.
+   Returns the new length, with the terminator when one was written. */
+LX_API int32_t LXStrcat(LXLocale* locale, char* dst, const char* src, int32_t src_len, uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcatEx(LXLocale* locale, char* dst, const char* src, uint32_t state, int32_t src_len,
+                          uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXWcscat(LXLocale* locale, LXWChar* dst, const LXWChar* src, int32_t src_len,
+                        uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcatU(LXLocale* locale, LXUChar* dst, const LXUChar* src, int32_t src_len,
+                         uint32_t options) LX_NOEXCEPT;
+/* The first (LX_STR_LAST: last) occurrence of a character. */
+LX_API char* LXStrchr(LXLocale* locale, const char* str, int32_t len, const char* ch, uint32_t options) LX_NOEXCEPT;
+LX_API char* LXStrchrEx(LXLocale* locale, const char* str, uint32_t state, int32_t len, const char* ch,
+                        uint32_t ch_state, uint32_t* match_state, uint32_t options) LX_NOEXCEPT;
+LX_API LXWChar* LXWcschr(LXLocale* locale, const LXWChar* wstr, int32_t len, LXWChar ch, uint32_t options) LX_NOEXCEPT;
+LX_API LXUChar* LXStrchrU(LXLocale* locale, const LXUChar* ustr, int32_t len, LXUChar ch, uint32_t options) LX_NOEXCEPT;
+/* The first occurrence of a text. options: 0, LX_CMP_NOCASE, LX_CMP_NOWIDTH, LX_OPT_CHARS. */
+LX_API char* LXStrstr(LXLocale* locale, const char* str, int32_t len, const char* sub, int32_t sub_len,
+                      uint32_t options) LX_NOEXCEPT;
+LX_API char* LXStrstrEx(LXLocale* locale, const char* str, uint32_t state, int32_t len, const char* sub,
+                        uint32_t sub_state, int32_t sub_len, uint32_t* match_state, uint32_t options) LX_NOEXCEPT;
+LX_API LXWChar* LXWcsstr(LXLocale* locale, const LXWChar* wstr, int32_t len, const LXWChar* sub, int32_t sub_len,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API LXUChar* LXStrstrU(LXLocale* locale, const LXUChar* ustr, int32_t len, const LXUChar* sub, int32_t sub_len,
+                          uint32_t options) LX_NOEXCEPT;
+/* Length of the beginning that consists of characters in the set (spn), or of characters that are not (cspn). */
+LX_API int32_t LXStrspn(LXLocale* locale, const char* str, int32_t len, const char* set, int32_t set_len,
+                        uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrspnEx(LXLocale* locale, const char* str, uint32_t state, int32_t len, const char* set,
+                          uint32_t set_state, int32_t set_len, uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXWcsspn(LXLocale* locale, const LXWChar* wstr, int32_t len, const LXWChar* set, int32_t set_len,
+                        uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrspnU(LXLocale* locale, const LXUChar* ustr, int32_t len, const LXUChar* set, int32_t set_len,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcspn(LXLocale* locale, const char* str, int32_t len, const char* set, int32_t set_len,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcspnEx(LXLocale* locale, const char* str, uint32_t state, int32_t len, const char* set,
+                           uint32_t set_state, int32_t set_len, uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXWcscspn(LXLocale* locale, const LXWChar* wstr, int32_t len, const LXWChar* set, int32_t set_len,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcspnU(LXLocale* locale, const LXUChar* ustr, int32_t len, const LXUChar* set, int32_t set_len,
+                          uint32_t options) LX_NOEXCEPT;
+/*
+ * The next token: skips delimiters, overwrites the one that ends the token with zeros, and leaves in *next and *len the
+ * rest, for the next call. Null, with *next null, when there is none.
+ */
+LX_API char* LXStrtok(LXLocale* locale, char* str, int32_t* len, const char* delims, int32_t delims_len, char** next,
+                      uint32_t options) LX_NOEXCEPT;
+LX_API char* LXStrtokEx(LXLocale* locale, char* str, uint32_t* state, int32_t* len, const char* delims,
+                        uint32_t delims_state, int32_t delims_len, char** next, uint32_t options) LX_NOEXCEPT;
+LX_API LXWChar* LXWcstok(LXLocale* locale, LXWChar* wstr, int32_t* len, const LXWChar* delims, int32_t delims_len,
+                         LXWChar** next, uint32_t options) LX_NOEXCEPT;
+LX_API LXUChar* LXStrtokU(LXLocale* locale, LXUChar* ustr, int32_t* len, const LXUChar* delims, int32_t delims_len,
+                          LXUChar** next, uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrByteLength(LXLocale* locale, LXWChar value) LX_NOEXCEPT;
+/* Units before the terminator. */
+LX_API int32_t LXWcslen(LXLocale* locale, const LXWChar* wstr) LX_NOEXCEPT;
+LX_API int32_t LXStrlenU(LXLocale* locale, const LXUChar* ustr) LX_NOEXCEPT;
+
+/* ---- Collation ---- */
+
+/*
+ * Weights of a character, or of a pair that combines, in a sort object: 0 none, 1 one set, 2 two sets. A weight of 0
+ * means nothing at that level; mask bits 8, 4, 2, 1: the weight of the primary, secondary, tertiary, special level
+ * stands in text order. No argument is checked but a null sort (0).
+ */
+LX_API int32_t LXSortGetWeights(const LXObjEntry* sort, LXUChar ch, uint16_t* primary, uint8_t* secondary,
+                                uint8_t* tertiary, uint16_t* special, uint16_t* primary2, uint8_t* secondary2,
+                                uint8_t* tertiary2, uint16_t* special2, uint8_t* mask) LX_NOEXCEPT;
+LX_API int32_t LXSortGetCombination(const LXObjEntry* sort, LXUChar ch1, LXUChar ch2, uint16_t* primary,
+                                    uint8_t* secondary, uint8_t* tertiary, uint16_t* special,
+                                    uint8_t* mask) LX_NOEXCEPT;
+/*
+ * Reads one character's weights and moves on. *remaining counts units, *position characters. *pending holds a character
+ * that was looked at already, 0xFFFF: none; set it so, and *position to 0, before the first call. Call again while
+ * *remaining is above 0 or *pending below 0xFFFF.
+ */
+LX_API int32_t LXStrGetNextWeight(LXLocale* locale, const char** text, int32_t* remaining, uint16_t* position,
+                                  uint16_t* primary, uint8_t* secondary, uint8_t* tertiary, uint16_t* special,
+                                  uint16_t* primary2, uint8_t* secondary2, uint8_t* tertiary2, uint16_t* special2,
+                                  uint8_t* mask, uint16_t* pending) LX_NOEXCEPT;
+LX_API int32_t LXStrGetNextWeightEx(LXLocale* locale, const char** text, int32_t* remaining, uint32_t* shift_state,
+                                    uint16_t* position, uint16_t* primary, uint8_t* secondary, uint8_t* tertiary,
+                                    uint16_t* special, uint16_t* primary2, uint8_t* secondary2, uint8_t* tertiary2,
+                                    uint16_t* special2, uint8_t* mask, uint16_t* pending) LX_NOEXCEPT;
+LX_API int32_t LXStrGetNextWeightW(LXLocale* locale, const LXWChar** text, int32_t* remaining, uint16_t* position,
+                                   uint16_t* primary, uint8_t* secondary, uint8_t* tertiary, uint16_t* special,
+                                   uint16_t* primary2, uint8_t* secondary2, uint8_t* tertiary2, uint16_t* special2,
+                                   uint8_t* mask, uint16_t* pending) LX_NOEXCEPT;
+LX_API int32_t LXStrGetNextWeightU(LXLocale* locale, const LXUChar** text, int32_t* remaining, uint16_t* position,
+                                   uint16_t* primary, uint8_t* secondary, uint8_t* tertiary, uint16_t* special,
+                                   uint16_t* primary2, uint8_t* secondary2, uint8_t* tertiary2, uint16_t* special2,
+                                   uint8_t* mask, uint16_t* pending) LX_NOEXCEPT;
+
+/*
+ * Compares by the locale's sort object: less than, equal to or greater than 0. options: 0, LX_CMP_NOCASE,
+ * LX_CMP_NOWIDTH; trailing blanks are ignored with LX_COLL_TRIM (plain and Ex; LX_CMP_NOWIDTH includes it) or
+ * LX_CMP_TRIM (W and U); LX_OPT_CHARS. In the plain and Ex forms, trimming cuts the second text to the length of the
+ * trimmed first one. 0 with LX_E_ARGUMENT or LX_E_MEMORY on failure. Without a sort object as LXStrcmp.
+ */
+LX_API int32_t LXStrcoll(LXLocale* locale, const char* str1, int32_t len1, const char* str2, int32_t len2,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcollEx(LXLocale* locale, const char* str1, int32_t len1, uint32_t state1, const char* str2,
+                           int32_t len2, uint32_t state2, uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXWcscoll(LXLocale* locale, const LXWChar* wstr1, int32_t len1, const LXWChar* wstr2, int32_t len2,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrcollU(LXLocale* locale, const LXUChar* ustr1, int32_t len1, const LXUChar* ustr2, int32_t len2,
+                          uint32_t options) LX_NOEXCEPT;
+/*
+ * A key whose bytes compare (memcmp, then length) as the texts do. options: 0, LX_CMP_NOCASE, LX_CMP_NOWIDTH,
+ * LX_OPT_CHARS. Returns the length of the whole key, -1 with LX_E_ARGUMENT or LX_E_MEMORY; a key longer than key_size
+ * was not written. The rest of a buffer that held the work area (16 bytes a character) is zeroed.
+ */
+LX_API int32_t LXStrxfrm(LXLocale* locale, void* key, int32_t key_size, const char* str, int32_t len,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrxfrmEx(LXLocale* locale, void* key, int32_t key_size, const char* str, int32_t len, uint32_t state,
+                           uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXWcsxfrm(LXLocale* locale, void* key, int32_t key_size, const LXWChar* wstr, int32_t len,
+                         uint32_t options) LX_NOEXCEPT;
+LX_API int32_t LXStrxfrmU(LXLocale* locale, void* key, int32_t key_size, const LXUChar* ustr, int32_t len,
+                          uint32_t options) LX_NOEXCEPT;
+/* The same from UCS-2; -1: no memory. */
+LX_API int32_t LXStrGenSortKey(LXLocale* locale, void* key, int32_t key_size, const LXUChar* chars,
+                               int32_t count) LX_NOEXCEPT;
+/* Files one set of weights into the arrays of the four levels: each has an insertion point and an end. */
+LX_API void LXStrInsertWeights(uint16_t primary, uint16_t** p_ins, uint16_t** p_end, uint8_t secondary, uint8_t** s_ins,
+                               uint8_t** s_end, uint8_t tertiary, uint8_t** t_ins, uint8_t** t_end, uint16_t special,
+                               LXSpecialWeight** x_ins, LXSpecialWeight** x_end, uint16_t position,
+                               uint8_t mask) LX_NOEXCEPT;
 
 /* ---- Extensions ---- */
 

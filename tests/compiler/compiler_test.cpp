@@ -1,127 +1,11 @@
 // SPDX-License-Identifier: Apache-2.0
-// The data compiler, as its users run it: the program LEXAROC_PATH on the sources in LEXARO_SOURCE_DATA.
-#include <gtest/gtest.h>
-#include <sys/wait.h>
+#include "compiler_run.hpp"
 
-#include <algorithm>
-#include <cstdio>
-#include <cstdlib>
 #include <deque>
-#include <filesystem>
-#include <fstream>
-#include <iterator>
-#include <map>
 #include <sstream>
-#include <string>
 #include <vector>
 
 namespace {
-
-namespace fs = std::filesystem;
-
-struct Outcome {
-  int exit_code;
-  std::string output;  // both streams
-};
-
-Outcome lexaroc(const std::string& arguments) {
-  FILE* pipe = popen((std::string("'") + LEXAROC_PATH + "' " + arguments + " 2>&1").c_str(), "r");
-  if (pipe == nullptr) return {-1, "cannot run the compiler"};
-  std::string output;
-  char block[4096];
-  for (size_t count; (count = fread(block, 1, sizeof block, pipe)) != 0;) output.append(block, count);
-  int status = pclose(pipe);
-  return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, output};
-}
-
-std::string quoted(const fs::path& path) { return "'" + path.string() + "'"; }
-
-std::string content(const fs::path& path) {
-  std::ifstream file(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(file), {}};
-}
-
-void write(const fs::path& path, const std::string& bytes) {
-  std::ofstream(path, std::ios::binary | std::ios::trunc) << bytes;
-}
-
-std::map<std::string, std::string> files_in(const fs::path& directory) {
-  std::map<std::string, std::string> files;
-  for (const auto& entry : fs::directory_iterator(directory)) {
-    files[entry.path().filename().string()] = content(entry.path());
-  }
-  return files;
-}
-
-std::string without_comments(const std::string& text) {
-  std::string rest;
-  for (size_t at = 0; at < text.size();) {
-    size_t end = text.find('\n', at);
-    end = end == std::string::npos ? text.size() : end + 1;
-    if (text[at] != '#') rest += text.substr(at, end - at);
-    at = end;
-  }
-  return rest;
-}
-
-// The folder of an object's source, by the prefix of its file name.
-std::string folder_of(const std::string& stem) {
-  return stem[0] == 'l' ? "language" : stem[0] == 't' ? "territory" : "codepage";
-}
-
-class CompilerTest : public testing::Test {
- protected:
-  CompilerTest() {
-    std::string name = (fs::temp_directory_path() / "lexaroc.XXXXXX").string();
-    if (mkdtemp(name.data()) != nullptr) work_ = name;
-  }
-  ~CompilerTest() override {
-    if (!work_.empty()) fs::remove_all(work_);
-  }
-  void SetUp() override { ASSERT_FALSE(work_.empty()); }
-
-  fs::path work(const std::string& name) const { return work_ / name; }
-
-  void compile(const fs::path& sources, const fs::path& output, const std::string& options = "") {
-    Outcome outcome = lexaroc("data " + options + " " + quoted(sources) + " " + quoted(output));
-    ASSERT_EQ(outcome.exit_code, 0) << outcome.output;
-    EXPECT_EQ(outcome.output, "");
-  }
-
-  // A source tree of what dump prints for each object of a data directory.
-  void dump_all(const fs::path& compiled, const fs::path& sources) {
-    fs::create_directories(sources);
-    fs::copy(data_ / "unicode", sources / "unicode");
-    fs::copy(compiled / "alias.txt", sources);
-    for (const char* folder : {"language", "territory", "codepage"}) fs::create_directory(sources / folder);
-    for (const auto& entry : fs::directory_iterator(compiled)) {
-      std::string stem = entry.path().stem().string();
-      if (entry.path().extension() != ".nls" || stem == "control") continue;
-      fs::path source = sources / folder_of(stem) / (stem + ".txt");
-      Outcome outcome = lexaroc("dump " + quoted(entry.path()) + " -o " + quoted(source));
-      ASSERT_EQ(outcome.exit_code, 0) << outcome.output;
-    }
-  }
-
-  // A few sources of each type, to be broken.
-  fs::path small_tree() {
-    fs::path tree = work("small");
-    fs::remove_all(tree);
-    for (const char* folder : {"language", "territory", "codepage"}) fs::create_directories(tree / folder);
-    fs::copy(data_ / "unicode", tree / "unicode");
-    for (const char* name : {"language/la_00002.txt", "territory/te_00276.txt", "codepage/cp_00930.txt",
-                             "codepage/cp_00367.txt", "codepage/cp_00954.txt"}) {
-      fs::copy(data_ / name, tree / name);
-    }
-    write(tree / "alias.txt", "US-ASCII ascii\n    us\n");
-    return tree;
-  }
-
-  const fs::path data_ = LEXARO_SOURCE_DATA;
-
- private:
-  fs::path work_;
-};
 
 TEST_F(CompilerTest, OutputIsReproducible) {
   compile(data_, work("one"));
@@ -187,55 +71,6 @@ TEST_F(CompilerTest, BuiltInSourcesAreUpToDate) {
     EXPECT_TRUE(content(data_.parent_path() / name) == content(work("made") / name)) << "run: lexaroc builtin data .";
   }
 }
-
-// One line of a source is replaced.
-struct BrokenSource {
-  const char* file;
-  const char* line;  // the line that begins so
-  const char* replacement;
-  unsigned line_offset;  // the fault is reported so many lines further on,
-  unsigned column;       // and in this column
-  const char* message;   // or its beginning
-};
-constexpr unsigned kEnd = ~0u;        // the line after the last
-constexpr unsigned kElsewhere = ~1u;  // a line that the case does not care about
-
-// Breaks a source for as long as it lives.
-class Fault {
- public:
-  Fault(const fs::path& tree, const BrokenSource& broken)
-      : broken_(broken), path_(tree / broken.file), sound_(content(path_)) {
-    std::string text = "\n" + sound_;
-    size_t at = text.find(std::string("\n") + broken.line);
-    if (at == std::string::npos) {
-      ADD_FAILURE() << broken.file << " has no line " << broken.line;
-      return;
-    }
-    text.erase(0, 1);
-    text.replace(at, text.find('\n', at) - at, broken.replacement);
-    auto end = text.begin() + (broken.line_offset == kEnd ? static_cast<long>(text.size()) : static_cast<long>(at));
-    line_ = std::count(text.begin(), end, '\n') + 1 + (broken.line_offset == kEnd ? 0 : broken.line_offset);
-    write(path_, text);
-  }
-  Fault(const Fault&) = delete;
-  Fault& operator=(const Fault&) = delete;
-  ~Fault() { write(path_, sound_); }
-
-  void expect_in(const Outcome& outcome) const {
-    std::string expected = path_.string() + ":" + std::to_string(line_) + ":" + std::to_string(broken_.column) + ": ";
-    if (broken_.line_offset == kElsewhere) expected.clear();
-    expected += broken_.message;
-    EXPECT_EQ(outcome.exit_code, 1) << broken_.replacement;
-    EXPECT_NE(outcome.output.find(expected), std::string::npos)
-        << "expected " << expected << "\ngot " << outcome.output;
-  }
-
- private:
-  const BrokenSource& broken_;
-  fs::path path_;
-  std::string sound_;
-  long line_ = 0;
-};
 
 constexpr const char* kGerman = "language/la_00002.txt";
 constexpr const char* kGermany = "territory/te_00276.txt";
@@ -440,8 +275,8 @@ TEST_F(CompilerTest, ExitCodesTellUsageFromTheSystem) {
 // Whatever stands in a compiled file, check and dump end with a message or accept it.
 TEST_F(CompilerTest, DamagedFilesAreRefusedOrHarmless) {
   compile(data_, work("compiled"), "--only 37,970,57352");
-  for (const char* name :
-       {"cp_00970.nls", "cp_57352.nls", "cp_00037.nls", "la_00002.nls", "te_00276.nls", "control.nls"}) {
+  for (const char* name : {"cp_00970.nls", "cp_57352.nls", "cp_00037.nls", "la_00002.nls", "te_00276.nls",
+                           "so_00004.nls", "control.nls"}) {
     const std::string sound = content(work("compiled") / name);
     fs::path damaged = work(name);
     for (unsigned round = 0; round < 40; ++round) {

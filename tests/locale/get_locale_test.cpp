@@ -33,31 +33,31 @@ struct Case {
   const char* substituted;  // with LX_GET_SUBSTITUTE; null: the same
 };
 
-constexpr char kEnglish[] = "English UnitedStates Latin1 -";
+constexpr char kEnglish[] = "English UnitedStates Latin1 Default";
 
 const Case kCases[] = {
     {nullptr, kEnglish, nullptr},
     {"", kEnglish, nullptr},
     {"English", kEnglish, nullptr},
     {"eNGLISH_uNITEDsTATES.uS-aSCII@bINARY", "English UnitedStates US-ASCII -", nullptr},
-    {"German", "German Germany Latin1 -", nullptr},
-    {"German_Austria", "German Austria Latin1 -", nullptr},
-    {"German_German-Switzerland", "German German-Switzerland Latin1 -", nullptr},
-    {"German_Austria.UTF-8", "German Austria UTF-8 -", nullptr},
-    {"German.UTF-8", "German Germany UTF-8 -", nullptr},
+    {"German", "German Germany Latin1 Default", nullptr},
+    {"German_Austria", "German Austria Latin1 Default", nullptr},
+    {"German_German-Switzerland", "German German-Switzerland Latin1 Default", nullptr},
+    {"German_Austria.UTF-8", "German Austria UTF-8 Default", nullptr},
+    {"German.UTF-8", "German Germany UTF-8 Default", nullptr},
     {"German@BINARY", "German Germany Latin1 -", nullptr},
     {"German_Austria@BINARY", "German Austria Latin1 -", nullptr},
     {"German.UTF-8@Binary", "German Germany UTF-8 -", nullptr},
-    {"_Germany", "English Germany Latin1 -", nullptr},
-    {".UTF-8", "English UnitedStates UTF-8 -", nullptr},
-    {"@BINARY", kEnglish, nullptr},
-    {"German_.@", "German Germany Latin1 -", nullptr},
-    {"German_", "German Germany Latin1 -", nullptr},
-    {"German_Austria.", "German Austria Latin1 -", nullptr},
-    {"German_Austria.UTF-8@", "German Austria UTF-8 -", nullptr},
+    {"_Germany", "English Germany Latin1 Default", nullptr},
+    {".UTF-8", "English UnitedStates UTF-8 Default", nullptr},
+    {"@BINARY", "English UnitedStates Latin1 -", nullptr},
+    {"German_.@", "German Germany Latin1 Default", nullptr},
+    {"German_", "German Germany Latin1 Default", nullptr},
+    {"German_Austria.", "German Austria Latin1 Default", nullptr},
+    {"German_Austria.UTF-8@", "German Austria UTF-8 Default", nullptr},
     // Not found.
     {"Klingon", "31", kEnglish},
-    {"Klingon_Germany.UTF-8", "31", "English Germany UTF-8 -"},
+    {"Klingon_Germany.UTF-8", "31", "English Germany UTF-8 Default"},
     {"Germa", "31", kEnglish},
     {"English ", "31", kEnglish},
     {"English_Atlantis", "34", kEnglish},
@@ -70,13 +70,13 @@ const Case kCases[] = {
     {"English@BINARYX", "33", kEnglish},
     {"English@BINARY@", "33", kEnglish},
     {"English@BINARY.UTF-8", "33", kEnglish},
-    {"German_Atlantis.NoSuchPage@None", "34", "German Germany Latin1 -"},
+    {"German_Atlantis.NoSuchPage@None", "34", "German Germany Latin1 Default"},
     // Code pages by their further names.
-    {"English.ascii", "English UnitedStates US-ASCII -", nullptr},
+    {"English.ascii", "English UnitedStates US-ASCII Default", nullptr},
     {"English.iso8859_1", kEnglish, nullptr},
     {"English_UnitedStates.ISO_8859-1:1987", kEnglish, nullptr},
     {"English.ISO_646.IRV:1991@BINARY", "English UnitedStates US-ASCII -", nullptr},
-    {"English.367", "English UnitedStates US-ASCII -", nullptr},
+    {"English.367", "English UnitedStates US-ASCII Default", nullptr},
     {"English_ascii", "34", kEnglish},
 };
 

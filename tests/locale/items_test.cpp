@@ -20,12 +20,19 @@ Locale get(const std::string& name, uint32_t options = 0) {
   return locale;
 }
 
+std::string sort_name(LXLocale* locale) {
+  char name[33];
+  return LXGetLocaleTextInfo(locale, LX_ITEM_SORT_NAME, name, sizeof name, 0) > 0 ? name : "";
+}
+
 TEST(Items, OfAllSystemLocales) {
   Session session;
   std::set<std::string> languages;
   for (const NativeRow& row : kNativeRows) {
     char name[132];
     Locale locale = get(LXMapNativeLocale(row.native, name, sizeof name), LX_GET_SUBSTITUTE);
+    EXPECT_EQ(sort_name(locale.get()), row.sort) << row.native;
+    ASSERT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_SORT_ID, 0), 1);
     const LocaleModel model(row.language, row.territory, row.code_page);
     ASSERT_EQ(model.difference(locale.get(), languages.insert(row.language).second), "") << row.native;
     Locale binary = get(row.locale_name().substr(0, row.locale_name().find('@')) + "@BINARY");

@@ -62,6 +62,9 @@ void take_system_values(LocaleModel& model, const char* native, bool same_page) 
   std::setlocale(LC_ALL, before.c_str());
 }
 
+// The models know no sorts.
+void binary(Locale& locale) { EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_SORT_ID, 0), 1); }
+
 class SystemValues : public testing::Test {
  protected:
   static void SetUpTestSuite() {
@@ -92,10 +95,12 @@ TEST_F(SystemValues, GiveTheirValues) {
       uint32_t rc = 99;
       Locale converted(LXConvertNativeLocale(one.system.native, LX_GET_SUBSTITUTE, &rc));
       ASSERT_NE(converted, nullptr) << rc;
+      binary(converted);
       EXPECT_EQ(model.difference(converted.get()), "");
       lc_all_.set(one.system.native);
       Locale of_user(LXGetLocale("", LX_GET_USER | LX_GET_SUBSTITUTE, &rc));
       ASSERT_NE(of_user, nullptr) << rc;
+      binary(of_user);
       EXPECT_EQ(model.difference(of_user.get()), "");
       EXPECT_STREQ(std::setlocale(LC_ALL, nullptr), outer);
     }
@@ -134,6 +139,7 @@ TEST_F(SystemValues, NameTooLongToBeSaved) {
   char buffer[132];
   EXPECT_EQ(LXGetUserLocale(buffer, sizeof buffer), 0);
   Locale of_user(LXGetLocale("German", LX_GET_USER, nullptr));
+  binary(of_user);
   EXPECT_EQ(LocaleModel("English", "UnitedStates", "Latin1").difference(of_user.get()), "");
   EXPECT_EQ(std::setlocale(LC_ALL, nullptr), before);
 }
@@ -158,6 +164,7 @@ TEST_F(SystemValues, OnOtherPages) {
 // Texts are set as by the caller; separators and numbers are not, and go with the territory.
 TEST_F(SystemValues, ChangeOfTheTerritory) {
   Locale locale(LXConvertNativeLocale("ru", LX_GET_SUBSTITUTE, nullptr));
+  binary(locale);
   LocaleModel model("Russian", "Russia", "ISO-8859-5");
   take_system_values(model, "ru", true);
   ASSERT_TRUE(model.texts.contains(60) && model.texts.contains(64) && model.texts.contains(72));

@@ -154,8 +154,11 @@ std::optional<std::u16string> LocaleModel::text(uint32_t item, bool own) const {
     case 14:
       return ascii(ids_[0] != 0 ? "US-ASCII" : LocaleSource::name_of(LX_CODEPAGE, language->default_id(LX_CODEPAGE)));
     case 12:
-    case 15:
       return u"Binary";
+    case 15:
+      return ascii(ids_[0] != 0 || language->default_id(LX_SORT) == 0
+                       ? "Binary"
+                       : LocaleSource::name_of(LX_SORT, language->default_id(LX_SORT)));
     case 88:
       return ascii(name());
     default:

@@ -39,9 +39,9 @@ struct Object {
 
 // The objects of a type by their names, from the heads of the files: "id = 1" or "id 1".
 const std::map<std::string, Object, std::less<>>& objects(uint8_t type) {
-  static std::map<std::string, Object, std::less<>> all[3];
+  static std::map<std::string, Object, std::less<>> all[4];
   if (!all[type].empty()) return all[type];
-  const char* const folders[] = {"/language", "/territory", "/codepage"};
+  const char* const folders[] = {"/language", "/territory", "/codepage", "/collation"};
   for (const auto& file : std::filesystem::directory_iterator(std::string(LEXARO_SOURCE_DATA) + folders[type])) {
     std::ifstream in(file.path());
     std::string name;

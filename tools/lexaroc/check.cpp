@@ -4,6 +4,7 @@
 #include <algorithm>
 
 #include "code_page_source.hpp"
+#include "collation_root.hpp"
 #include "lint.hpp"
 #include "structure.hpp"
 
@@ -29,6 +30,7 @@ void check_sources(const fs::path& directory, Report& report) {
     lint_code_page(page, report);
     lint_round_trip(page, *tree.unicode, report);
   }
+  for (const Sort& sort : tree.sorts) lint_sort(sort, report);
   lint_tree(tree, report);
   if (fs::exists(directory / "builtin")) check_builtin(directory, report);
 }
@@ -50,6 +52,10 @@ void check_source(const fs::path& path, Report& report) {
     if (auto territory = read_territory(source, report)) lint_territory(*territory, report);
   } else if (object && object->type == ObjectType::code_page) {
     if (auto page = read_code_page(source, report)) lint_code_page(*page, report);
+  } else if (name == kCollationRootFile) {
+    read_collation_root(source, report);
+  } else if (object && object->type == ObjectType::sort) {
+    if (auto sort = read_sort_file(source, path.parent_path() / "..", report)) lint_sort(*sort, report);
   } else {
     report.error(path.string(), Spot{}, "the file name tells no kind of source");
   }

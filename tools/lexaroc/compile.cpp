@@ -24,6 +24,9 @@ class Compiler {
     for (const CodePage& object : tree_.code_pages) {
       add(ObjectType::code_page, object, format, [&] { return pack_code_page(object, *tree_.unicode, layout_); });
     }
+    for (const Sort& object : tree_.sorts) {
+      add(ObjectType::sort, object, kCurrentFormat, [&] { return Sections{pack_sort(object.weights)}; });
+    }
     files_.push_back({kAliasFile, tree_.alias_text});
     files_.push_back({kControlFile, make_object_file({pack_directory(tree_.entries())}, kCurrentFormat)});
     return std::move(files_);

@@ -4,6 +4,7 @@
 #include "code_page_image.hpp"
 #include "code_page_source.hpp"
 #include "language.hpp"
+#include "sort_source.hpp"
 #include "structure.hpp"
 #include "territory.hpp"
 
@@ -52,6 +53,11 @@ std::string dump_file(const fs::path& path) {
       return title + write_language(with_identity(unpack_language(file.sections[0]), *entry));
     case ObjectType::territory:
       return title + write_territory(with_identity(unpack_territory(file.sections[0]), *entry));
+    case ObjectType::sort: {
+      Sort sort;
+      sort.weights = unpack_sort(file.sections[0]);
+      return title + write_sort(with_identity(std::move(sort), *entry));
+    }
     default: {
       CodePage page = with_identity(unpack_code_page(read_code_page_image(file, entry->id)), *entry);
       return title + unstated(page) + write_code_page(page);

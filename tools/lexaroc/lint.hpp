@@ -10,6 +10,8 @@ void lint_code_page(const CodePage& page, Report& report);
 // The compiled page must read back as its source says.
 void lint_round_trip(const CodePage& page, const UnicodeTables& unicode, Report& report);
 
+void lint_sort(const Sort& sort, Report& report);
+
 void lint_territory(const Territory& territory, Report& report);
 
 // What concerns several objects: references, names, texts against code pages, aliases.

@@ -12,6 +12,7 @@
 #include "directory.hpp"
 #include "files.hpp"
 #include "language.hpp"
+#include "sort_source.hpp"
 #include "territory.hpp"
 #include "unicode_tables.hpp"
 
@@ -28,6 +29,7 @@ struct SourceTree {
   std::vector<Language> languages;
   std::vector<Territory> territories;
   std::vector<CodePage> code_pages;
+  std::vector<Sort> sorts;
   std::string alias_file;
   std::string alias_text;
   std::vector<Alias> aliases;
@@ -41,5 +43,8 @@ struct SourceTree {
 // Reads everything; what is wrong goes to the report, and the object is left out. `only` limits the code pages by id
 // when it is not empty.
 SourceTree read_source_tree(const fs::path& directory, const std::set<uint16_t>& only, Report& report);
+
+// Reads one sort, and what it refers to from the directory of its sources.
+std::optional<Sort> read_sort_file(const SourceFile& source, const fs::path& directory, Report& report);
 
 }  // namespace lx::compiler

@@ -3,6 +3,7 @@
 
 #include "code_page_image.hpp"
 #include "language.hpp"
+#include "sort_object.hpp"
 #include "territory.hpp"
 
 namespace lx::compiler {
@@ -20,7 +21,8 @@ void check_object(ObjectType type, uint16_t id, std::string_view bytes) {
       check_code_page_image(read_code_page_image(file, id));
       return;
     case ObjectType::sort:
-      break;
+      unpack_sort(file.sections[0]);
+      return;
   }
   throw StructureError("objects of this type are not known");
 }

@@ -1,0 +1,272 @@
+// SPDX-License-Identifier: Apache-2.0
+// A code page, a kind of text, a function on characters or strings, its options and lengths from the first bytes of the
+// input; the rest are its texts. Each text ends where its block of memory ends; results must stay inside.
+#include <lexaro/lexaro.h>
+
+#include <algorithm>
+#include <cstring>
+#include <memory>
+#include <vector>
+
+#include "fuzz_support.hpp"
+#include "text/text_calls.hpp"
+
+namespace lx::fuzz {
+namespace {
+
+using test::State;
+
+const char* const kPages[] = {"US-ASCII", "Latin1", "UTF-8",  "MS932",   "MS936",   "JapanEUC",
+                              "EUC-TW",   "IBM037", "IBM930", "IBM1364", "IBM1388", "EUC-KR"};
+constexpr size_t kLongestText = 400;
+const uint32_t kOptions[] = {0,
+                             LX_OPT_CHARS,
+                             LX_OPT_TERMINATE,
+                             LX_STR_LAST,
+                             LX_CMP_NOCASE,
+                             LX_CMP_NOWIDTH,
+                             LX_CMP_TRIM,
+                             LX_CMP_NOCASE | LX_CMP_TRIM | LX_OPT_CHARS,
+                             LX_CMP_NOWIDTH | LX_CMP_TRIM,
+                             LX_CMP_NOWIDTH | LX_OPT_CHARS,
+                             LX_MAP_H2F,
+                             LX_MAP_F2H,
+                             LX_MAP_COPY,
+                             LX_MAP_LOWER,
+                             LX_MAP_UPPER,
+                             LX_MAP_UPPER | LX_MAP_PLAIN | LX_OPT_CHARS,
+                             LX_MAP_H2F | LX_OPT_CHARS,
+                             LX_MAP_DIGITS,
+                             LX_EOL_21,
+                             0xF00 | LX_OPT_CHARS,
+                             0x1F00,
+                             LX_TRUNC_STRIP | LX_CMP_NOWIDTH,
+                             LX_TRUNC_STRIP | LX_OPT_CHARS,
+                             1,
+                             0xFFFFFFFF};
+
+// A text in a block of its own size.
+template <class U>
+struct Text {
+  std::unique_ptr<U[]> block;
+  size_t units;  // without terminator
+  int32_t length;
+  State state;
+
+  Text(std::string_view bytes, bool terminated) : units(bytes.size() / sizeof(U)) {
+    block.reset(new U[units + terminated]);
+    if (units != 0) std::memcpy(block.get(), bytes.data(), units * sizeof(U));
+    if (terminated) block[units] = 0;
+  }
+  U* at() const { return block.get(); }
+  size_t allocated() const { return units + (length < 0); }
+};
+
+class Library {
+ public:
+  Library() {
+    LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
+    const char* language = "German_Germany.";  // which has special pairs of upper and lower case
+    for (const char* page : kPages) {
+      uint32_t rc = 99;
+      locales_.push_back(LXGetLocale((language + std::string(page) + "@BINARY").c_str(), 0, &rc));
+      demand(rc == LX_OK, page);
+    }
+  }
+  ~Library() {
+    for (LXLocale* locale : locales_) LXReleaseLocale(locale, 0);
+    LXTerm();
+  }
+  Library(const Library&) = delete;
+  Library& operator=(const Library&) = delete;
+
+  void run(InputBytes input) {
+    l_ = locales_[input.byte() % locales_.size()];
+    uint8_t kind = input.byte() % 5;
+    function_ = input.byte() % 12;
+    uint8_t option = input.byte();
+    options_ = option < 0x80 ? kOptions[option % std::size(kOptions)] : 1u << option % 32;
+    size_ = input.byte();
+    uint8_t first = input.byte();
+    uint8_t second = input.byte();
+    std::string_view all = input.rest().substr(0, kLongestText);
+    std::string_view text = all.substr(0, all.size() - std::min<size_t>(all.size(), second % 64u));
+    std::string_view other = all.substr(text.size());
+    switch (kind) {
+      case 0:
+        return strings<test::PlainCalls>(text, other, first, second);
+      case 1:
+        return strings<test::ShiftedCalls>(text, other, first, second);
+      case 2:
+        return strings<test::WideCalls>(text, other, first, second);
+      case 3:
+        return strings<test::Ucs2Calls>(text, other, first, second);
+      default:
+        return characters(text, first);
+    }
+  }
+
+ private:
+  // The length of a text as a call is told it: measured, all, a part, or a count of characters.
+  template <class Calls, class U = typename Calls::Unit>
+  Text<U> given(std::string_view bytes, uint8_t choice) {
+    bool measured = choice % 4 == 0;
+    Text<U> text(bytes, measured);
+    text.state = choice >> 7;
+    auto units = static_cast<int32_t>(text.units);
+    if ((options_ & LX_OPT_CHARS) != 0 && sizeof(U) == 1) {
+      auto at = reinterpret_cast<const char*>(text.at());
+      bool ex = std::is_same_v<Calls, test::ShiftedCalls>;
+      units = ex ? LXNumCharsEx(l_, at, text.state, units) : LXNumChars(l_, at, units);
+    }
+    text.length = measured ? -1 : choice % 4 == 1 ? units : units * (choice >> 2 & 15) / 16;
+    return text;
+  }
+
+  template <class Calls, class U = typename Calls::Unit>
+  void strings(std::string_view text_bytes, std::string_view other_bytes, uint8_t first, uint8_t second) {
+    Text<U> text = given<Calls>(text_bytes, first);
+    Text<U> other = given<Calls>(other_bytes, second);
+    U* s = text.at();
+    auto limit = static_cast<int64_t>(text.allocated());
+    auto size = static_cast<int32_t>(size_);
+    auto inside = [&](const U* at) { demand(at == nullptr || (at >= s && at <= s + limit), "position outside"); };
+    switch (function_) {
+      case 0: {
+        // Any number of shift bytes may stand between characters.
+        size_t room = (options_ & LX_OPT_CHARS) != 0 ? text.allocated() : size_;
+        std::unique_ptr<U[]> out(new U[room]);
+        demand(Calls::cpy(l_, out.get(), size, s, text.state, text.length, options_) <= size, "result of cpy");
+        return;
+      }
+      case 1: {
+        Text<U> target(other_bytes, true);
+        std::vector<U> joined(target.at(), target.at() + target.units + 1);
+        joined.resize(target.units + text.units + 1);
+        int32_t result = Calls::cat(l_, joined.data(), s, text.state, text.length, options_);
+        demand(result <= static_cast<int64_t>(joined.size()), "result of cat");
+        return;
+      }
+      case 2: {
+        Text<U> wanted(other_bytes, true);
+        inside(Calls::chr(l_, s, text.state, text.length, wanted.at(), other.state, nullptr, options_));
+        return;
+      }
+      case 3:
+        return inside(
+            Calls::str(l_, s, text.state, text.length, other.at(), other.state, other.length, nullptr, options_));
+      case 4:
+        demand(Calls::spn(l_, s, text.state, text.length, other.at(), other.state, other.length, options_) <= limit,
+               "result of spn");
+        return;
+      case 5:
+        demand(Calls::cspn(l_, s, text.state, text.length, other.at(), other.state, other.length, options_) <= limit,
+               "result of cspn");
+        return;
+      case 6:
+        return tokens<Calls>(text, other);
+      case 7: {
+        uint32_t type = 0;
+        int32_t length = -1;
+        inside(Calls::eol(l_, s, text.state, text.length, &type, &length, options_));
+        demand(length >= 0 && length <= 2, "length of a line end");
+        return;
+      }
+      case 8: {
+        U line[8];
+        U* end = Calls::put_eol(l_, line, text.state, options_);
+        demand(end == nullptr || end - line <= 6, "line end");
+        return;
+      }
+      case 9:
+        Calls::cmp(l_, s, text.state, text.length, other.at(), other.state, other.length, options_);
+        demand(Calls::cmp(l_, s, text.state, text.length, s, text.state, text.length, options_ & ~LX_CMP_TRIM) == 0,
+               "a text differs from itself");
+        return;
+      default: {
+        size_t room = (options_ & LX_OPT_CHARS) != 0 ? std::max<size_t>(size_ * 6, text.allocated()) : size_;
+        std::unique_ptr<U[]> out(new U[room]);
+        demand(Calls::map(l_, out.get(), size, s, text.state, text.length, options_) <= size, "result of map");
+      }
+    }
+  }
+
+  template <class Calls, class U = typename Calls::Unit>
+  void tokens(Text<U>& text, const Text<U>& delimiters) {
+    int32_t length = text.length;
+    U* at = text.at();
+    const U* end = at + text.allocated();
+    for (size_t rounds = 0; at != nullptr; ++rounds) {
+      demand(rounds <= text.units, "no end of the tokens");
+      U* next = at;
+      U* token = Calls::tok(l_, at, &text.state, &length, delimiters.at(), delimiters.state, delimiters.length, &next,
+                            options_);
+      if (LXGetError(l_) != LX_OK) return;
+      demand(token == nullptr || (token >= at && token <= end), "token outside");
+      demand(next == nullptr || (token != nullptr && next > token && next < end), "rest outside");
+      demand(length >= 0 && length <= end - at, "length of the rest");
+      at = next;
+    }
+  }
+
+  // Steps over a terminated text.
+  void characters(std::string_view bytes, uint8_t choice) {
+    Text<char> text(bytes.substr(0, 64), true);
+    char* s = text.at();
+    size_t size = std::strlen(s);
+    char* end = s + size;
+    State state = choice & 1;
+    auto inside = [&](const char* at) { demand(at >= s && at <= end, "step outside"); };
+    size_t steps = 0;
+    State walked = state;
+    for (const char* at = s; at < end; ++steps) {
+      State before = walked;
+      const char* next = LXNextCharEx(l_, at, before, &walked);
+      demand(next > at, "no step forward");
+      LXGetCharTypeEx(l_, at, before, LX_CTYPE_1);
+      demand(LXValidCharEx(l_, at, before) <= end - at, "valid bytes");
+      at = next;
+    }
+    demand(steps <= size, "no end of the steps");
+    for (size_t n = 0; n <= size; ++n) {
+      auto length = static_cast<int32_t>(n);
+      LXGetCharType(l_, s + n, LX_CTYPE_2);
+      demand(LXValidChar(l_, s + n) <= end - s - length, "valid bytes");
+      demand(LXNumChars(l_, s, length) <= length && LXNumCharsEx(l_, s, state, length) <= length, "count");
+      demand(AdjustLength(l_, s, state, length) <= length, "AdjustLength");
+      inside(LXMoveStringPointer(l_, s, length, 0));
+      inside(LXMoveStringPointerEx(l_, s, state, length, 0));
+      const char* before = LXPrevChar(l_, s, s + n);
+      inside(before);
+      demand(n == 0 || before < s + n, "no step back");
+      inside(LXPrevCharEx(l_, s, s + n, state, nullptr));
+    }
+    inside(LXMoveStringPointer(l_, s, LXNumChars(l_, s, -1), LX_OPT_CHARS));
+    inside(LXMoveStringPointerEx(l_, s, state, LXNumCharsEx(l_, s, state, -1), LX_OPT_CHARS));
+    auto room = static_cast<int32_t>(size_ % 80);
+    int32_t cut =
+        function_ % 2 == 0 ? LXTruncateString(l_, s, room, options_) : LXTruncateStringEx(l_, s, state, room, options_);
+    demand(cut <= std::max(room, 1), "result of a cut");
+    demand(std::strlen(s) <= size, "cut text is longer");
+    LXUChar unit = static_cast<LXUChar>(size_ << 8 | choice);
+    demand(LXUnicodeToLower(l_, LXUnicodeToLower(l_, unit)) == LXUnicodeToLower(l_, unit), "lower case of lower case");
+    LXUnicodeToUpper(l_, LXUnicodeToF2H(l_, LXUnicodeToH2F(l_, unit)));
+    LXGetCharTypeU(l_, unit, LX_CTYPE_3);
+    LXGetCharTypeW(l_, static_cast<LXWChar>(unit) << (choice % 3 * 8), LX_CTYPE_1);
+  }
+
+  std::vector<LXLocale*> locales_;
+  LXLocale* l_ = nullptr;
+  unsigned function_ = 0;
+  uint32_t options_ = 0;
+  size_t size_ = 0;
+};
+
+}  // namespace
+}  // namespace lx::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  static lx::fuzz::Library library;
+  library.run({data, size});
+  return 0;
+}

@@ -1,0 +1,194 @@
+// SPDX-License-Identifier: Apache-2.0
+// Sort objects that are broken, and memory that runs out.
+#include <functional>
+
+#include "collate/sort_builder.hpp"
+#include "support/counting_allocator.hpp"
+#include "support/edge_buffer.hpp"
+
+namespace lx::test {
+namespace {
+
+constexpr uint16_t kSubject = 99;
+constexpr char kName[] = "English_UnitedStates.US-ASCII@Subject";
+
+class BrokenSort : public testing::Test {
+ protected:
+  BrokenSort() {
+    write_small_directory(directory_);
+    directory_.write_control({{LX_LANGUAGE, 1, "English"},
+                              {LX_TERRITORY, 1, "UnitedStates"},
+                              {LX_CODEPAGE, 367, "US-ASCII"},
+                              {LX_SORT, kSubject, "Subject"}});
+    session_ = std::make_unique<Session>(directory_.path());
+  }
+
+  // LX_OK when the object was loaded, and used without harm.
+  uint32_t load(const Bytes& file) {
+    directory_.write_object(LX_SORT, kSubject, file);
+    LXObjMgr* manager = LXGetObjManager();
+    uint32_t rc = 99;
+    LXObjEntry* entry = LXGetObjFromID(manager, LX_SORT, kSubject, 1, &rc);
+    if (LXLoadObj(manager, entry, &rc) == nullptr) return rc;
+    EXPECT_EQ(rc, uint32_t{LX_OK});
+    use(entry);
+    EXPECT_EQ(LXUnloadObj(manager, entry), uint32_t{LX_OK});
+    return LX_OK;
+  }
+
+ private:
+  static void use(const LXObjEntry* entry) {
+    uint16_t primary, special, primary2, special2;
+    uint8_t secondary, tertiary, secondary2, tertiary2, mask = 0;
+    for (unsigned unit = 0; unit < 0x10000; unit += 0x55) {
+      LXSortGetWeights(entry, static_cast<LXUChar>(unit), &primary, &secondary, &tertiary, &special, &primary2,
+                       &secondary2, &tertiary2, &special2, &mask);
+      ASSERT_LE(mask, 15);
+    }
+    uint32_t rc = 99;
+    Locale locale(LXGetLocale(kName, 0, &rc));
+    ASSERT_EQ(rc, uint32_t{LX_OK});
+    static EdgeBuffer edge(4096), other(4096), room(4096);
+    const char text[] = "aABcbefcc-pqQ-+*mnxyzw0ac";
+    const LXUChar units[] = {'c', 'b', 0x100, 0x3041, 0x3105, 0x4E07, 0x5001, 0x5101, 0xFFFE, 'x', 'a', 0x3041};
+    const char* a = edge.text(text);
+    const char* b = other.text(std::string_view(text).substr(5));
+    constexpr int32_t length = sizeof text - 1;
+    int32_t result = LXStrcoll(locale.get(), a, length, b, length - 5, 0);
+    int32_t reverse = LXStrcoll(locale.get(), b, length - 5, a, length, 0);
+    ASSERT_EQ(result > 0, reverse < 0);
+    ASSERT_EQ(LXStrcoll(locale.get(), a, length, a, length, 0), 0);
+    int32_t size = LXStrxfrm(locale.get(), nullptr, 0, a, length, 0);
+    ASSERT_GE(size, 3);
+    ASSERT_EQ(LXStrxfrm(locale.get(), room.room(static_cast<size_t>(size)), size, a, length, 0), size);
+    ASSERT_GE(LXStrxfrm(locale.get(), room.room(1024), 1024, a, length, LX_CMP_NOCASE), 3);
+    ASSERT_EQ(LXStrcollU(locale.get(), units, 12, units, 12, 0), 0);
+    ASSERT_GE(LXStrGenSortKey(locale.get(), room.room(1024), 1024, units, 12), 3);
+  }
+
+  DataDirectory directory_;
+  std::unique_ptr<Session> session_;
+};
+
+TEST_F(BrokenSort, EveryFlippedBitIsRefusedOrHarmless) {
+  const Bytes good = test_sort(true).section();
+  ASSERT_EQ(load(object_file({good})), uint32_t{LX_OK});
+  for (size_t bit = 0; bit < 1036 * 8; ++bit) {
+    Bytes broken = good;
+    broken[bit / 8] = static_cast<uint8_t>(broken[bit / 8] ^ 1 << bit % 8);
+    uint32_t status = load(object_file({broken}));
+    ASSERT_TRUE(status == LX_OK || status == LX_E_HEADER) << bit << ": " << status;
+    if (HasFatalFailure()) FAIL() << bit;
+  }
+}
+
+TEST_F(BrokenSort, EveryTruncationIsRefused) {
+  SortSpec small = test_sort(true);
+  small.pages[1] = small.pages[3] = {};
+  const Bytes good = small.section();
+  for (size_t size = 0; size < good.size(); ++size) {
+    ASSERT_EQ(load(object_file({Bytes(good.begin(), good.begin() + static_cast<ptrdiff_t>(size))})),
+              uint32_t{LX_E_HEADER})
+        << size;
+  }
+  const Bytes file = small.file();
+  for (size_t size = 0; size < file.size(); size += size < 100 ? 1 : 37) {
+    ASSERT_NE(load(Bytes(file.begin(), file.begin() + static_cast<ptrdiff_t>(size))), uint32_t{LX_OK}) << size;
+  }
+}
+
+// What reaches to the last byte is good, what reaches one row further is not.
+TEST_F(BrokenSort, TablesMayReachTheEnd) {
+  auto with = [](size_t at, int change) {
+    Image image;
+    Bytes bytes = test_sort(true).section();
+    for (size_t i = 0; i < bytes.size(); ++i) image.u8(i, bytes[i]);
+    image.u16(at, static_cast<unsigned>((bytes[at] << 8 | bytes[at + 1]) + change));
+    return object_file({image.bytes()});
+  };
+  EXPECT_EQ(load(with(4, 0)), uint32_t{LX_OK});
+  EXPECT_EQ(load(with(4, 1)), uint32_t{LX_E_HEADER});
+  EXPECT_EQ(load(with(1034, 1)), uint32_t{LX_E_HEADER});
+  EXPECT_EQ(load(with(1034, -1)), uint32_t{LX_OK});
+  EXPECT_EQ(load(with(2, 5)), uint32_t{LX_E_HEADER});
+  EXPECT_EQ(load(with(1030, 0x4000)), uint32_t{LX_E_HEADER});
+  EXPECT_EQ(load(with(8, 0x7000)), uint32_t{LX_E_HEADER});
+  EXPECT_EQ(load(with(8 + 4 * 0x30, 0x7000)), uint32_t{LX_OK});  // there it is a weight
+}
+
+// ---- Memory ----
+
+TEST(CollationMemory, RunsOut) {
+  DataDirectory directory;
+  write_collation_directory(directory);
+  CountingAllocator memory;
+  ASSERT_EQ(memory.init(directory.path()), uint32_t{LX_OK});
+  uint32_t rc = 99;
+  LXLocale* single = LXGetLocale("German_UnitedStates.Single@Combining", 0, &rc);
+  LXLocale* mixed = LXGetLocale("English_UnitedStates.Mixed@Plain", 0, &rc);
+  ASSERT_TRUE(single != nullptr && mixed != nullptr);
+  // Nothing in it is quick to compare.
+  const std::string bytes(3000, 'q');
+  const std::vector<LXWChar> wide(3000, 'q');
+  const std::vector<LXUChar> ucs2(3000, 'q');
+  std::vector<char> key(1000000);
+  const char* s = bytes.data();
+  const LXWChar* w = wide.data();
+  const LXUChar* u = ucs2.data();
+  struct Operation {
+    const char* name;
+    LXLocale* locale;
+    int32_t failed;
+    std::function<int32_t()> call;
+  };
+  const int32_t kFull = 1000000;
+  const Operation operations[] = {
+      {"LXStrcoll", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, 0); }},
+      {"LXStrcoll, case", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, LX_CMP_NOCASE); }},
+      {"LXStrcoll, trimmed", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, LX_COLL_TRIM); }},
+      {"LXStrcoll, width", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, LX_CMP_NOWIDTH); }},
+      {"LXStrcollEx", mixed, 0, [&] { return LXStrcollEx(mixed, s, 3000, 0, s, 2999, 0, 0); }},
+      {"LXStrcollEx, case", mixed, 0, [&] { return LXStrcollEx(mixed, s, 3000, 0, s, 2999, 0, LX_CMP_NOCASE); }},
+      {"LXWcscoll", single, 0, [&] { return LXWcscoll(single, w, 3000, w, 2999, 0); }},
+      {"LXWcscoll, case", single, 0, [&] { return LXWcscoll(single, w, 3000, w, 2999, LX_CMP_NOCASE); }},
+      {"LXStrcollU", single, 0, [&] { return LXStrcollU(single, u, 3000, u, 2999, 0); }},
+      {"LXStrcollU, width", single, 0, [&] { return LXStrcollU(single, u, 3000, u, 2999, LX_CMP_NOWIDTH); }},
+      {"LXStrxfrm", single, -1, [&] { return LXStrxfrm(single, key.data(), 10, s, 3000, 0); }},
+      {"LXStrxfrm, case", single, -1, [&] { return LXStrxfrm(single, key.data(), kFull, s, 3000, LX_CMP_NOCASE); }},
+      {"LXStrxfrmEx", mixed, -1, [&] { return LXStrxfrmEx(mixed, key.data(), 10, s, 3000, 0, 0); }},
+      {"LXWcsxfrm", single, -1, [&] { return LXWcsxfrm(single, key.data(), 10, w, 3000, 0); }},
+      {"LXStrxfrmU", single, -1, [&] { return LXStrxfrmU(single, key.data(), 10, u, 3000, 0); }},
+      {"LXStrGenSortKey", single, -1, [&] { return LXStrGenSortKey(single, key.data(), 10, u, 3000); }},
+  };
+  for (const Operation& operation : operations) {
+    int32_t good = operation.call();
+    EXPECT_GT(good, 0) << operation.name;
+    EXPECT_EQ(LXGetError(operation.locale), uint32_t{LX_OK}) << operation.name;
+    int live = memory.live;
+    for (bool on : {false, true}) {
+      int n = 0;
+      for (bool failed = true; failed; ++n) {
+        memory.arm(n, on);
+        int32_t result = operation.call();
+        failed = memory.has_failed();
+        memory.disarm();
+        EXPECT_EQ(result, failed ? operation.failed : good) << operation.name << ' ' << n;
+        EXPECT_EQ(LXGetError(operation.locale), failed ? uint32_t{LX_E_MEMORY} : uint32_t{LX_OK}) << operation.name;
+        ASSERT_EQ(memory.live, live) << operation.name << ' ' << n;
+      }
+      EXPECT_GT(n, 1) << operation.name << " takes no memory";
+    }
+  }
+  // With room for the work no memory is wanted.
+  memory.arm(0, true);
+  EXPECT_GT(LXStrGenSortKey(single, key.data() + 1, kFull - 1, u, 3000), 0);
+  EXPECT_EQ(memory.calls, 0);
+  memory.disarm();
+  LXReleaseLocale(single, 0);
+  LXReleaseLocale(mixed, 0);
+  LXTerm();
+  EXPECT_EQ(memory.live, 0);
+}
+
+}  // namespace
+}  // namespace lx::test

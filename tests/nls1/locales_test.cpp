@@ -1,0 +1,161 @@
+// SPDX-License-Identifier: Apache-2.0
+// Locales by number, of the thread and of the process, and their items.
+#include <gtest/gtest.h>
+#include <lexaro/nls1.h>
+
+#include <thread>
+
+#include "support/session.hpp"
+#include "support/trace_capture.hpp"
+
+namespace lx::test {
+namespace {
+
+constexpr uint32_t kThread = NLS1_THREAD, kProcess = NLS1_PROCESS;
+
+std::string full_name(LXLocale* locale) {
+  char name[136];
+  return locale != nullptr && LXLocaleGetLocaleString(locale, name) > 0 ? name : "-";
+}
+
+std::string thread_name() { return full_name(NLS1_PrivateFunction_GetThreadLocale()); }
+
+// The name that a locale of that name has: what it leaves out comes from the language's defaults.
+std::string complete(const char* name) { return full_name(Locale(LXGetLocale(name, 0, nullptr)).get()); }
+
+int32_t both(uint32_t language, uint32_t territory) { return static_cast<int32_t>(territory << 16 | language); }
+
+// The process's and the thread's locale as the program began.
+class Locales : public testing::Test {
+ protected:
+  void SetUp() override { ASSERT_EQ(NLS1_SetLocale(both(3, 250), 819, kThread | kProcess), LX_OK); }
+  void TearDown() override { SetUp(); }
+  const std::string kBefore = complete("French_France.Latin1");
+};
+
+TEST_F(Locales, FromIds) {
+  const struct {
+    int32_t language_territory;
+    uint16_t page;
+    uint32_t options;
+    const char* name;
+    uint32_t rc;
+    const char* message;
+  } cases[] = {
+      {0, 0, 0, "", LX_OK, ""},
+      {1, 0, 0, "English", LX_OK, ""},
+      {both(0, 276), 0, 0, "_Germany", LX_OK, ""},
+      {both(2, 276), 37, 0, "German_Germany.IBM037", LX_OK, ""},
+      {both(2, 40), 0, LX_GET_SUBSTITUTE, "German_Austria", LX_OK, ""},
+      {0, LX_CP_UTF8, kThread | kProcess, ".UTF-8", LX_OK, ""},
+      {0xFFFF, 9999, 0, nullptr, LX_E_LANGUAGE, "Invalid Language 65535"},
+      {both(1, 1), 9999, 0, nullptr, LX_E_TERRITORY, "Invalid Territory 1"},
+      {both(1, 0x8001), 0, LX_GET_SUBSTITUTE, nullptr, LX_E_TERRITORY, "Invalid Territory 32769"},
+      {1, LX_CP_UCS2, 0, nullptr, LX_E_CODEPAGE, "Invalid Codepage 1200"},
+      {1, 0, 1, nullptr, LX_E_ARGUMENT, ""},
+      {1, 0, 8 | kThread, nullptr, LX_E_ARGUMENT, ""},
+  };
+  for (const auto& one : cases) {
+    TraceCapture trace;
+    uint32_t rc = 99;
+    Locale locale(NLS1_GetLocale(one.language_territory, one.page, one.options, &rc));
+    EXPECT_EQ(rc, one.rc) << std::hex << one.language_territory;
+    EXPECT_EQ(full_name(locale.get()), one.name != nullptr ? complete(one.name) : "-");
+    EXPECT_EQ(trace.all().find("Invalid ") != std::string::npos, *one.message != '\0') << trace.all();
+    if (*one.message != '\0') {
+      EXPECT_TRUE(trace.has(one.message)) << trace.all();
+    }
+  }
+  Locale locale(NLS1_GetLocale(0, 0, 0, nullptr));
+  EXPECT_NE(locale, nullptr) << "the status is optional";
+}
+
+TEST_F(Locales, AreSetWhereTheScopeSays) {
+  const std::string german = complete("German_Germany.IBM037");
+  const struct {
+    uint32_t options;
+    bool thread, process;
+  } cases[] = {{0, false, true},
+               {kProcess, false, true},
+               {LX_GET_SUBSTITUTE, false, true},
+               {kThread, true, false},
+               {kThread | LX_GET_SUBSTITUTE, true, false},
+               {kThread | kProcess, true, true}};
+  for (const auto& one : cases) {
+    SetUp();
+    EXPECT_EQ(NLS1_SetLocale(both(2, 276), 37, one.options), LX_OK);
+    EXPECT_EQ(thread_name(), one.thread ? german : kBefore) << std::hex << one.options;
+    EXPECT_EQ(full_name(lxglocale), one.process ? german : kBefore) << std::hex << one.options;
+    std::thread([&] { EXPECT_EQ(thread_name(), complete("French_France.Latin1@BINARY")); }).join();
+  }
+}
+
+TEST_F(Locales, FailuresChangeNothing) {
+  const struct {
+    int32_t language_territory;
+    uint16_t page;
+    uint32_t rc;
+  } cases[] = {{500, 0, LX_E_LANGUAGE}, {both(1, 1), 0, LX_E_TERRITORY}, {1, 9999, LX_E_CODEPAGE}};
+  for (const auto& one : cases) {
+    for (uint32_t options : {0u, kThread, kProcess, kThread | kProcess}) {
+      EXPECT_EQ(NLS1_SetLocale(one.language_territory, one.page, options), one.rc);
+    }
+  }
+  EXPECT_EQ(NLS1_SetLocale(2, 0, kThread | 8), LX_E_ARGUMENT);
+  EXPECT_EQ(thread_name(), kBefore);
+  EXPECT_EQ(full_name(lxglocale), kBefore);
+  EXPECT_EQ(NLS1_SetLocale(2, 0, 8), LX_OK) << "of the process's options only those of LXSetLocale are looked at";
+  EXPECT_EQ(full_name(lxglocale), complete("German"));
+}
+
+TEST_F(Locales, UserLocale) {
+  EXPECT_EQ(NLS1_SetLocale(both(2, 276), 37, LX_GET_USER | LX_GET_SUBSTITUTE), LX_OK);
+  EXPECT_EQ(full_name(lxglocale), complete("French_France.Latin1@BINARY"));
+}
+
+TEST_F(Locales, Numbers) {
+  Locale locale(NLS1_GetLocale(both(2, 276), 0, 0, nullptr));
+  EXPECT_EQ(NLS1_GetLocaleNumInfo(locale.get(), LX_ITEM_LANGUAGE_ID, 0), 2);
+  EXPECT_EQ(NLS1_GetLocaleNumInfo(nullptr, LX_ITEM_LANGUAGE_ID, 0), 3) << "null is the locale of the process";
+  EXPECT_EQ(NLS1_GetLocaleNumInfo(locale.get(), 999, 0), -1);
+  EXPECT_EQ(LXGetError(locale.get()), LX_E_ITEM);
+  EXPECT_EQ(NLS1_SetLocaleNumInfo(locale.get(), LX_ITEM_LANGUAGE_ID, 3), 1);
+  EXPECT_EQ(NLS1_GetLocaleNumInfo(locale.get(), LX_ITEM_LANGUAGE_ID, 0), 3);
+  EXPECT_EQ(NLS1_SetLocaleNumInfo(locale.get(), LX_ITEM_LANGUAGE_ID, 999), 0);
+  EXPECT_EQ(LXGetError(locale.get()), LX_E_NOTFOUND);
+}
+
+TEST_F(Locales, TextsInAnyCodePage) {
+  Locale locale(NLS1_GetLocale(both(11, 392), 0, 0, nullptr));
+  const auto own = [&](uint16_t page) -> std::string {
+    char text[64];
+    const int32_t count = NLS1_GetLocaleTextInfo(locale.get(), LX_ITEM_LANGUAGE_OWN_NAME, text, sizeof text, page, 0);
+    return count > 0 ? text : std::to_string(count);
+  };
+  char expected[64];
+  LXGetLocaleTextInfo(locale.get(), LX_ITEM_LANGUAGE_OWN_NAME, expected, sizeof expected, 0);
+  EXPECT_EQ(own(0), expected);
+  EXPECT_EQ(own(LX_CP_UTF8), "日本語");
+  EXPECT_EQ(own(930), "\x0E\x45\x62\x45\x66\x48\xE7\x0F");
+  EXPECT_EQ(own(932), "\x93\xFA\x96\x7B\x8C\xEA");
+
+  constexpr uint32_t kCurrency = 64;
+  EXPECT_EQ(NLS1_SetLocaleTextInfo(locale.get(), kCurrency, "\x0E\x45\x62\x0F\xC1", -1, 930, 0), 1);
+  char text[64];
+  EXPECT_GT(NLS1_GetLocaleTextInfo(locale.get(), kCurrency, text, sizeof text, LX_CP_UTF8, 0), 0);
+  EXPECT_STREQ(text, "日A");
+  EXPECT_EQ(NLS1_SetLocaleTextInfo(locale.get(), kCurrency, "B", -1, 0, 0), 1);
+  EXPECT_GT(NLS1_GetLocaleTextInfo(locale.get(), kCurrency, text, sizeof text, 37, 0), 0);
+  EXPECT_STREQ(text, "\xC2");
+
+  TraceCapture trace;
+  EXPECT_EQ(own(9999), "-1");
+  EXPECT_EQ(LXGetError(locale.get()), LX_E_CODEPAGE);
+  EXPECT_TRUE(trace.has("Invalid Codepage 9999"));
+  EXPECT_EQ(NLS1_SetLocaleTextInfo(nullptr, kCurrency, "C", -1, 9998, 0), 0);
+  EXPECT_EQ(LXGetError(nullptr), LX_E_CODEPAGE);
+  EXPECT_TRUE(trace.has("Invalid Codepage 9998"));
+}
+
+}  // namespace
+}  // namespace lx::test
