@@ -33,23 +33,23 @@ TEST_F(Locale, OfTheUser) {
   } cases[] = {
       {{}, "English_UnitedStates.US-ASCII@Binary", ""},
       {{{"LANG", "ja_JP.PCK"}}, "Japanese_Japan.MS932@Binary", ""},
-      {{{"LANG", "de_CH.UTF-8"}}, "German_German-Switzerland.UTF-8@Binary", "de_CH.UTF-8 is taken as German_German-S"},
+      {{{"LANG", "de_CH.UTF-8"}}, "German_German-Switzerland.UTF-8@Default", "de_CH.UTF-8 is taken as German_German-S"},
       {{{"LANG", "C.UTF-8"}}, "English_UnitedStates.UTF-8@Binary", "is taken as"},
-      {{{"LANG", "en_GB.utf8"}}, "English_UnitedKingdom.UTF-8@Binary", "is taken as"},
-      {{{"LANG", "nb_NO.UTF-8"}}, "Norwegian_Norway.UTF-8@Binary", "is taken as"},
+      {{{"LANG", "en_GB.utf8"}}, "English_UnitedKingdom.UTF-8@Default", "is taken as"},
+      {{{"LANG", "nb_NO.UTF-8"}}, "Norwegian_Norway.UTF-8@Danish", "is taken as"},
       {{{"LANG", "zh_TW.UTF-8"}}, "TraditionalChinese_Taiwan.UTF-8@Binary", "is taken as"},
-      {{{"LANG", "fr_CH.ISO8859-15@euro"}}, "French_French-Switzerland.ISO-8859-15@Binary", "modifier euro"},
-      {{{"LANG", "fr_LU"}}, "French_France.Latin1@Binary", "territory LU"},
-      {{{"LANG", "it_IT.KLINGON"}}, "Italian_Italy.Latin1@Binary", "code set KLINGON"},
-      {{{"LANG", "xx_YY.UTF-8"}}, "English_UnitedStates.UTF-8@Binary", "\"xx_YY.UTF-8\" of the system is not known"},
-      {{{"LANG", "C"}, {"LC_ALL", "cs_CZ.UTF-8"}}, "Czech_CzechRepublic.UTF-8@Binary", "cs_CZ.UTF-8 is taken"},
+      {{{"LANG", "fr_CH.ISO8859-15@euro"}}, "French_French-Switzerland.ISO-8859-15@Default", "modifier euro"},
+      {{{"LANG", "fr_LU"}}, "French_France.Latin1@Default", "territory LU"},
+      {{{"LANG", "it_IT.KLINGON"}}, "Italian_Italy.Latin1@Default", "code set KLINGON"},
+      {{{"LANG", "xx_YY.UTF-8"}}, "English_UnitedStates.UTF-8@Default", "\"xx_YY.UTF-8\" of the system is not known"},
+      {{{"LANG", "C"}, {"LC_ALL", "cs_CZ.UTF-8"}}, "Czech_CzechRepublic.UTF-8@Czech", "cs_CZ.UTF-8 is taken"},
       {{{"LANG", "de_DE.UTF-8"}, {"LC_TIME", "fr_CA.UTF-8"}, {"LC_CTYPE", "ja_JP.eucJP"}},
-       "CanadianFrench_Germany.JapanEUC@Binary",
+       "CanadianFrench_Germany.JapanEUC@Default",
        "/ja_JP.eucJP/de_DE.UTF-8/fr_CA.UTF-8/"},
       {{{"LANG", "fr"}, {"LX_LANG", "German_Austria.IBM-930@binary"}}, "German_Austria.IBM930@Binary", ""},
-      {{{"LX_LANG", "pl_PL.UTF-8"}}, "Polish_Poland.UTF-8@Binary", "is taken as"},
-      {{{"LX_LANG", "German_Nowhere"}}, "German_Germany.Latin1@Binary", "LX_LANG is not known (territory not found)"},
-      {{{"LX_LANG", ""}}, "English_UnitedStates.Latin1@Binary", ""},
+      {{{"LX_LANG", "pl_PL.UTF-8"}}, "Polish_Poland.UTF-8@Default", "is taken as"},
+      {{{"LX_LANG", "German_Nowhere"}}, "German_Germany.Latin1@Default", "LX_LANG is not known (territory not found)"},
+      {{{"LX_LANG", ""}}, "English_UnitedStates.Latin1@Default", ""},
   };
   for (const auto& c : cases) {
     const ToolResult result = run_in(c.environment, {"locale", "--item", "locale"});
@@ -66,11 +66,11 @@ TEST_F(Locale, ByName) {
     int status;
     const char* text;  // the locale, or part of the message
   } cases[] = {
-      {"German_Austria.latin1", 0, "German_Austria.Latin1@Binary\n"},
-      {"french.850", 0, "French_France.IBM850@Binary\n"},
-      {".utf8", 0, "English_UnitedStates.UTF-8@Binary\n"},
+      {"German_Austria.latin1", 0, "German_Austria.Latin1@Default\n"},
+      {"french.850", 0, "French_France.IBM850@Default\n"},
+      {".utf8", 0, "English_UnitedStates.UTF-8@Default\n"},
       {"/ja/C/de/C", 0, "German_UnitedStates.JapanEUC@Binary\n"},
-      {"de_CH.utf8", 0, "German_German-Switzerland.UTF-8@Binary\n"},
+      {"de_CH.utf8", 0, "German_German-Switzerland.UTF-8@Default\n"},
       {"Germn", 4, "unknown locale or language \"Germn\"; did you mean German?"},
       {"xx_YY", 4, "unknown locale or language \"xx\""},
       {"/", 4, "unknown locale or language"},
@@ -95,12 +95,12 @@ TEST_F(Locale, AllItemsByNumberAndName) {
     const char* name;
     nlohmann::json value;
   } cases[] = {{"1", "language.id", 2},          {"8", "territory.own_name", "Schweiz"},
-               {"9", "codepage.id", 57352},      {"12", "sort.name", "Binary"},
+               {"9", "codepage.id", 57352},      {"12", "sort.name", "Default"},
                {"16", "day.sunday", "Sonntag"},  {"23", "abday.sunday", "So."},
                {"32", "month.3", "M\u00E4rz"},   {"42", "month.13", ""},
                {"59", "decimal", "."},           {"60", "thousands", "'"},
                {"65", "currency_intl", "CHF"},   {"78", "n_sign_posn", 4},
-               {"85", "codepage.max_length", 3}, {"88", "locale", "German_German-Switzerland.UTF-8@Binary"}};
+               {"85", "codepage.max_length", 3}, {"88", "locale", "German_German-Switzerland.UTF-8@Default"}};
   for (const auto& c : cases) EXPECT_EQ(json[c.name], c.value) << c.name;
 
   // Each number has one name, each name one value, and the long list shows them all.

@@ -23,6 +23,8 @@ struct Command {
 Command add_convert_command(CLI::App& program);
 Command add_list_command(CLI::App& program);
 Command add_locale_command(CLI::App& program);
+Command add_records_command(CLI::App& program);
+Command add_sort_command(CLI::App& program);
 
 // Prints the code pages with their aliases.
 ExitStatus list_code_pages(const CommonOptions& common, bool aliases, bool json);

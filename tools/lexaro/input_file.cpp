@@ -3,6 +3,9 @@
 
 #include <fcntl.h>
 
+#include <algorithm>
+#include <vector>
+
 #include "tools/lexaro/failure.hpp"
 
 namespace lx::tool {
@@ -22,6 +25,26 @@ std::size_t InputFile::read(std::span<char> buffer) {
   if (count < 0) throw system_failure(name_ + ": read error at byte " + std::to_string(offset_), errno);
   offset_ += static_cast<uint64_t>(count);
   return static_cast<std::size_t>(count);
+}
+
+uint64_t InputFile::skip(uint64_t wanted) {
+  if (S_ISREG(status_.st_mode)) {
+    const off_t at = ::lseek(fd_, 0, SEEK_CUR);
+    if (at < 0) throw system_failure(name_, errno);
+    const uint64_t left = status_.st_size > at ? static_cast<uint64_t>(status_.st_size - at) : 0;
+    const uint64_t skipped = std::min(wanted, left);
+    if (::lseek(fd_, static_cast<off_t>(skipped), SEEK_CUR) < 0) throw system_failure(name_, errno);
+    offset_ += skipped;
+    return skipped;
+  }
+  std::vector<char> passed(64 * 1024);
+  uint64_t skipped = 0;
+  while (skipped < wanted) {
+    const std::size_t count = read(std::span(passed).first(std::min<uint64_t>(passed.size(), wanted - skipped)));
+    if (count == 0) break;
+    skipped += count;
+  }
+  return skipped;
 }
 
 std::optional<uint64_t> total_size(std::span<const std::string> paths) {

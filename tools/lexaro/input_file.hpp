@@ -19,6 +19,8 @@ class InputFile {
 
   // Bytes read, 0 at the end. Short reads are handed on as they come.
   std::size_t read(std::span<char> buffer);
+  // Bytes passed over, fewer than wanted when the file ends. A regular file is not read for it.
+  uint64_t skip(uint64_t wanted);
 
   const std::string& name() const { return name_; }
   const struct stat& status() const { return status_; }

@@ -104,7 +104,8 @@ ExitStatus run(int argument_count, char** arguments) {
   program.footer(kProgramNotes);
 
   const std::vector<Command> commands = {add_convert_command(program), add_list_command(program),
-                                         add_locale_command(program), add_help_command(program)};
+                                         add_locale_command(program),  add_records_command(program),
+                                         add_sort_command(program),    add_help_command(program)};
   program.require_subcommand(1);
   program.fallthrough();
   for (const Command& command : commands) command.app->fallthrough();

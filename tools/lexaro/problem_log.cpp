@@ -55,11 +55,14 @@ void Histogram::add(uint64_t key) {
   }
 }
 
-void ProblemLog::add(const LXConversionProblem& problem) {
-  if (first_.size() < kMostPositions) first_.push_back(problem);
-  if (problem.kind < kKinds && first_of_kind_[problem.kind].kind == 0) first_of_kind_[problem.kind] = problem;
+bool ProblemLog::add(const LXConversionProblem& problem) {
+  const bool among_first = first_.size() < kMostPositions;
+  if (among_first) first_.push_back(problem);
+  const bool first_of_kind = problem.kind < kKinds && first_of_kind_[problem.kind].kind == 0;
+  if (first_of_kind) first_of_kind_[problem.kind] = problem;
   if (problem.kind == LX_PROBLEM_SUBSTITUTED) substituted_.add(problem.unicode);
   if (problem.kind == LX_PROBLEM_MALFORMED) malformed_.add(sequence_key(problem));
+  return among_first || first_of_kind;
 }
 
 uint64_t ProblemLog::sequence_key(const LXConversionProblem& problem) {
@@ -69,14 +72,18 @@ uint64_t ProblemLog::sequence_key(const LXConversionProblem& problem) {
   return key;
 }
 
-std::string ProblemLog::summary(const LXConversionCounts& counts, bool discarded) const {
+std::string ProblemLog::byte_place(const LXConversionProblem& problem) {
+  return "at byte " + std::to_string(problem.offset);
+}
+
+std::string ProblemLog::summary(const LXConversionCounts& counts, bool discarded, const PlaceFn& place) const {
   std::string text;
   const auto tell = [&](uint64_t count, uint32_t kind, const char* one, const char* many, const std::string& what) {
     if (count == 0) return;
     const LXConversionProblem& first = first_of_kind_[kind];
     if (!text.empty()) text += ", ";
-    text += std::to_string(count) + " " + (count == 1 ? one : many) + (count == 1 ? " (at byte " : " (first at byte ") +
-            std::to_string(first.offset) + ": " + what + ")";
+    text += std::to_string(count) + " " + (count == 1 ? one : many) + (count == 1 ? " (" : " (first ") + place(first) +
+            ": " + what + ")";
   };
   const LXConversionProblem& lacking = first_of_kind_[LX_PROBLEM_SUBSTITUTED];
   tell(counts.substituted, LX_PROBLEM_SUBSTITUTED, discarded ? "character left out" : "character replaced",

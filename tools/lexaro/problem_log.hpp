@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <map>
 #include <string>
 #include <vector>
@@ -26,14 +27,18 @@ class Histogram {
 
 class ProblemLog {
  public:
-  void add(const LXConversionProblem& problem);
+  using PlaceFn = std::function<std::string(const LXConversionProblem& problem)>;  // "at byte 7"
+
+  // Whether the problem is kept with its place; all are counted.
+  bool add(const LXConversionProblem& problem);
 
   const std::vector<LXConversionProblem>& first() const { return first_; }
   const Histogram& substituted() const { return substituted_; }  // by character
   const Histogram& malformed() const { return malformed_; }      // by sequence_key
 
   // "2 characters replaced (first at byte 7: U+20AC), ..."; empty when there was no problem.
-  std::string summary(const LXConversionCounts& counts, bool discarded) const;
+  std::string summary(const LXConversionCounts& counts, bool discarded, const PlaceFn& place = byte_place) const;
+  static std::string byte_place(const LXConversionProblem& problem);
 
   // The bytes of a sequence behind a leading 1 byte, which keeps their number.
   static uint64_t sequence_key(const LXConversionProblem& problem);
