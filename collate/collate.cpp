@@ -41,7 +41,7 @@ class QuickSide {
  public:
   enum class Step : uint8_t { weights, end, other };
 
-  QuickSide(const SortTables& sort, const Reader& in) : sort_(sort), in_(in) {}
+  QuickSide(const SortTables& sort, const Reader& in, uint16_t position) : sort_(sort), in_(in), position_(position) {}
 
   // On to the next character with a primary weight; special weights on the way are kept.
   Step next(uint32_t& weights) {
@@ -68,19 +68,62 @@ class QuickSide {
 
   const SortTables& sort_;
   Reader in_;
-  uint16_t position_ = 0;
+  uint16_t position_;
   unsigned count_ = 0;
   LXSpecialWeight specials_[kMostSpecials];
 };
 
+// The first difference below the primary level of texts whose primary weights are the same: secondary weights go before
+// tertiary ones.
+class LowerLevels {
+ public:
+  void note(uint32_t weights_x, uint32_t weights_y) {
+    bool secondary = weights_x >> 8 != weights_y >> 8;
+    if (secondary_ || (result_ != 0 && !secondary)) return;
+    secondary_ = secondary;
+    result_ = weights_x < weights_y ? -1 : 1;
+  }
+  int32_t result() const { return result_; }
+
+ private:
+  int32_t result_ = 0;
+  bool secondary_ = false;
+};
+
+int32_t primary_difference(uint32_t weights_x, uint32_t weights_y) {
+  return static_cast<int32_t>(weights_x >> 16) - static_cast<int32_t>(weights_y >> 16);
+}
+
+// Passes over ASCII that both texts begin with, up to a difference of primary weights or something that is not plain.
+// Returns how many characters, of one byte each.
+template <class Reader>
+size_t pass_ascii(const SortTables& sort, Reader& a, Reader& b, LowerLevels& lower) {
+  if constexpr (std::same_as<typename Reader::Unit, uint8_t> && !Reader::kShifted) {
+    if (!a.page->ascii_bytes) return 0;
+    size_t count = std::min(static_cast<size_t>(a.end - a.at), static_cast<size_t>(b.end - b.at));
+    size_t i = 0;
+    for (; i < count && ((a.at[i] | b.at[i]) & 0x80) == 0; ++i) {
+      uint32_t weights_x = sort.quick[a.at[i]];
+      uint32_t weights_y = sort.quick[b.at[i]];
+      if ((weights_x & 0xFFFF) == 0 || (weights_x ^ weights_y) >> 16 != 0) break;
+      if (weights_x != weights_y) lower.note(weights_x, weights_y);
+    }
+    a.at += i;
+    b.at += i;
+    return i;
+  } else {
+    return 0;
+  }
+}
+
 // Compares texts of quick characters, whose weights at each level stand side by side. Others leave it undecided.
 template <class Reader>
-Verdict compare_quickly(const SortTables& sort, const Reader& a, const Reader& b, int32_t& result) {
+Verdict compare_quickly(const SortTables& sort, Reader a, Reader b, int32_t& result) {
   using Step = typename QuickSide<Reader>::Step;
-  QuickSide<Reader> x(sort, a);
-  QuickSide<Reader> y(sort, b);
-  int32_t lower = 0;  // the first difference below the primary level: secondary before tertiary
-  bool secondary = false;
+  LowerLevels lower;
+  auto passed = static_cast<uint16_t>(pass_ascii(sort, a, b, lower));
+  QuickSide<Reader> x(sort, a, passed);
+  QuickSide<Reader> y(sort, b, passed);
   for (;;) {
     uint32_t weights_x = 0;
     uint32_t weights_y = 0;
@@ -93,17 +136,11 @@ Verdict compare_quickly(const SortTables& sort, const Reader& a, const Reader& b
     }
     if (step_x == Step::end) break;
     if (weights_x == weights_y) continue;
-    auto primary = static_cast<int32_t>(weights_x >> 16) - static_cast<int32_t>(weights_y >> 16);
-    if (primary != 0) {
-      result = primary;
-      return Verdict::decided;
-    }
-    bool differs = (weights_x >> 8) != (weights_y >> 8);
-    if (secondary || (lower != 0 && !differs)) continue;
-    secondary = differs;
-    lower = weights_x < weights_y ? -1 : 1;
+    result = primary_difference(weights_x, weights_y);
+    if (result != 0) return Verdict::decided;
+    lower.note(weights_x, weights_y);
   }
-  result = lower != 0 ? lower : x.compare_specials(y);
+  result = lower.result() != 0 ? lower.result() : x.compare_specials(y);
   return Verdict::decided;
 }
 
