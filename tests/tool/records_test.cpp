@@ -421,7 +421,7 @@ TEST_F(Records, PlannedPartsMakeTheWhole) {
     const std::string file = write(c.name, c.input);
     const Arguments convert = records("37", "UTF-8", c.shape + Arguments{file});
     const ToolResult whole = run_tool(convert);
-    for (const std::size_t parts : {1, 2, 3, 7, 5000}) {
+    for (const std::size_t parts : {1u, 2u, 3u, 7u, 5000u}) {
       int status = 0;
       std::size_t count = 0;
       const std::string together =
