@@ -575,7 +575,8 @@ extern LX_API const uint16_t LXDigits[179][2];
 /*
  * `s` points at a character of the locale's code page. The Ex forms follow shift states on shift-sensitive code pages
  * (0 single-byte, 1 double-byte) and equal the plain ones elsewhere. Nothing looks behind the character or text that is
- * given. Every out pointer is optional. Failure values are null, -1 and 0, with LX_E_ARGUMENT for bad options.
+ * given, except that LXNextCharEx and LXMoveStringPointerEx with LX_OPT_CHARS see whether a shift byte follows. Every
+ * out pointer is optional. Failure values are null, -1 and 0, with LX_E_ARGUMENT for bad options.
  */
 
 /* Entry of the code page's length table for the first byte; 0: it begins no character (walks then step by one). */
