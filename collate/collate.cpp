@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // Texts compared by the locale's sort object.
 #include <algorithm>
+#include <bit>
 
 #include "collate/transform.hpp"
 #include "collate/trim.hpp"
@@ -94,36 +95,100 @@ int32_t primary_difference(uint32_t weights_x, uint32_t weights_y) {
   return static_cast<int32_t>(weights_x >> 16) - static_cast<int32_t>(weights_y >> 16);
 }
 
-// Passes over ASCII that both texts begin with, up to a difference of primary weights or something that is not plain.
-// Returns how many characters, of one byte each.
-template <class Reader>
-size_t pass_ascii(const SortTables& sort, Reader& a, Reader& b, LowerLevels& lower) {
-  if constexpr (std::same_as<typename Reader::Unit, uint8_t> && !Reader::kShifted) {
-    if (!a.page->ascii_bytes) return 0;
-    size_t count = std::min(static_cast<size_t>(a.end - a.at), static_cast<size_t>(b.end - b.at));
-    size_t i = 0;
-    for (; i < count && ((a.at[i] | b.at[i]) & 0x80) == 0; ++i) {
-      uint32_t weights_x = sort.quick[a.at[i]];
-      uint32_t weights_y = sort.quick[b.at[i]];
-      if ((weights_x & 0xFFFF) == 0 || (weights_x ^ weights_y) >> 16 != 0) break;
-      if (weights_x != weights_y) lower.note(weights_x, weights_y);
-    }
-    a.at += i;
-    b.at += i;
-    return i;
-  } else {
-    return 0;
+// What two texts begin with, as far as both have one quick character a unit there.
+struct Beginning {
+  size_t units = 0;
+  bool decided = false;  // by `result`; otherwise `lower` is what the units passed have told
+  int32_t result = 0;
+  LowerLevels lower;
+
+  void decide(int32_t difference) {
+    decided = true;
+    result = difference;
   }
+};
+
+// Units below this stand for the Unicode character of the same number.
+template <class Kind>
+uint32_t quick_units(const CodePage& page) {
+  if constexpr (std::same_as<Kind, Ucs2Kind>) {
+    return SortTables::kQuickCharacters;
+  } else {
+    return page.ascii_bytes && !(Kind::kShifted && page.shift_sensitive) ? 0x80 : 0;
+  }
+}
+
+// How many units two texts share before the first that differs or is not ASCII: looked at in words of eight bytes, so
+// that a part of the last word may be left.
+template <class Unit>
+size_t same_ascii(const Unit* a, const Unit* b, size_t count) {
+  constexpr unsigned kBits = 8 * sizeof(Unit);
+  constexpr size_t kStep = sizeof(uint64_t) / sizeof(Unit);
+  constexpr uint64_t kUnit = (uint64_t{1} << kBits) - 1;
+  constexpr uint64_t kNotAscii = ~uint64_t{0} / kUnit * (kUnit - 0x7F);
+  size_t i = 0;
+  for (; i + kStep <= count; i += kStep) {
+    uint64_t x = 0;
+    uint64_t y = 0;
+    std::memcpy(&x, a + i, sizeof x);
+    std::memcpy(&y, b + i, sizeof y);
+    const uint64_t stop = (x ^ y) | (x & kNotAscii);
+    if (stop == 0) continue;
+    const int bits = std::endian::native == std::endian::little ? std::countr_zero(stop) : std::countl_zero(stop);
+    return i + static_cast<unsigned>(bits) / kBits;
+  }
+  return i;
+}
+
+// Most comparisons end here, without a reader. Characters that are the same on both sides do not differ at any level.
+template <class Kind>
+[[gnu::always_inline]] inline Beginning compare_beginnings(const SortTables& sort, const CodePage& page,
+                                                           const Text<typename Kind::Unit>& a,
+                                                           const Text<typename Kind::Unit>& b) {
+  using Value = std::make_unsigned_t<typename Kind::Unit>;
+  Beginning begin;
+  const uint32_t quick = quick_units<Kind>(page);
+  const size_t both = std::min(a.length, b.length);
+  size_t i = 0;
+  if (quick != 0 && sort.ascii_in_order) {
+    i = same_ascii(a.at, b.at, both);
+    if (i != 0 && sort.quick[static_cast<Value>(a.at[i - 1])] == 0) i = 0;  // it may begin a pair
+  }
+  for (; i < both; ++i) {
+    const uint32_t x = static_cast<Value>(a.at[i]);
+    const uint32_t y = static_cast<Value>(b.at[i]);
+    if (x >= quick || y >= quick) break;
+    const uint32_t weights_x = sort.quick[x];
+    const uint32_t weights_y = sort.quick[y];
+    if (x == y && weights_x != 0) continue;
+    if ((weights_x & 0xFFFF) == 0 || (weights_y & 0xFFFF) == 0) break;
+    if ((weights_x ^ weights_y) >> 16 != 0) {
+      begin.decide(primary_difference(weights_x, weights_y));
+      return begin;
+    }
+    if (weights_x != weights_y) begin.lower.note(weights_x, weights_y);
+  }
+  begin.units = i;
+  if (i != both) return begin;
+  if (a.length == b.length) {
+    begin.decide(begin.lower.result());
+  } else {
+    const bool longer = a.length > b.length;
+    const uint32_t next = static_cast<Value>((longer ? a : b).at[i]);
+    if (next < quick && (sort.quick[next] & 0xFFFF) != 0) begin.decide(longer ? 1 : -1);
+  }
+  return begin;
 }
 
 // Compares texts of quick characters, whose weights at each level stand side by side. Others leave it undecided.
 template <class Reader>
-Verdict compare_quickly(const SortTables& sort, Reader a, Reader b, int32_t& result) {
+Verdict compare_quickly(const SortTables& sort, const Beginning& begin, Reader a, Reader b, int32_t& result) {
   using Step = typename QuickSide<Reader>::Step;
-  LowerLevels lower;
-  auto passed = static_cast<uint16_t>(pass_ascii(sort, a, b, lower));
-  QuickSide<Reader> x(sort, a, passed);
-  QuickSide<Reader> y(sort, b, passed);
+  LowerLevels lower = begin.lower;
+  a.at += begin.units;
+  b.at += begin.units;
+  QuickSide<Reader> x(sort, a, static_cast<uint16_t>(begin.units));
+  QuickSide<Reader> y(sort, b, static_cast<uint16_t>(begin.units));
   for (;;) {
     uint32_t weights_x = 0;
     uint32_t weights_y = 0;
@@ -231,9 +296,9 @@ int32_t compare_sides(Side<Reader>& a, Side<Reader>& b) {
 }
 
 template <class Reader>
-int32_t compare_weights(LocaleCall& call, const SortTables& sort, Reader a, Reader b) {
+int32_t compare_weights(LocaleCall& call, const SortTables& sort, const Beginning& begin, Reader a, Reader b) {
   int32_t result = 0;
-  if (compare_quickly(sort, a, b, result) == Verdict::decided) return result;
+  if (compare_quickly(sort, begin, a, b, result) == Verdict::decided) return result;
   auto length = [](const Reader& text) { return static_cast<size_t>(text.end - text.at); };
   size_t half = Levels::area_size(length(a));
   WorkArea<kShortWork> area;
@@ -244,31 +309,40 @@ int32_t compare_weights(LocaleCall& call, const SortTables& sort, Reader a, Read
 }
 
 template <class Kind>
-int32_t compare_read(LocaleCall& call, const SortTables& sort, const Text<typename Kind::Unit>& a,
-                     const Text<typename Kind::Unit>& b) {
+[[gnu::noinline]] int32_t compare_rest(LocaleCall& call, const SortTables& sort, const Beginning& begin,
+                                       const Text<typename Kind::Unit>& a, const Text<typename Kind::Unit>& b) {
   const CodePage& page = page_of(call);
   if constexpr (std::same_as<Kind, WideKind>) {
-    return compare_weights(call, sort, WideReader(page, a.at, a.length), WideReader(page, b.at, b.length));
+    return compare_weights(call, sort, begin, WideReader(page, a.at, a.length), WideReader(page, b.at, b.length));
   } else if constexpr (std::same_as<Kind, Ucs2Kind>) {
-    return compare_weights(call, sort, Ucs2Reader(a.at, a.length), Ucs2Reader(b.at, b.length));
+    return compare_weights(call, sort, begin, Ucs2Reader(a.at, a.length), Ucs2Reader(b.at, b.length));
   } else {
     if (Kind::kShifted && page.shift_sensitive) {
       ShiftedReader x(page, bytes_of(a.at), a.length, a.state);
       ShiftedReader y(page, bytes_of(b.at), b.length, b.state);
       x.all_shifts = y.all_shifts = true;
-      return compare_weights(call, sort, x, y);
+      return compare_weights(call, sort, begin, x, y);
     }
     const uint8_t* x = bytes_of(a.at);
     const uint8_t* y = bytes_of(b.at);
     switch (page.kind) {
       case PageKind::single:
-        return compare_weights(call, sort, SingleByteReader(page, x, a.length), SingleByteReader(page, y, b.length));
+        return compare_weights(call, sort, begin, SingleByteReader(page, x, a.length),
+                               SingleByteReader(page, y, b.length));
       case PageKind::utf8:
-        return compare_weights(call, sort, Utf8Reader(page, x, a.length), Utf8Reader(page, y, b.length));
+        return compare_weights(call, sort, begin, Utf8Reader(page, x, a.length), Utf8Reader(page, y, b.length));
       default:
-        return compare_weights(call, sort, MultibyteReader(page, x, a.length), MultibyteReader(page, y, b.length));
+        return compare_weights(call, sort, begin, MultibyteReader(page, x, a.length),
+                               MultibyteReader(page, y, b.length));
     }
   }
+}
+
+template <class Kind>
+int32_t compare_directly(LocaleCall& call, const SortTables& sort, const Text<typename Kind::Unit>& a,
+                         const Text<typename Kind::Unit>& b) {
+  const Beginning begin = compare_beginnings<Kind>(sort, page_of(call), a, b);
+  return begin.decided ? begin.result : compare_rest<Kind>(call, sort, begin, a, b);
 }
 
 // ---- Comparison by keys ----
@@ -319,7 +393,7 @@ int32_t compare_by_sort(LocaleCall& call, const SortTables& sort, Text<Unit> a, 
     options &= ~LX_CMP_TRIM;
   }
   if (!is_transform(options)) return call.fail(LX_E_ARGUMENT, int32_t{0});
-  return options != 0 ? compare_keys<Kind>(call, a, b, options) : compare_read<Kind>(call, sort, a, b);
+  return options != 0 ? compare_keys<Kind>(call, a, b, options) : compare_directly<Kind>(call, sort, a, b);
 }
 
 // Without a sort object the texts are compared in the order of the code page.
@@ -348,7 +422,8 @@ int32_t collate_call(const char* function, LXLocale* locale, const Unit* str1, u
                      const Unit* str2, uint32_t state2, int32_t len2, uint32_t options) {
   constexpr uint32_t kAny = ~0u;
   return locale_call(trace_unit, function, locale, options, kAny, int32_t{0}, [&](LocaleCall& call) -> int32_t {
-    if (sort_of(call.locale) == nullptr) {
+    const SortTables* sort = sort_of(call.locale);
+    if (sort == nullptr) {
       int32_t result = compare_binary(Kind(), call.locale, str1, state1, len1, str2, state2, len2, options);
       call.status = call.locale.last_error;
       return result;
@@ -356,7 +431,8 @@ int32_t collate_call(const char* function, LXLocale* locale, const Unit* str1, u
     const CodePage& page = page_of(call);
     auto a = given_text<Kind>(page, str1, state1, len1, options, Terminator::excluded);
     auto b = given_text<Kind>(page, str2, state2, len2, options, Terminator::excluded);
-    return collate_texts<Kind>(call, a, b, options & ~LX_OPT_CHARS);
+    options &= ~LX_OPT_CHARS;
+    return options == 0 ? compare_directly<Kind>(call, *sort, a, b) : compare_by_sort<Kind>(call, *sort, a, b, options);
   });
 }
 

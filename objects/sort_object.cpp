@@ -120,6 +120,7 @@ const SortTables* build_sort_tables(const uint8_t* checked_section) {
     if (!std::is_sorted(part, end, in_order)) std::sort(part, end, in_order);
   }
 
+  tables->ascii_in_order = true;
   for (unsigned i = 0; i < SortTables::kQuickCharacters; ++i) {
     auto character = static_cast<uint16_t>(i);
     Weights weights = tables->weights_of(character);
@@ -131,6 +132,7 @@ const SortTables* build_sort_tables(const uint8_t* checked_section) {
     tables->quick[i] = plain     ? uint32_t{set.primary} << 16 | uint32_t{set.secondary} << 8 | set.tertiary
                        : special ? uint32_t{set.special} << 16
                                  : 0;
+    if (i < 0x80 && weights.count != 0 && weights.mask != kAllInOrder) tables->ascii_in_order = false;
   }
   return tables;
 }
