@@ -1,7 +1,8 @@
 # SPDX-License-Identifier: Apache-2.0
 # One set of objects, two libraries.
 file(GLOB LEXARO_SOURCES CONFIGURE_DEPENDS
-  host/*.cpp frame/*.cpp objects/*.cpp codepage/*.cpp codepage/text/*.cpp locale/*.cpp collate/*.cpp nls1/*.cpp)
+  host/*.cpp frame/*.cpp objects/*.cpp codepage/*.cpp codepage/text/*.cpp locale/*.cpp collate/*.cpp format/*.cpp
+  stream/*.cpp msgcat/*.cpp nls1/*.cpp)
 
 add_library(lexaro_core OBJECT ${LEXARO_SOURCES})
 target_link_libraries(lexaro_core PRIVATE lexaro_options)

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: Apache-2.0
-set(LEXARO_FUZZ_TARGETS fuzz_alias fuzz_collate fuzz_control fuzz_convert fuzz_object fuzz_text)
+set(LEXARO_FUZZ_TARGETS fuzz_alias fuzz_catalog fuzz_collate fuzz_control fuzz_convert fuzz_format fuzz_object fuzz_stream fuzz_text)
 set(LEXARO_FUZZ_FOLDER ${CMAKE_CURRENT_LIST_DIR})
 set(LEXARO_FUZZ_SUPPORT
   ${LEXARO_FUZZ_FOLDER}/fuzz_support.cpp

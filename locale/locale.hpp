@@ -2,6 +2,7 @@
 // Parts of a locale that more than one file of this folder works on.
 #pragma once
 
+#include "codepage/text/text_kinds.hpp"
 #include "frame/call.hpp"
 #include "frame/memory.hpp"
 #include "locale/items.hpp"
@@ -59,6 +60,21 @@ struct ItemText {
 
 // LX_OK, LX_E_ITEM, or LX_E_NOTFOUND. The full name has no text of this kind.
 uint32_t find_text(const LXLocale& locale, uint32_t number, bool own, ItemText& text);
+
+// Where a text goes: the room in units, the code page of bytes and packed characters (null: the locale's), options as
+// of LXGetLocaleTextInfo.
+template <class Unit>
+struct TextTarget {
+  Unit* buffer;
+  int32_t size;
+  const CodePage* page = nullptr;
+  Shifts shifts = {};
+  uint32_t options = 0;
+};
+
+// Writes the text of an item, terminated, and counts it with its terminator. LX_OK or as find_text().
+template <class Unit>
+uint32_t read_text(const LXLocale& locale, uint32_t number, const TextTarget<Unit>& to, int32_t& count);
 
 inline constexpr size_t kFullNameRoom = 136;  // four names, what stands between them, and a terminator
 size_t write_full_name(const LXLocale& locale, char* buffer);

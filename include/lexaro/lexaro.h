@@ -16,6 +16,7 @@
 
 #include <stddef.h>
 #include <stdint.h>
+#include <time.h>
 
 #if defined(__GNUC__)
 #define LX_API __attribute__((visibility("default")))
@@ -43,6 +44,9 @@ typedef struct LXObjEntry LXObjEntry;     /* one language, territory, code page 
 typedef struct LXGlobals LXGlobals;       /* the global area */
 typedef struct LXFile LXFile;             /* an open data file */
 typedef struct LXConversion LXConversion; /* a resumable conversion; owned by its caller */
+typedef struct LXStream LXStream;         /* an encoded stream; owned by its caller */
+typedef struct LXCatalog LXCatalog;       /* an open message catalog; owned by its caller */
+typedef struct tm LXTime;                 /* a time in its fields: the nine of the C standard count */
 
 typedef struct LXCharType {
   uint32_t flags; /* LX_CT_ bits, bidirectional class and script bits */
@@ -54,8 +58,21 @@ typedef struct LXSpecialWeight {
   uint16_t weight;
 } LXSpecialWeight;
 
-typedef void* (*LXAllocFn)(void* context, size_t size);                     /* null: no memory */
-typedef int (*LXFreeFn)(void* context, void* block);                        /* non-zero: success */
+typedef struct LXCatSet { /* a set of a catalog: in the file, or loaded (then with `index` and `text`) */
+  uint32_t number;
+  uint32_t next; /* offsets in the file */
+  uint32_t messages;
+  uint32_t index_offset;
+  uint32_t text_offset;
+  uint32_t text_size;
+  void* index;
+  char* text;
+} LXCatSet;
+
+typedef void* (*LXAllocFn)(void* context, size_t size); /* null: no memory */
+typedef int (*LXFreeFn)(void* context, void* block);    /* non-zero: success */
+/* Moves up to `count` bytes: the number moved, -1 on failure or at the end. */
+typedef int32_t (*LXTransferFn)(void* context, void* buffer, int32_t count);
 typedef int32_t (*LXEnumFn)(void* context, uint8_t type, const char* name); /* 0 stops the enumeration */
 typedef int32_t (*LXEnumWFn)(void* context, uint8_t type, const LXWChar* name);
 typedef int32_t (*LXEnumUFn)(void* context, uint8_t type, const LXUChar* name);
@@ -77,8 +94,19 @@ typedef int32_t (*LXEnumUFn)(void* context, uint8_t type, const LXUChar* name);
 #define LX_E_ITEM 35u       /* unknown item number */
 #define LX_E_NOTFOUND 37u   /* object not found, or a value out of range */
 #define LX_E_BUFFER 40u     /* output buffer too small */
+#define LX_E_BASE 50u       /* base of a number */
+#define LX_E_FORMAT 51u     /* malformed format, or an unknown directive in it */
 #define LX_E_FULL 52u       /* conversion: output full, input pending */
 #define LX_E_PARTIAL 53u    /* conversion: the input ends inside a character */
+#define LX_E_DIRECTION 60u  /* stream of the other direction */
+#define LX_E_TRANSFER 61u   /* stream: the transfer failed inside a character */
+#define LX_E_FLUSH 62u      /* stream: the transfer failed while flushing */
+#define LX_E_HALF 63u       /* stream: part of a character came, which is kept */
+#define LX_E_COUNT 64u      /* stream: the transfer gave a count that cannot be */
+#define LX_E_REFUSED 65u    /* stream: output was refused and is kept */
+#define LX_E_NOCATALOG 70u  /* null catalog */
+#define LX_E_CATALOG 71u    /* catalog file damaged, or not of this machine */
+#define LX_E_MESSAGE 72u    /* no such message */
 #define LX_E_NOFILE 1000u   /* file not found */
 #define LX_E_ACCESS 1001u   /* permission denied */
 #define LX_E_READMODE 1002u /* read from a file opened for writing */
@@ -211,6 +239,28 @@ typedef int32_t (*LXEnumUFn)(void* context, uint8_t type, const LXUChar* name);
 #define LX_CMP_TRIM 0x200000u
 #define LX_STR_LAST 0x80000020u /* the last occurrence */
 #define LX_COLL_TRIM 1u         /* ignore trailing blanks (LXStrcoll, LXStrcollEx) */
+
+#define LX_NUM_TEXTOPT 0x1u    /* the territory's own texts instead of the locale's */
+#define LX_NUM_TERMINATE 0x8u  /* write and count a terminator */
+#define LX_NUM_FULLWIDTH 0x10u /* full-width digits and signs are read too */
+#define LX_NUM_MONETARY 0x20u  /* the separators and signs of money */
+#define LX_NUM_INTLSYM 0x40u   /* the international currency symbol */
+#define LX_NUM_UNSIGNED 0x80u  /* the value has no sign */
+#define LX_NUM_CHARLEN 0x4000u /* lengths and results count characters */
+
+#define LX_EOL_KEEP 0x8000u /* the line end stays in the result */
+#define LX_STREAM_READ 0x80000050u
+#define LX_STREAM_WRITE 0x80000051u
+
+#define LX_CAT_ONEPASS 0x80000060u /* search with the locale's names only */
+#define LX_CAT_LOAD 0x80000061u    /* read the whole catalog into memory; searches once too */
+
+/* What LXStrGetDigit finds besides digits. */
+#define LX_DIG_PLUS 40
+#define LX_DIG_MINUS 41
+#define LX_DIG_THOUSANDS 42
+#define LX_DIG_DECIMAL 43
+#define LX_DIG_SPACE 44
 
 /* ---- Library state ---- */
 
@@ -819,6 +869,332 @@ LX_API void LXStrInsertWeights(uint16_t primary, uint16_t** p_ins, uint16_t** p_
                                uint8_t** s_end, uint8_t tertiary, uint8_t** t_ins, uint8_t** t_end, uint16_t special,
                                LXSpecialWeight** x_ins, LXSpecialWeight** x_end, uint16_t position,
                                uint8_t mask) LX_NOEXCEPT;
+
+/* ---- Numbers and money ---- */
+/*
+ * Values written as the locale writes them, and read back. Lengths count units, with LX_NUM_CHARLEN characters. Writing
+ * returns what was written, with the terminator (LX_NUM_TERMINATE, which takes one unit of the room); -1 with
+ * LX_E_ARGUMENT for other flags; 0 with LX_E_BUFFER for no room; a result that was cut leaves LX_E_BUFFER. Texts of the
+ * locale are its own, with LX_NUM_TEXTOPT those of its territory. The Ex forms write no shift bytes around digits;
+ * `state` is the shift state in which the output starts.
+ */
+
+/*
+ * An integer, in groups of digits. With LX_NUM_CHARLEN the characters of the result are counted from behind it, as many
+ * bytes as it has: on multibyte pages that depends on what stands there. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE,
+ * LX_NUM_UNSIGNED, LX_NUM_CHARLEN.
+ */
+LX_API int32_t LXLongToString(LXLocale* locale, int32_t value, char* buffer, int32_t length,
+                              uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXLongToStringW(LXLocale* locale, int32_t value, LXWChar* buffer, int32_t length,
+                               uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXLongToStringU(LXLocale* locale, int32_t value, LXUChar* buffer, int32_t length,
+                               uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXLongToStringEx(LXLocale* locale, int32_t value, char* buffer, uint32_t state, int32_t length,
+                                uint32_t flags) LX_NOEXCEPT;
+/*
+ * Reads an integer in base 2 to 36; 0 takes the base from a prefix "0x" or "0". Stops at the first character that does
+ * not belong (*end, optional); 0 with *end there when there is no number. Out of range: the nearest value. flags:
+ * LX_NUM_TEXTOPT, LX_NUM_FULLWIDTH, LX_NUM_MONETARY, LX_NUM_UNSIGNED (cast the result), LX_NUM_CHARLEN; others
+ * LX_E_ARGUMENT. LX_E_BASE for another base.
+ */
+LX_API int32_t LXStringToLong(LXLocale* locale, const char* string, int32_t length, const char** end, int32_t base,
+                              uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStringToLongW(LXLocale* locale, const LXWChar* string, int32_t length, const LXWChar** end,
+                               int32_t base, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStringToLongU(LXLocale* locale, const LXUChar* string, int32_t length, const LXUChar** end,
+                               int32_t base, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStringToLongEx(LXLocale* locale, const char* string, uint32_t state, int32_t length, const char** end,
+                                uint32_t* end_state, int32_t base, uint32_t flags) LX_NOEXCEPT;
+/*
+ * Fixed point, with the locale's number of fraction digits (six are rounded; fewer are cut from these, more are one
+ * less, with zeros) and always the decimal point. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE, LX_NUM_CHARLEN.
+ */
+LX_API int32_t LXDoubleToString(LXLocale* locale, double value, char* buffer, int32_t length,
+                                uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXDoubleToStringW(LXLocale* locale, double value, LXWChar* buffer, int32_t length,
+                                 uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXDoubleToStringU(LXLocale* locale, double value, LXUChar* buffer, int32_t length,
+                                 uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXDoubleToStringEx(LXLocale* locale, double value, char* buffer, uint32_t state, int32_t length,
+                                  uint32_t flags) LX_NOEXCEPT;
+/*
+ * Reads a decimal number; an exponent only behind a decimal point. Stops as LXStringToLong does. flags: LX_NUM_TEXTOPT,
+ * LX_NUM_FULLWIDTH, LX_NUM_MONETARY, LX_NUM_CHARLEN.
+ */
+LX_API double LXStringToDouble(LXLocale* locale, const char* string, int32_t length, const char** end,
+                               uint32_t flags) LX_NOEXCEPT;
+LX_API double LXStringToDoubleW(LXLocale* locale, const LXWChar* string, int32_t length, const LXWChar** end,
+                                uint32_t flags) LX_NOEXCEPT;
+LX_API double LXStringToDoubleU(LXLocale* locale, const LXUChar* string, int32_t length, const LXUChar** end,
+                                uint32_t flags) LX_NOEXCEPT;
+LX_API double LXStringToDoubleEx(LXLocale* locale, const char* string, uint32_t state, int32_t length, const char** end,
+                                 uint32_t* end_state, uint32_t flags) LX_NOEXCEPT;
+/*
+ * An amount with the locale's currency symbol (LX_NUM_INTLSYM: the international one) and sign, of which three
+ * characters count when it is negative. At most 512 bytes with LX_NUM_CHARLEN. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE,
+ * LX_NUM_INTLSYM, LX_NUM_CHARLEN.
+ */
+LX_API int32_t LXCurrencyToString(LXLocale* locale, double amount, char* buffer, int32_t length,
+                                  uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXCurrencyToStringW(LXLocale* locale, double amount, LXWChar* buffer, int32_t length,
+                                   uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXCurrencyToStringU(LXLocale* locale, double amount, LXUChar* buffer, int32_t length,
+                                   uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXCurrencyToStringEx(LXLocale* locale, double amount, char* buffer, uint32_t state, int32_t length,
+                                    uint32_t flags) LX_NOEXCEPT;
+/*
+ * The next size of a terminated grouping string ("3;0"), and what follows it: null, nothing. *remaining goes down by
+ * its digits. 0 repeats the size before it. -1: none, or not a grouping string.
+ */
+LX_API int32_t LXStrGroupingSize(LXLocale* locale, const char* grouping, int32_t* remaining,
+                                 const char** next) LX_NOEXCEPT;
+LX_API int32_t LXStrGroupingSizeW(LXLocale* locale, const LXWChar* grouping, int32_t* remaining,
+                                  const LXWChar** next) LX_NOEXCEPT;
+LX_API int32_t LXStrGroupingSizeU(LXLocale* locale, const LXUChar* grouping, int32_t* remaining,
+                                  const LXUChar** next) LX_NOEXCEPT;
+/*
+ * What a text begins with: a digit's value (0 to 35) or an LX_DIG_ code, and *position behind it; -1, and *position at
+ * the start, for anything else. Null separators and empty signs match nothing. flags: 0 or LX_NUM_FULLWIDTH.
+ */
+LX_API int32_t LXStrGetDigit(LXLocale* locale, const char* string, int32_t length, const char** position,
+                             const char* thousands, const char* decimal, const char* positive, const char* negative,
+                             int32_t ascii, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStrGetDigitW(LXLocale* locale, const LXWChar* string, int32_t length, const LXWChar** position,
+                              LXWChar thousands, LXWChar decimal, const LXWChar* positive, const LXWChar* negative,
+                              int32_t ascii, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStrGetDigitU(LXLocale* locale, const LXUChar* string, int32_t length, const LXUChar** position,
+                              LXUChar thousands, LXUChar decimal, const LXUChar* positive, const LXUChar* negative,
+                              uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStrGetDigitEx(LXLocale* locale, const char* string, uint32_t state, int32_t length,
+                               const char** position, uint32_t* new_state, const char* thousands, const char* decimal,
+                               const char* positive, const char* negative, int32_t ascii, uint32_t flags) LX_NOEXCEPT;
+/* A step of the machine that reads decimal numbers: the state after an LX_DIG_ code or digit, -1 if it cannot follow.
+ */
+LX_API int32_t LXStrDoubleNextState(int32_t state, int32_t code, double* value, int32_t* mantissa_sign,
+                                    int32_t* fraction_exponent, int32_t* exponent_sign, int32_t* exponent) LX_NOEXCEPT;
+/* Values of digits and letters by their bytes, -1 for others: ASCII, EBCDIC, and EBCDIC with Katakana (code page 930).
+ */
+LX_API extern const int32_t LXAsciiToNum[256];
+LX_API extern const int32_t LXEbcdicToNum[256];
+LX_API extern const int32_t LXEbcdic930ToNum[256];
+
+/* ---- Time ---- */
+/*
+ * Times written and read by a format of directives:
+ *
+ *   %a %A  day of the week, short and full     %p     AM or PM
+ *   %b %B  month                               %S     seconds, 0 to 59
+ *   %c     short date and time                 %U %W  week of the year from Sunday, Monday (writing only)
+ *   %d     day of the month                    %w     day of the week, 0: Sunday
+ *   %H %I  hour, of 24 and of 12               %x %X  the locale's short date, time
+ *   %j     day of the year, from 000           %y %Y  year, of two and of four digits
+ *   %m %M  month, minutes                      %%     a percent sign
+ *
+ * "#" behind the percent sign leaves leading zeros out, and makes %c and %x take the long date.
+ */
+
+/*
+ * Returns the units written, with the terminator; with LX_NUM_CHARLEN characters, in which `length` and
+ * `format_length` count then too. What was written is returned for every error but a bad flag (-1, LX_E_ARGUMENT):
+ * LX_E_BUFFER, LX_E_NOTFOUND (a field out of range), LX_E_FORMAT. %x, %X and the date of %c are written at the start
+ * of the buffer: use them first in a format. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE, LX_NUM_CHARLEN.
+ */
+LX_API int32_t LXTimeToString(LXLocale* locale, const LXTime* time, char* buffer, int32_t length, const char* format,
+                              int32_t format_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXTimeToStringW(LXLocale* locale, const LXTime* time, LXWChar* buffer, int32_t length,
+                               const LXWChar* format, int32_t format_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXTimeToStringU(LXLocale* locale, const LXTime* time, LXUChar* buffer, int32_t length,
+                               const LXUChar* format, int32_t format_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXTimeToStringEx(LXLocale* locale, const LXTime* time, char* buffer, uint32_t state, int32_t length,
+                                const char* format, uint32_t format_state, int32_t format_length,
+                                uint32_t flags) LX_NOEXCEPT;
+/* Expands the directive at *format_position: 0, LX_E_NOTFOUND, LX_E_BUFFER or LX_E_FORMAT. The format is terminated. */
+LX_API uint32_t LXStrExpandTime(LXLocale* locale, const LXTime* time, char* buffer, int32_t* position, int32_t length,
+                                const char* format, int32_t* format_position, uint32_t text_option, int32_t ascii,
+                                int32_t alternate, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXStrExpandTimeW(LXLocale* locale, const LXTime* time, LXWChar* buffer, int32_t* position,
+                                 int32_t length, const LXWChar* format, int32_t* format_position, uint32_t text_option,
+                                 int32_t ascii, int32_t alternate, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXStrExpandTimeU(LXLocale* locale, const LXTime* time, LXUChar* buffer, int32_t* position,
+                                 int32_t length, const LXUChar* format, int32_t* format_position, uint32_t text_option,
+                                 int32_t ascii, int32_t alternate, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXStrExpandTimeEx(LXLocale* locale, const LXTime* time, char* buffer, uint32_t* state,
+                                  int32_t* position, int32_t length, const char* format, uint32_t* format_state,
+                                  int32_t* format_position, uint32_t text_option, int32_t ascii, int32_t alternate,
+                                  uint32_t flags) LX_NOEXCEPT;
+/* Appends a text of the locale: 0 or LX_E_BUFFER. */
+LX_API uint32_t LXStrWriteWord(LXLocale* locale, char* buffer, int32_t* position, int32_t length, uint32_t item,
+                               uint32_t text_option) LX_NOEXCEPT;
+LX_API uint32_t LXStrWriteWordW(LXLocale* locale, LXWChar* buffer, int32_t* position, int32_t length, uint32_t item,
+                                uint32_t text_option) LX_NOEXCEPT;
+LX_API uint32_t LXStrWriteWordU(LXLocale* locale, LXUChar* buffer, int32_t* position, int32_t length, uint32_t item,
+                                uint32_t text_option) LX_NOEXCEPT;
+LX_API uint32_t LXStrWriteWordEx(LXLocale* locale, char* buffer, uint32_t* state, int32_t* position, int32_t length,
+                                 uint32_t item, uint32_t text_option) LX_NOEXCEPT;
+/* Appends the low `width` digits of a value: 0, or LX_E_BUFFER, also when the output is full then. */
+LX_API uint32_t LXStrWriteNumber(char* buffer, int32_t* position, int32_t length, int32_t value, int32_t width,
+                                 int32_t ascii, int32_t alternate) LX_NOEXCEPT;
+LX_API uint32_t LXStrWriteNumberW(LXWChar* buffer, int32_t* position, int32_t length, int32_t value, int32_t width,
+                                  int32_t ascii, int32_t alternate) LX_NOEXCEPT;
+LX_API uint32_t LXStrWriteNumberU(LXUChar* buffer, int32_t* position, int32_t length, int32_t value, int32_t width,
+                                  int32_t ascii, int32_t alternate) LX_NOEXCEPT;
+LX_API uint32_t LXStrWriteNumberEx(LXLocale* locale, char* buffer, uint32_t* state, int32_t* position, int32_t length,
+                                   int32_t value, int32_t width, int32_t ascii, int32_t alternate) LX_NOEXCEPT;
+/*
+ * Fills the fields that the format names and returns the units (LX_NUM_CHARLEN: characters) read; text left over is no
+ * error. -1 with LX_E_NOTFOUND (no match), LX_E_FORMAT or LX_E_ARGUMENT. %y counts from 1900. flags: LX_NUM_TEXTOPT,
+ * LX_NUM_CHARLEN.
+ */
+LX_API int32_t LXStringToTime(LXLocale* locale, LXTime* time, const char* string, int32_t length, const char* format,
+                              int32_t format_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStringToTimeW(LXLocale* locale, LXTime* time, const LXWChar* string, int32_t length,
+                               const LXWChar* format, int32_t format_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStringToTimeU(LXLocale* locale, LXTime* time, const LXUChar* string, int32_t length,
+                               const LXUChar* format, int32_t format_length, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXStringToTimeEx(LXLocale* locale, LXTime* time, const char* string, uint32_t state, int32_t length,
+                                const char* format, uint32_t format_state, int32_t format_length,
+                                uint32_t flags) LX_NOEXCEPT;
+/* Reads one directive: 0, LX_E_NOTFOUND or LX_E_FORMAT. Positions move on success only. */
+LX_API uint32_t LXStrExtractTime(LXLocale* locale, LXTime* time, const char* string, int32_t* position, int32_t length,
+                                 const char* format, int32_t* format_position, int32_t format_length,
+                                 int32_t* afternoon, int32_t ascii, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXStrExtractTimeW(LXLocale* locale, LXTime* time, const LXWChar* string, int32_t* position,
+                                  int32_t length, const LXWChar* format, int32_t* format_position,
+                                  int32_t format_length, int32_t* afternoon, int32_t ascii, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXStrExtractTimeU(LXLocale* locale, LXTime* time, const LXUChar* string, int32_t* position,
+                                  int32_t length, const LXUChar* format, int32_t* format_position,
+                                  int32_t format_length, int32_t* afternoon, int32_t ascii, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXStrExtractTimeEx(LXLocale* locale, LXTime* time, const char* string, uint32_t* state,
+                                   int32_t* position, int32_t length, const char* format, uint32_t* format_state,
+                                   int32_t* format_position, int32_t format_length, int32_t* afternoon, int32_t ascii,
+                                   uint32_t flags) LX_NOEXCEPT;
+/* Reads a number of at most `max_digits`: -1 when there is none; *error LX_E_NOTFOUND, also above `max_value`. */
+LX_API int32_t LXStrReadNumber(uint32_t* error, const char* string, int32_t* position, int32_t length,
+                               int32_t max_digits, int32_t max_value, int32_t ascii) LX_NOEXCEPT;
+LX_API int32_t LXStrReadNumberW(uint32_t* error, const LXWChar* string, int32_t* position, int32_t length,
+                                int32_t max_digits, int32_t max_value, int32_t ascii) LX_NOEXCEPT;
+LX_API int32_t LXStrReadNumberU(uint32_t* error, const LXUChar* string, int32_t* position, int32_t length,
+                                int32_t max_digits, int32_t max_value, int32_t ascii) LX_NOEXCEPT;
+LX_API int32_t LXStrReadNumberEx(LXLocale* locale, uint32_t* error, const char* string, uint32_t* state,
+                                 int32_t* position, int32_t length, int32_t max_digits, int32_t max_value,
+                                 int32_t ascii) LX_NOEXCEPT;
+/* Reads the longest of `count` texts of the locale: its index, or -1 with *error LX_E_NOTFOUND. */
+LX_API int32_t LXStrReadWord(LXLocale* locale, uint32_t* error, const char* string, int32_t* position, int32_t length,
+                             uint32_t first_item, int32_t count, uint32_t text_option) LX_NOEXCEPT;
+LX_API int32_t LXStrReadWordW(LXLocale* locale, uint32_t* error, const LXWChar* string, int32_t* position,
+                              int32_t length, uint32_t first_item, int32_t count, uint32_t text_option) LX_NOEXCEPT;
+LX_API int32_t LXStrReadWordU(LXLocale* locale, uint32_t* error, const LXUChar* string, int32_t* position,
+                              int32_t length, uint32_t first_item, int32_t count, uint32_t text_option) LX_NOEXCEPT;
+LX_API int32_t LXStrReadWordEx(LXLocale* locale, uint32_t* error, const char* string, uint32_t* state,
+                               int32_t* position, int32_t length, uint32_t first_item, int32_t count,
+                               uint32_t text_option) LX_NOEXCEPT;
+/* Codes of the directive characters by their bytes, -1 for others: ASCII, EBCDIC, code page 930. */
+LX_API extern const int32_t LXAsciiTMChar[256];
+LX_API extern const int32_t LXEbcdicTMChar[256];
+LX_API extern const int32_t LXEbcdic930TMChar[256];
+
+/* ---- Streams ---- */
+/*
+ * Characters of the locale's code page, or UCS-2 units in machine order, read or written through a routine of the
+ * caller. The stream keeps up to 80 bytes: a character that came in part, characters put back, output that was refused.
+ * One thread at a time; `reserved` is 0. Functions that give 1 give 0 on failure, with the status in the locale.
+ */
+
+/* mode: LX_STREAM_READ or LX_STREAM_WRITE. The caller closes it; null with LX_E_ARGUMENT or LX_E_MEMORY. */
+LX_API LXStream* LXOpenStream(LXLocale* locale, LXTransferFn routine, void* context, uint32_t mode) LX_NOEXCEPT;
+/* Flushes output, ends it in the single-byte state and frees the stream: 1, or 0 with the first status met. */
+LX_API int32_t LXCloseStream(LXStream* stream, LXLocale* locale, uint32_t reserved) LX_NOEXCEPT;
+/* Writes what is kept: 1; 0 with LX_E_DIRECTION, LX_E_FLUSH (what was kept is gone) or LX_E_COUNT. */
+LX_API int32_t LXFlushStream(LXStream* stream, LXLocale* locale, uint32_t reserved) LX_NOEXCEPT;
+/*
+ * The next character: a UCS-2 unit, or a packed value. 0xFFFF (U), 0xFFFFFFFF: the stream has ended (status 0), or
+ * LX_E_DIRECTION, LX_E_TRANSFER, LX_E_HALF (what came is kept: call again), LX_E_COUNT (also, once, for a shift byte
+ * inside a character, which comes next as it is), LX_E_MEMORY. *state (optional): the shift state of the character. No
+ * more bytes are asked of the routine than the character needs.
+ */
+LX_API LXUChar LXReadCharU(LXStream* stream, LXLocale* locale, uint32_t reserved) LX_NOEXCEPT;
+LX_API LXWChar LXReadCharW(LXStream* stream, LXLocale* locale, uint32_t reserved) LX_NOEXCEPT;
+LX_API LXWChar LXReadChar(LXStream* stream, LXLocale* locale, uint32_t reserved) LX_NOEXCEPT;
+LX_API LXWChar LXReadCharEx(LXStream* stream, LXLocale* locale, uint32_t* state, uint32_t reserved) LX_NOEXCEPT;
+/*
+ * A line: its units (LX_OPT_CHARS: characters; the size too), without its end. flags: LX_EOL_1 to LX_EOL_4 (none: lines
+ * never end), LX_EOL_KEEP (the end stays), LX_OPT_TERMINATE (counted), LX_OPT_CHARS. Stops also before a character that
+ * the buffer lacks room for; line ends need room in any case, and those of two characters come whole if it is more than
+ * one. -1: the stream has ended; -2: failure, with the status in the locale. A failure behind the first character
+ * leaves its status too, but the result is what came before it.
+ */
+LX_API int32_t LXReadString(LXStream* stream, LXLocale* locale, char* buffer, int32_t size, uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXReadStringU(LXStream* stream, LXLocale* locale, LXUChar* buffer, int32_t size,
+                             uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXReadStringW(LXStream* stream, LXLocale* locale, LXWChar* buffer, int32_t size,
+                             uint32_t flags) LX_NOEXCEPT;
+LX_API int32_t LXReadStringEx(LXStream* stream, LXLocale* locale, char* buffer, int32_t size,
+                              uint32_t flags) LX_NOEXCEPT;
+/* Puts a character back, to be read next: 1; 0 with LX_E_DIRECTION or LX_E_BUFFER (no room). */
+LX_API int32_t LXUngetChar(LXStream* stream, LXLocale* locale, const char* s, uint32_t reserved) LX_NOEXCEPT;
+LX_API int32_t LXUngetCharU(LXStream* stream, LXLocale* locale, LXUChar ch, uint32_t reserved) LX_NOEXCEPT;
+LX_API int32_t LXUngetCharW(LXStream* stream, LXLocale* locale, LXWChar packed, uint32_t reserved) LX_NOEXCEPT;
+LX_API int32_t LXUngetCharEx(LXStream* stream, LXLocale* locale, const char* s, uint32_t state,
+                             uint32_t reserved) LX_NOEXCEPT;
+/*
+ * Writes a character, behind what is kept: 1; 0 with LX_E_DIRECTION, LX_E_REFUSED (kept, to be flushed later) or
+ * LX_E_BUFFER (refused, and no room to keep it).
+ */
+LX_API int32_t LXWriteChar(LXStream* stream, LXLocale* locale, const char* s) LX_NOEXCEPT;
+LX_API int32_t LXWriteCharU(LXStream* stream, LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
+LX_API int32_t LXWriteCharW(LXStream* stream, LXLocale* locale, LXWChar packed) LX_NOEXCEPT;
+LX_API int32_t LXWriteCharEx(LXStream* stream, LXLocale* locale, const char* s, uint32_t state) LX_NOEXCEPT;
+
+/* ---- Message catalogs ---- */
+/*
+ * Messages by set and number, in a file in one locale's code page. One thread at a time uses a catalog; its locale must
+ * live as long.
+ */
+
+/*
+ * Opens the first catalog found: `directory`, then the environment's LX_NLSPATH (27 bytes at most), then the name
+ * itself, each a list of templates between semicolons: %N the name, %L language_TERRITORY, %l, %t, %%. What names a
+ * directory is searched for the name. If there is none, the same with the default locale's language and territory.
+ * flags: LX_CAT_LOAD reads all of it at once (and searches once); LX_CAT_ONEPASS searches once; 0. Null with
+ * LX_E_ARGUMENT, LX_E_MEMORY, LX_E_CATALOG or the status of opening. The caller closes it.
+ */
+LX_API LXCatalog* LXOpenCatalog(LXLocale* locale, const char* directory, const char* name, uint32_t flags) LX_NOEXCEPT;
+LX_API LXCatalog* LXOpenCatalogW(LXLocale* locale, const LXWChar* directory, const LXWChar* name,
+                                 uint32_t flags) LX_NOEXCEPT;
+LX_API LXCatalog* LXOpenCatalogU(LXLocale* locale, const LXUChar* directory, const LXUChar* name,
+                                 uint32_t flags) LX_NOEXCEPT;
+/*
+ * Writes a message, converted and terminated; if there is none, the default text (optional). Returns 0,
+ * LX_E_NOCATALOG, LX_E_ARGUMENT, LX_E_MESSAGE (without a default), or LX_E_CATALOG and LX_E_MEMORY (with one too).
+ * flags: LX_OPT_TERMINATE (always so), LX_OPT_CHARS (out_size counts characters).
+ */
+LX_API uint32_t LXGetMessage(LXCatalog* catalog, uint32_t set, int32_t message, char* out, int32_t out_size,
+                             const char* default_text, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXGetMessageW(LXCatalog* catalog, uint32_t set, int32_t message, LXWChar* out, int32_t out_size,
+                              const LXWChar* default_text, uint32_t flags) LX_NOEXCEPT;
+LX_API uint32_t LXGetMessageU(LXCatalog* catalog, uint32_t set, int32_t message, LXUChar* out, int32_t out_size,
+                              const LXUChar* default_text, uint32_t flags) LX_NOEXCEPT;
+/* 0, or LX_E_NOCATALOG for null. */
+LX_API uint32_t LXCloseCatalog(LXCatalog* catalog, uint32_t reserved) LX_NOEXCEPT;
+/* Takes an open file, all of it with `loaded`; the file is the catalog's then. Null with *rc LX_E_CATALOG, LX_E_MEMORY.
+ */
+LX_API LXCatalog* LXMcLoadCat(LXLocale* locale, LXFile* file, int32_t loaded, uint32_t* rc) LX_NOEXCEPT;
+/* Loads a set from a loaded catalog's file; it lives as long as the catalog. record: seven fields in machine order. */
+LX_API uint32_t LXMcLoadSet(LXCatalog* catalog, const uint32_t* record, LXCatSet* set) LX_NOEXCEPT;
+/* The set of a number, on disk read into *scratch. Null: none (*rc 0), LX_E_CATALOG or LX_E_MEMORY. */
+LX_API LXCatSet* MCGetSet(LXCatalog* catalog, uint32_t set, LXCatSet* scratch, uint32_t* rc) LX_NOEXCEPT;
+/* The text of a message; from disk terminated, to be freed with LXMcFree. Null as above. */
+LX_API char* MCGetMsg(LXCatalog* catalog, LXCatSet* set, int32_t message, uint32_t* length, uint32_t* rc) LX_NOEXCEPT;
+/* Of this machine: 1 big-endian, 2 little-endian. */
+LX_API int32_t LXMcGetByteOrder(void) LX_NOEXCEPT;
+/* Memory by the library's callbacks. LXMcRealloc copies and leaves the old block alone, except on failure: freed then.
+ */
+LX_API void* LXMcMalloc(size_t size) LX_NOEXCEPT;
+LX_API int LXMcFree(void* block) LX_NOEXCEPT;
+LX_API void* LXMcSetZero(void* block, size_t size) LX_NOEXCEPT;
+LX_API void* LXMcMemcpy(void* dst, const void* src, size_t size) LX_NOEXCEPT;
+LX_API void* LXMcRealloc(void* block, size_t new_size, size_t old_size) LX_NOEXCEPT;
 
 /* ---- Extensions ---- */
 

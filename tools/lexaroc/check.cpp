@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "catalog_file.hpp"
 #include "code_page_source.hpp"
 #include "collation_root.hpp"
 #include "lint.hpp"
@@ -64,7 +65,9 @@ void check_source(const fs::path& path, Report& report) {
 void check_compiled(const fs::path& path, Report& report) {
   try {
     std::string bytes = read_file(path);
-    if (path.filename() == kControlFile) {
+    if (path.extension() == kCatalogExtension) {
+      unpack_catalog(bytes);
+    } else if (path.filename() == kControlFile) {
       check_control_file(bytes);
     } else if (auto object = parse_object_stem(path.stem().string())) {
       check_object(object->type, object->id, bytes);
@@ -105,7 +108,7 @@ void check_path(const fs::path& path, Report& report) {
     } else {
       check_sources(path, report);
     }
-  } else if (path.extension() == kCompiledExtension) {
+  } else if (path.extension() == kCompiledExtension || path.extension() == kCatalogExtension) {
     check_compiled(path, report);
   } else {
     check_source(path, report);

@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: Apache-2.0
-// lexaroc: compiles, prints and checks locale data.
+// lexaroc: compiles, prints and checks locale data and message catalogs.
 #include <CLI/CLI.hpp>
 #include <iostream>
+#include <optional>
 #include <set>
 
 #include "builtin.hpp"
+#include "catalog_command.hpp"
+#include "catalog_file.hpp"
 #include "check.hpp"
 #include "compile.hpp"
 #include "dump.hpp"
@@ -30,9 +33,21 @@ int run_data(const fs::path& sources, const fs::path& output, Layout layout, con
   return report.clean() ? kDone : kBadData;
 }
 
-int run_dump(const fs::path& file, const fs::path& output) {
+int run_catalog(const CatalogRun& run) {
+  Report report;
+  compile_catalog(run, report);
+  report.print(std::cerr);
+  return report.clean() ? kDone : kBadData;
+}
+
+std::string source_of(const fs::path& file, const std::optional<std::string>& locale_directory) {
+  std::string bytes = read_file(file);
+  return is_catalog(bytes) ? dump_catalog(file, bytes, locale_directory) : dump_file(file);
+}
+
+int run_dump(const fs::path& file, const fs::path& output, const std::optional<std::string>& locale_directory) {
   try {
-    std::string source = dump_file(file);
+    std::string source = source_of(file, locale_directory);
     if (output.empty()) {
       std::cout << source << std::flush;
       return std::cout ? kDone : kIoFailure;
@@ -64,7 +79,7 @@ int run_builtin(const fs::path& sources, const fs::path& output) {
 }
 
 int run(int argc, char** argv) {
-  CLI::App app("Compiler of locale data");
+  CLI::App app("Compiler of locale data and message catalogs");
   app.require_subcommand(1);
   int result = kDone;
   fs::path sources, output;
@@ -80,9 +95,26 @@ int run(int argc, char** argv) {
 
   CLI::App* dump = app.add_subcommand("dump", "Print a compiled file as its readable source");
   fs::path compiled;
-  dump->add_option("FILE", compiled, "control.nls or an object file")->required();
+  dump->add_option("FILE", compiled, "control.nls, an object file or a message catalog")->required();
   dump->add_option("-o,--output", output, "Write to this file instead of standard output");
-  dump->callback([&] { result = run_dump(compiled, output); });
+  std::optional<std::string> locale_directory;
+  const char* locale_help = "Where the locale data is that catalogs need";
+  dump->add_option("--locale-dir", locale_directory, locale_help);
+  dump->callback([&] { result = run_dump(compiled, output, locale_directory); });
+
+  CLI::App* catalog = app.add_subcommand("catalog", "Compile a message catalog");
+  CatalogRun catalog_run;
+  catalog->footer(kCatalogHelp);
+  catalog->add_option("SOURCE", catalog_run.source, "Source of the messages")->required();
+  catalog->add_option("-o,--output", catalog_run.output, "The catalog")->required();
+  catalog->add_option("--locale", catalog_run.locale, "Locale whose code page the messages get")->required();
+  catalog->add_option("--byte-order", catalog_run.byte_order, "Machine that reads it; without it, this one")
+      ->check(CLI::IsMember({"little", "big"}));
+  catalog->add_option("--encoding", catalog_run.encoding, "Code page of the source")->capture_default_str();
+  catalog->add_option("--header", catalog_run.header, "Write the names of sets and messages as a C header");
+  catalog->add_option("--merge", catalog_run.merged, "Begin with the messages of this catalog; may be repeated");
+  catalog->add_option("--locale-dir", catalog_run.locale_directory, locale_help);
+  catalog->callback([&] { result = run_catalog(catalog_run); });
 
   CLI::App* check = app.add_subcommand("check", "Check sources or compiled files");
   std::vector<fs::path> paths;
@@ -91,7 +123,8 @@ int run(int argc, char** argv) {
 
   CLI::App* builtin = app.add_subcommand("builtin", "Make the C++ sources of the built-in objects and tables");
   builtin->add_option("SOURCE_DIR", sources, "Directory of the sources")->required();
-  builtin->add_option("OUTPUT_DIR", output, "Root of the project: its objects/ and codepage/ are written to")->required();
+  builtin->add_option("OUTPUT_DIR", output, "Root of the project: its objects/ and codepage/ are written to")
+      ->required();
   builtin->callback([&] { result = run_builtin(sources, output); });
 
   try {

@@ -1,0 +1,318 @@
+// SPDX-License-Identifier: Apache-2.0
+// Numbers and amounts as they are written: what they look like, and how they fit their room.
+#include <bit>
+#include <cstdio>
+#include <limits>
+#include <random>
+
+#include "format/fixed_point.hpp"
+#include "support/counting_allocator.hpp"
+#include "support/edge_buffer.hpp"
+#include "support/page_source.hpp"
+
+namespace lx::test {
+namespace {
+
+enum class Form { plain, shifted, wide, ucs2 };
+constexpr Form kForms[] = {Form::plain, Form::shifted, Form::wide, Form::ucs2};
+size_t unit_size(Form form) { return form == Form::wide ? 4 : form == Form::ucs2 ? 2 : 1; }
+constexpr uint16_t kUtf8 = 57352;
+const std::vector<uint16_t> kPages = {367, 37, 932, 930, kUtf8};
+enum class What { integer, number, money };
+using enum What;
+
+struct Job {
+  What what;
+  double value;
+  uint32_t flags = 0;
+};
+
+int32_t write(Form form, LXLocale* locale, const Job& job, void* to, int32_t length, uint32_t more_flags = 0) {
+  auto call = [&](auto* buffer, auto write_integer, auto write_number, auto write_money, auto... state) {
+    const uint32_t flags = job.flags | more_flags;
+    if (job.what == money) return write_money(locale, job.value, buffer, state..., length, flags);
+    if (job.what == number) return write_number(locale, job.value, buffer, state..., length, flags);
+    return write_integer(locale, static_cast<int32_t>(job.value), buffer, state..., length, flags);
+  };
+  auto* bytes = static_cast<char*>(to);
+  if (form == Form::plain) return call(bytes, LXLongToString, LXDoubleToString, LXCurrencyToString);
+  if (form == Form::shifted) return call(bytes, LXLongToStringEx, LXDoubleToStringEx, LXCurrencyToStringEx, 0u);
+  if (form == Form::ucs2)
+    return call(static_cast<LXUChar*>(to), LXLongToStringU, LXDoubleToStringU, LXCurrencyToStringU);
+  return call(static_cast<LXWChar*>(to), LXLongToStringW, LXDoubleToStringW, LXCurrencyToStringW);
+}
+
+constexpr const char16_t* kNumber = nullptr;
+struct Setting {
+  uint32_t item;
+  const char16_t* text;
+  int32_t value = 0;
+};
+
+void set(LXLocale* locale, const Setting& setting) {
+  auto* text = reinterpret_cast<const LXUChar*>(setting.text);
+  const size_t length = text == nullptr ? 0 : std::max<size_t>(std::u16string_view(setting.text).size(), 1);
+  EXPECT_EQ(text == nullptr ? LXSetLocaleNumInfo(locale, setting.item, setting.value)
+                            : LXSetLocaleTextInfoU(locale, setting.item, text, static_cast<int32_t>(length), 0),
+            1);
+}
+
+// With room for all of it, as it stands in memory.
+std::string written(Form form, LXLocale* locale, const Job& job) {
+  static LXWChar buffer[12000];
+  int32_t count = write(form, locale, job, buffer, 12000);
+  return {reinterpret_cast<const char*>(buffer), static_cast<size_t>(count) * unit_size(form)};
+}
+
+// The same of what is expected, without shift bytes.
+std::string stored(Form form, const PageSource& page, std::u16string_view text) {
+  std::string raw;
+  for (char16_t c : text) {
+    const uint32_t unit = form == Form::ucs2 ? c : packed(page.encode(c));
+    raw += unit_size(form) == 1 ? page.encode(c) : std::string(reinterpret_cast<const char*>(&unit), unit_size(form));
+  }
+  return raw;
+}
+
+// In all forms of text, on these pages, of which there are all kinds.
+void expect(const std::vector<Setting>& settings, const Job& job, const std::u16string& expected,
+            const std::string& name = "English", const std::vector<uint16_t>& pages = kPages) {
+  Session session;
+  for (uint16_t id : pages) {
+    const PageSource& page = PageSource::of(id);
+    Locale locale(LXGetLocale((name + "." + page.name).c_str(), 0, nullptr));
+    ASSERT_NE(locale, nullptr) << name;
+    for (const Setting& setting : settings) set(locale.get(), setting);
+    for (Form form : kForms) {
+      EXPECT_EQ(written(form, locale.get(), job), stored(form, page, expected))
+          << name << "." << page.name << ", form " << static_cast<int>(form) << ", value " << job.value;
+      EXPECT_EQ(LXGetError(locale.get()), LX_OK);
+    }
+  }
+}
+
+TEST(WrittenNumbers, LookAsPeopleOfTheCountryExpect) {
+  constexpr Job kJobs[] = {
+      {integer, -1234567}, {number, 1234567.891}, {money, 1234.5}, {money, -1234.5}, {money, 1234.5, LX_NUM_INTLSYM}};
+  const struct {
+    const char* locale;
+    const char16_t* expected[5];
+  } cases[] = {
+      {"English", {u"-1,234,567", u"1,234,567.89", u"$1,234.50", u"($1,234.50)", u"USD1,234.50"}},
+      {"German", {u"-1.234.567", u"1.234.567,89", u"1.234,50 EUR", u"-1.234,50 EUR", u"1.234,50 EUR"}},
+      {"_German-Switzerland", {u"-1'234'567", u"1'234'567.89", u"CHF 1'234.50", u"CHF-1'234.50", u"CHF 1'234.50"}},
+      {"French", {u"-1 234 567", u"1 234 567,89", u"1 234,50 EUR", u"-1 234,50 EUR", u"1 234,50 EUR"}},
+      {"Swedish", {u"-1 234 567", u"1 234 567,89", u"1 234,50 kr", u"-1 234,50 kr", u"1 234,50 SEK"}},
+      {"Polish", {u"-1 234 567", u"1 234 567,89", u"1 234,50 zł", u"-1 234,50 zł", u"1 234,50 PLN"}},
+      {"Japanese", {u"-1,234,567", u"1,234,567.89", u"￥1,234.", u"-￥1,234.", u"JPY1,234."}},
+      {"_Brazil", {u"-1.234.567", u"1.234.567,89", u"R$ 1.234,50", u"-R$ 1.234,50", u"BRL 1.234,50"}},
+      {"Hungarian", {u"-1 234 567", u"1 234 567,89", u"1 234, Ft", u"-1 234, Ft", u"1 234,50 HUF"}},
+      {"Turkish", {u"-1.234.567", u"1.234.567,89", u"1.234,50 TL", u"-1.234,50 TL", u"1.234,50 TRY"}},
+  };
+  for (const auto& c : cases) {
+    for (size_t i = 0; i < 5; ++i) expect({}, kJobs[i], c.expected[i], c.locale, {kUtf8});
+  }
+}
+
+TEST(WrittenNumbers, AreGroupedFromTheUnitsDigit) {
+  const struct {
+    const char16_t* grouping;
+    double value;
+    std::u16string text;
+  } cases[] = {{u"3;0", 1234567, u"1,234,567"}, {u"3;0", 123456, u"123,456"},      {u"3;0", 0, u"0"},
+               {u"3", 1234567, u"1234,567"},    {u"3;2;0", 1234567, u"12,34,567"}, {u"1;0", 123, u"1,2,3"},
+               {u"0", 12345, u"12345"},         {u"2;x;0", 12345, u"123,45"},      {u"x", 12345, u"12345"},
+               {u"3;", 1234567, u"1234,567"},   {u";3", 12345, u"12345"},          {u"4294967297;1", 123, u"123"}};
+  for (const auto& [grouping, value, text] : cases) {
+    expect({{LX_ITEM_GROUPING, grouping}}, {integer, -value}, value != 0 ? u"-" + text : text);
+    expect({{LX_ITEM_GROUPING, grouping}}, {number, value}, text + u".00");
+    expect({{LX_ITEM_MON_GROUPING, grouping}}, {money, value}, u"$" + text + u".00");
+  }
+  expect({{LX_ITEM_THOUSANDS, u""}}, {number, 1234567}, u"1234567.00");
+  expect({}, {integer, -2147483648.0}, u"-2,147,483,648");
+  expect({}, {integer, -5, LX_NUM_UNSIGNED}, u"4,294,967,291");
+}
+
+TEST(WrittenNumbers, FractionIsCutNotRounded) { expect({}, {number, -2.999}, u"-2.99"); }
+
+TEST(WrittenNumbers, FractionOfMoreThanSixDigitsLosesOne) {
+  expect({{LX_ITEM_FRACTION_DIGITS, kNumber, 6}}, {number, 0.123456}, u"0.123456");
+  expect({{LX_ITEM_FRACTION_DIGITS, kNumber, 7}}, {number, 0.123456}, u"0.123450");
+  expect({{LX_ITEM_CURRENCY_DIGITS, kNumber, 10000}}, {money, 1.5}, u"$1.5" + std::u16string(9998, u'0'));
+}
+
+TEST(WrittenNumbers, DecimalPointIsAlwaysWritten) {
+  expect({{LX_ITEM_FRACTION_DIGITS, kNumber, 0}}, {number, 42}, u"42.");
+  expect({{LX_ITEM_CURRENCY_INTL_DIGITS, kNumber, 0}}, {money, 42, LX_NUM_INTLSYM}, u"USD42.");
+}
+
+TEST(WrittenNumbers, MinusOfValuesThatRoundToZeroIsKept) {
+  expect({}, {number, -1e-9}, u"-0.00");
+  expect({}, {number, -0.0}, u"0.00");
+}
+
+TEST(WrittenNumbers, WhatIsNoNumberHasNoPoint) {
+  expect({}, {money, -std::numeric_limits<double>::infinity()}, u"($inf)");
+  expect({}, {number, -std::numeric_limits<double>::quiet_NaN()}, u"nan");
+}
+
+TEST(WrittenNumbers, NegativeSignHasAtMostThreeCharacters) {
+  expect({{LX_ITEM_NEGATIVE_SIGN, u"minus"}, {LX_ITEM_N_SIGN_POSN, kNumber, 1}}, {money, -1}, u"min$1.00");
+  expect({{LX_ITEM_POSITIVE_SIGN, u"plus"}}, {money, 1}, u"plus$1.00");
+}
+
+TEST(WrittenNumbers, SignsStandInFivePlaces) {
+  constexpr const char16_t* kLayouts[] = {u"($1.00)", u"($ 1.00)", u"(1.00$)", u"(1.00 $)",  //
+                                          u"-$1.00",  u"-$ 1.00",  u"-1.00$",  u"-1.00 $",   //
+                                          u"$1.00-",  u"$ 1.00-",  u"1.00$-",  u"1.00 $-",   //
+                                          u"-$1.00",  u"-$ 1.00",  u"1.00-$",  u"1.00 -$",   //
+                                          u"$-1.00",  u"$- 1.00",  u"1.00$-",  u"1.00 $-"};
+  for (int32_t i = 0; i < 20; ++i) {
+    const Setting position = {LX_ITEM_N_SIGN_POSN, kNumber, i / 4};
+    const Setting first = {LX_ITEM_N_CS_PRECEDES, kNumber, 1 - i / 2 % 2};
+    expect({position, first, {LX_ITEM_N_SEP_BY_SPACE, kNumber, i % 2}}, {money, -1}, kLayouts[i]);
+  }
+}
+
+TEST(WrittenNumbers, TerritoryIsAskedOnRequest) {
+  const std::vector<Setting> settings = {{LX_ITEM_MON_GROUPING, u"2;0"}, {LX_ITEM_CURRENCY_DIGITS, kNumber, 3}};
+  expect(settings, {money, 1234}, u"$12,34.000");
+  expect(settings, {money, 1234, LX_NUM_TEXTOPT}, u"$1,234.00");
+}
+
+TEST(WrittenNumbers, CharactersAreCountedBehindTheResult) {
+  Session session;
+  Locale locale = locale_of("MS932");
+  // There stand lead bytes, of which two are a character, as far as the buffer goes.
+  constexpr int32_t kCounts[][2] = {{10, 2}, {9, 3}, {7, 4}, {5, 5}};
+  for (const auto& [length, count] : kCounts) {
+    Guarded buffer(static_cast<size_t>(length), '\x81');
+    EXPECT_EQ(LXLongToString(locale.get(), 1234, buffer.data(), length, LX_NUM_CHARLEN), count) << length;
+  }
+}
+
+TEST(WrittenNumbers, LengthsAndTextsFollowShiftStates) {
+  Session session;
+  Locale locale = locale_of("IBM930");
+  set(locale.get(), {LX_ITEM_CURRENCY, u"円"});
+  EXPECT_EQ(hex(written(Form::shifted, locale.get(), {money, 1})).substr(0, 10), "0E46450FF1");
+  static char buffer[1000];
+  EXPECT_EQ(LXLongToStringEx(locale.get(), 12345, buffer, 1, 2, LX_NUM_CHARLEN), 4);  // two of a double-byte run
+  set(locale.get(), {LX_ITEM_CURRENCY_DIGITS, kNumber, 999});
+  EXPECT_EQ(LXCurrencyToString(locale.get(), 1, buffer, 1000, LX_NUM_CHARLEN), 512);
+}
+
+TEST(WrittenNumbers, RefuseOtherFlags) {
+  Session session;
+  Locale locale = locale_of("UTF-8");
+  char buffer[8];
+  constexpr uint32_t kAccepted[] = {0x4089, 0x4009, 0x4049};
+  for (uint32_t i = 0; i < 96; ++i) {
+    const bool good = (kAccepted[i / 32] & 1u << i % 32) != 0;
+    EXPECT_EQ(write(Form::plain, locale.get(), {static_cast<What>(i / 32), 1}, buffer, 8, 1u << i % 32) == -1, !good)
+        << i;
+    EXPECT_EQ(LXGetError(locale.get()), good ? LX_OK : LX_E_ARGUMENT);
+  }
+  EXPECT_EQ(LXCurrencyToString(locale.get(), 1, buffer, 0, LX_NUM_CHARLEN | 0x100), 0);  // no room comes first here
+}
+
+TEST(WrittenNumbers, NeedNoMemory) {
+  CountingAllocator allocator;
+  ASSERT_EQ(allocator.init(LEXARO_DATA), LX_OK);
+  Locale locale = locale_of("IBM930");
+  allocator.calls = 0;
+  for (int i = 0; i < 12; ++i) written(kForms[i / 3], locale.get(), {static_cast<What>(i % 3), -1e9});
+  EXPECT_EQ(allocator.calls, 0);
+  locale.reset();
+  LXTerm();
+}
+
+TEST(GroupingSizes, AreReadOneByOne) {
+  constexpr LXUChar kText[] = {'1', '2', ';', '0', ';', 'x', 0};
+  int32_t cases[][5] = {{0, 6, 12, 3, 4}, {0, 1, 1, -1, 0}, {0, 0, 0, 1, 0},
+                        {3, 4, 0, 5, 3},  {5, 3, -1, 5, 3}, {6, 3, -1, 6, 3}};
+  for (auto [from, left, size, to, left_then] : cases) {
+    const LXUChar* next = kText + from;
+    EXPECT_EQ(LXStrGroupingSizeU(nullptr, next, &left, &next), size);
+    EXPECT_TRUE(next == (to < 0 ? nullptr : kText + to) && left == left_then) << from;
+  }
+}
+
+// The first characters of an output, and how many it has when there are less. Double-byte runs end with their text.
+std::string first_characters(Form form, const PageSource& page, std::string_view text, size_t& count) {
+  const bool shifts = form == Form::shifted && page.mixed();
+  std::string first;
+  bool inside = false;
+  size_t characters = 0;
+  for (size_t at = 0, length; at < text.size() && characters < count; at += length) {
+    const auto lead = static_cast<uint8_t>(text[at]);
+    const bool shift = shifts && (lead == page.enter || lead == page.leave);
+    if (shift) inside = lead == page.enter;
+    length = unit_size(form) > 1 ? unit_size(form) : inside && !shift ? 2 : page.mixed() ? 1 : page.length_of(lead);
+    first += text.substr(at, length);
+    characters += shift ? 0 : 1;
+  }
+  count = characters;
+  return inside ? first + static_cast<char>(page.leave) : first;
+}
+
+TEST(WrittenNumbers, FitTheRoom) {
+  constexpr Job kJobs[] = {{integer, -1234567}, {number, -12.5}, {money, 12}, {money, -1234}};
+  Session session;
+  EdgeBuffer edge(1024);
+  for (int variant = 0; variant < 5 * 4 * 4 * 4; ++variant) {
+    const PageSource& page = PageSource::of(kPages[static_cast<size_t>(variant) % 5]);
+    const Form form = kForms[variant / 5 % 4];
+    const Job& job = kJobs[variant / 20 % 4];
+    const bool in_characters = variant / 80 % 2 != 0;
+    const size_t ending = variant / 160 != 0 ? 1 : 0;
+    const uint32_t flags = (ending != 0 ? LX_NUM_TERMINATE : 0) | (in_characters ? LX_NUM_CHARLEN : 0);
+    Locale locale = locale_of(page.name);
+    set(locale.get(), {LX_ITEM_CURRENCY, u"$円名x"});
+    set(locale.get(), {LX_ITEM_N_CS_PRECEDES, kNumber, 0});
+    set(locale.get(), {LX_ITEM_FRACTION_DIGITS, kNumber, 9});
+    const std::string all = written(form, locale.get(), job);
+
+    for (size_t length = 0; length <= all.size() / unit_size(form) + 3; ++length) {
+      size_t count = in_characters ? std::max(length, ending) - ending : all.size();
+      std::string wanted = first_characters(form, page, all, count);
+      while (!in_characters && wanted.size() / unit_size(form) + ending > std::max(length, ending)) {
+        wanted = first_characters(form, page, all, --count);
+      }
+      const uint32_t status = length == 0 || wanted.size() < all.size() ? LX_E_BUFFER : LX_OK;
+      if (length != 0) wanted.append(ending * unit_size(form), '\0');
+      const size_t units = wanted.size() / unit_size(form);
+      char* room = edge.room((in_characters ? std::max(length, units) : length) * unit_size(form));
+      const int32_t result = write(form, locale.get(), job, room, static_cast<int32_t>(length), flags);
+      EXPECT_EQ(LXGetError(locale.get()), status);
+      ASSERT_EQ(result, length == 0 ? 0 : in_characters ? count + ending : units) << variant << ", length " << length;
+      ASSERT_EQ(hex({room, wanted.size()}), hex(wanted)) << variant << ", length " << length;
+    }
+  }
+}
+
+void expect_as_printed(double value) {
+  char printed[400];
+  std::snprintf(printed, sizeof printed, "%f", value);
+  const FixedPoint fixed(value);
+  std::string text = (fixed.negative() ? "-" : "") + std::string(fixed.integer());
+  if (fixed.finite()) text += "." + std::string(fixed.fraction());
+  ASSERT_EQ(text, printed);
+}
+
+TEST(FixedPoint, IsWhatTheCLibraryPrints) {
+  std::mt19937_64 random(4711);
+  for (int i = 0; i < 350000; ++i) {
+    const uint64_t bits = random();
+    if (const auto any = std::bit_cast<double>(bits); any == any) expect_as_printed(any);
+    expect_as_printed(std::ldexp(static_cast<double>(bits >> 11), static_cast<int>(bits % 128) - 96));
+    expect_as_printed(static_cast<double>(bits >> 34) / 128);  // the seventh digit is often a lone five
+  }
+  for (double value :
+       {0.5e-6, 1.5e-6, 0.9999995, 4503599627370495.5, 0x1p63, 0x1p64, 0x1p53, 5e-324, 1.7976931348623157e308}) {
+    expect_as_printed(-value);
+  }
+}
+
+}  // namespace
+}  // namespace lx::test
