@@ -9,12 +9,14 @@
 #include <vector>
 
 #include "fuzz_support.hpp"
-#include "text/text_calls.hpp"
+#include "support/text_calls.hpp"
 
 namespace lx::fuzz {
 namespace {
 
+using test::Form;
 using test::State;
+using test::StateAt;
 
 const char* const kPages[] = {"US-ASCII", "Latin1", "UTF-8",  "MS932",   "MS936",   "JapanEUC",
                               "EUC-TW",   "IBM037", "IBM930", "IBM1364", "IBM1388", "EUC-KR"};
@@ -51,7 +53,7 @@ struct Text {
   std::unique_ptr<U[]> block;
   size_t units;  // without terminator
   int32_t length;
-  State state;
+  uint32_t shift_state = 0;
 
   Text(std::string_view bytes, bool terminated) : units(bytes.size() / sizeof(U)) {
     block.reset(new U[units + terminated]);
@@ -59,6 +61,7 @@ struct Text {
     if (terminated) block[units] = 0;
   }
   U* at() const { return block.get(); }
+  State state() const { return {shift_state}; }
   size_t allocated() const { return units + (length < 0); }
 };
 
@@ -94,13 +97,13 @@ class Library {
     std::string_view other = all.substr(text.size());
     switch (kind) {
       case 0:
-        return strings<test::PlainCalls>(text, other, first, second);
+        return strings<test::Calls<Form::plain>>(text, other, first, second);
       case 1:
-        return strings<test::ShiftedCalls>(text, other, first, second);
+        return strings<test::Calls<Form::shifted>>(text, other, first, second);
       case 2:
-        return strings<test::WideCalls>(text, other, first, second);
+        return strings<test::Calls<Form::wide>>(text, other, first, second);
       case 3:
-        return strings<test::Ucs2Calls>(text, other, first, second);
+        return strings<test::Calls<Form::ucs2>>(text, other, first, second);
       default:
         return characters(text, first);
     }
@@ -112,12 +115,12 @@ class Library {
   Text<U> given(std::string_view bytes, uint8_t choice) {
     bool measured = choice % 4 == 0;
     Text<U> text(bytes, measured);
-    text.state = choice >> 7;
+    text.shift_state = choice >> 7;
     auto units = static_cast<int32_t>(text.units);
     if ((options_ & LX_OPT_CHARS) != 0 && sizeof(U) == 1) {
       auto at = reinterpret_cast<const char*>(text.at());
-      bool ex = std::is_same_v<Calls, test::ShiftedCalls>;
-      units = ex ? LXNumCharsEx(l_, at, text.state, units) : LXNumChars(l_, at, units);
+      bool ex = std::is_same_v<Calls, test::Calls<Form::shifted>>;
+      units = ex ? LXNumCharsEx(l_, at, text.shift_state, units) : LXNumChars(l_, at, units);
     }
     text.length = measured ? -1 : choice % 4 == 1 ? units : units * (choice >> 2 & 15) / 16;
     return text;
@@ -136,31 +139,40 @@ class Library {
         // Any number of shift bytes may stand between characters.
         size_t room = (options_ & LX_OPT_CHARS) != 0 ? text.allocated() : size_;
         std::unique_ptr<U[]> out(new U[room]);
-        demand(Calls::cpy(l_, out.get(), size, s, text.state, text.length, options_) <= size, "result of cpy");
+        demand(Calls()(test::kStrcpy, l_, out.get(), size, s, text.state(), text.length, options_) <= size,
+               "result of cpy");
         return;
       }
       case 1: {
         Text<U> target(other_bytes, true);
         std::vector<U> joined(target.at(), target.at() + target.units + 1);
         joined.resize(target.units + text.units + 1);
-        int32_t result = Calls::cat(l_, joined.data(), s, text.state, text.length, options_);
+        int32_t result = Calls()(test::kStrcat, l_, joined.data(), s, text.state(), text.length, options_);
         demand(result <= static_cast<int64_t>(joined.size()), "result of cat");
         return;
       }
       case 2: {
         Text<U> wanted(other_bytes, true);
-        inside(Calls::chr(l_, s, text.state, text.length, wanted.at(), other.state, nullptr, options_));
+        U* at = wanted.at();
+        auto character = [at] {
+          if constexpr (sizeof(U) == 1) return static_cast<const char*>(at);
+          if constexpr (sizeof(U) != 1) return *at;
+        };
+        inside(Calls()(test::kStrchr, l_, s, text.state(), text.length, character(), other.state(), StateAt{nullptr},
+                       options_));
         return;
       }
       case 3:
-        return inside(
-            Calls::str(l_, s, text.state, text.length, other.at(), other.state, other.length, nullptr, options_));
+        return inside(Calls()(test::kStrstr, l_, s, text.state(), text.length, other.at(), other.state(), other.length,
+                              StateAt{nullptr}, options_));
       case 4:
-        demand(Calls::spn(l_, s, text.state, text.length, other.at(), other.state, other.length, options_) <= limit,
+        demand(Calls()(test::kStrspn, l_, s, text.state(), text.length, other.at(), other.state(), other.length,
+                       options_) <= limit,
                "result of spn");
         return;
       case 5:
-        demand(Calls::cspn(l_, s, text.state, text.length, other.at(), other.state, other.length, options_) <= limit,
+        demand(Calls()(test::kStrcspn, l_, s, text.state(), text.length, other.at(), other.state(), other.length,
+                       options_) <= limit,
                "result of cspn");
         return;
       case 6:
@@ -168,25 +180,27 @@ class Library {
       case 7: {
         uint32_t type = 0;
         int32_t length = -1;
-        inside(Calls::eol(l_, s, text.state, text.length, &type, &length, options_));
+        inside(Calls()(test::kGetEol, l_, s, text.state(), text.length, &type, &length, options_));
         demand(length >= 0 && length <= 2, "length of a line end");
         return;
       }
       case 8: {
         U line[8];
-        U* end = Calls::put_eol(l_, line, text.state, options_);
+        U* end = Calls()(test::kPutEol, l_, line, text.state(), options_);
         demand(end == nullptr || end - line <= 6, "line end");
         return;
       }
       case 9:
-        Calls::cmp(l_, s, text.state, text.length, other.at(), other.state, other.length, options_);
-        demand(Calls::cmp(l_, s, text.state, text.length, s, text.state, text.length, options_ & ~LX_CMP_TRIM) == 0,
+        Calls()(test::kStrcmp, l_, s, text.state(), text.length, other.at(), other.state(), other.length, options_);
+        demand(Calls()(test::kStrcmp, l_, s, text.state(), text.length, s, text.state(), text.length,
+                       options_ & ~LX_CMP_TRIM) == 0,
                "a text differs from itself");
         return;
       default: {
         size_t room = (options_ & LX_OPT_CHARS) != 0 ? std::max<size_t>(size_ * 6, text.allocated()) : size_;
         std::unique_ptr<U[]> out(new U[room]);
-        demand(Calls::map(l_, out.get(), size, s, text.state, text.length, options_) <= size, "result of map");
+        demand(Calls()(test::kMapString, l_, out.get(), size, s, text.state(), text.length, options_) <= size,
+               "result of map");
       }
     }
   }
@@ -199,8 +213,8 @@ class Library {
     for (size_t rounds = 0; at != nullptr; ++rounds) {
       demand(rounds <= text.units, "no end of the tokens");
       U* next = at;
-      U* token = Calls::tok(l_, at, &text.state, &length, delimiters.at(), delimiters.state, delimiters.length, &next,
-                            options_);
+      U* token = Calls()(test::kStrtok, l_, at, StateAt{&text.shift_state}, &length, delimiters.at(),
+                         delimiters.state(), delimiters.length, &next, options_);
       if (LXGetError(l_) != LX_OK) return;
       demand(token == nullptr || (token >= at && token <= end), "token outside");
       demand(next == nullptr || (token != nullptr && next > token && next < end), "rest outside");
@@ -215,12 +229,12 @@ class Library {
     char* s = text.at();
     size_t size = std::strlen(s);
     char* end = s + size;
-    State state = choice & 1;
+    uint32_t state = choice & 1;
     auto inside = [&](const char* at) { demand(at >= s && at <= end, "step outside"); };
     size_t steps = 0;
-    State walked = state;
+    uint32_t walked = state;
     for (const char* at = s; at < end; ++steps) {
-      State before = walked;
+      uint32_t before = walked;
       const char* next = LXNextCharEx(l_, at, before, &walked);
       demand(next > at, "no step forward");
       LXGetCharTypeEx(l_, at, before, LX_CTYPE_1);

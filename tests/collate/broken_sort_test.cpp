@@ -1,10 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // Sort objects that are broken, and memory that runs out.
-#include <functional>
-
-#include "collate/sort_builder.hpp"
+#include "collate/sort_model.hpp"
 #include "support/counting_allocator.hpp"
-#include "support/edge_buffer.hpp"
 
 namespace lx::test {
 namespace {
@@ -30,9 +27,9 @@ class BrokenSort : public testing::Test {
     uint32_t rc = 99;
     LXObjEntry* entry = LXGetObjFromID(manager, LX_SORT, kSubject, 1, &rc);
     if (LXLoadObj(manager, entry, &rc) == nullptr) return rc;
-    EXPECT_EQ(rc, uint32_t{LX_OK});
+    EXPECT_EQ(rc, LX_OK);
     use(entry);
-    EXPECT_EQ(LXUnloadObj(manager, entry), uint32_t{LX_OK});
+    EXPECT_EQ(LXUnloadObj(manager, entry), LX_OK);
     return LX_OK;
   }
 
@@ -47,7 +44,7 @@ class BrokenSort : public testing::Test {
     }
     uint32_t rc = 99;
     Locale locale(LXGetLocale(kName, 0, &rc));
-    ASSERT_EQ(rc, uint32_t{LX_OK});
+    ASSERT_EQ(rc, LX_OK);
     static EdgeBuffer edge(4096), other(4096), room(4096);
     const char text[] = "aABcbefcc-pqQ-+*mnxyzw0ac";
     const LXUChar units[] = {'c', 'b', 0x100, 0x3041, 0x3105, 0x4E07, 0x5001, 0x5101, 0xFFFE, 'x', 'a', 0x3041};
@@ -72,7 +69,7 @@ class BrokenSort : public testing::Test {
 
 TEST_F(BrokenSort, EveryFlippedBitIsRefusedOrHarmless) {
   const Bytes good = test_sort(true).section();
-  ASSERT_EQ(load(object_file({good})), uint32_t{LX_OK});
+  ASSERT_EQ(load(object_file({good})), LX_OK);
   for (size_t bit = 0; bit < 1036 * 8; ++bit) {
     Bytes broken = good;
     broken[bit / 8] = static_cast<uint8_t>(broken[bit / 8] ^ 1 << bit % 8);
@@ -87,13 +84,12 @@ TEST_F(BrokenSort, EveryTruncationIsRefused) {
   small.pages[1] = small.pages[3] = {};
   const Bytes good = small.section();
   for (size_t size = 0; size < good.size(); ++size) {
-    ASSERT_EQ(load(object_file({Bytes(good.begin(), good.begin() + static_cast<ptrdiff_t>(size))})),
-              uint32_t{LX_E_HEADER})
+    ASSERT_EQ(load(object_file({Bytes(good.begin(), good.begin() + static_cast<ptrdiff_t>(size))})), LX_E_HEADER)
         << size;
   }
   const Bytes file = small.file();
   for (size_t size = 0; size < file.size(); size += size < 100 ? 1 : 37) {
-    ASSERT_NE(load(Bytes(file.begin(), file.begin() + static_cast<ptrdiff_t>(size))), uint32_t{LX_OK}) << size;
+    ASSERT_NE(load(Bytes(file.begin(), file.begin() + static_cast<ptrdiff_t>(size))), LX_OK) << size;
   }
 }
 
@@ -106,14 +102,14 @@ TEST_F(BrokenSort, TablesMayReachTheEnd) {
     image.u16(at, static_cast<unsigned>((bytes[at] << 8 | bytes[at + 1]) + change));
     return object_file({image.bytes()});
   };
-  EXPECT_EQ(load(with(4, 0)), uint32_t{LX_OK});
-  EXPECT_EQ(load(with(4, 1)), uint32_t{LX_E_HEADER});
-  EXPECT_EQ(load(with(1034, 1)), uint32_t{LX_E_HEADER});
-  EXPECT_EQ(load(with(1034, -1)), uint32_t{LX_OK});
-  EXPECT_EQ(load(with(2, 5)), uint32_t{LX_E_HEADER});
-  EXPECT_EQ(load(with(1030, 0x4000)), uint32_t{LX_E_HEADER});
-  EXPECT_EQ(load(with(8, 0x7000)), uint32_t{LX_E_HEADER});
-  EXPECT_EQ(load(with(8 + 4 * 0x30, 0x7000)), uint32_t{LX_OK});  // there it is a weight
+  EXPECT_EQ(load(with(4, 0)), LX_OK);
+  EXPECT_EQ(load(with(4, 1)), LX_E_HEADER);
+  EXPECT_EQ(load(with(1034, 1)), LX_E_HEADER);
+  EXPECT_EQ(load(with(1034, -1)), LX_OK);
+  EXPECT_EQ(load(with(2, 5)), LX_E_HEADER);
+  EXPECT_EQ(load(with(1030, 0x4000)), LX_E_HEADER);
+  EXPECT_EQ(load(with(8, 0x7000)), LX_E_HEADER);
+  EXPECT_EQ(load(with(8 + 4 * 0x30, 0x7000)), LX_OK);  // there it is a weight
 }
 
 // ---- Memory ----
@@ -122,70 +118,45 @@ TEST(CollationMemory, RunsOut) {
   DataDirectory directory;
   write_collation_directory(directory);
   CountingAllocator memory;
-  ASSERT_EQ(memory.init(directory.path()), uint32_t{LX_OK});
-  uint32_t rc = 99;
-  LXLocale* single = LXGetLocale("German_UnitedStates.Single@Combining", 0, &rc);
-  LXLocale* mixed = LXGetLocale("English_UnitedStates.Mixed@Plain", 0, &rc);
-  ASSERT_TRUE(single != nullptr && mixed != nullptr);
-  // Nothing in it is quick to compare.
-  const std::string bytes(3000, 'q');
-  const std::vector<LXWChar> wide(3000, 'q');
-  const std::vector<LXUChar> ucs2(3000, 'q');
-  std::vector<char> key(1000000);
-  const char* s = bytes.data();
-  const LXWChar* w = wide.data();
-  const LXUChar* u = ucs2.data();
-  struct Operation {
-    const char* name;
-    LXLocale* locale;
-    int32_t failed;
-    std::function<int32_t()> call;
-  };
-  const int32_t kFull = 1000000;
-  const Operation operations[] = {
-      {"LXStrcoll", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, 0); }},
-      {"LXStrcoll, case", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, LX_CMP_NOCASE); }},
-      {"LXStrcoll, trimmed", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, LX_COLL_TRIM); }},
-      {"LXStrcoll, width", single, 0, [&] { return LXStrcoll(single, s, 3000, s, 2999, LX_CMP_NOWIDTH); }},
-      {"LXStrcollEx", mixed, 0, [&] { return LXStrcollEx(mixed, s, 3000, 0, s, 2999, 0, 0); }},
-      {"LXStrcollEx, case", mixed, 0, [&] { return LXStrcollEx(mixed, s, 3000, 0, s, 2999, 0, LX_CMP_NOCASE); }},
-      {"LXWcscoll", single, 0, [&] { return LXWcscoll(single, w, 3000, w, 2999, 0); }},
-      {"LXWcscoll, case", single, 0, [&] { return LXWcscoll(single, w, 3000, w, 2999, LX_CMP_NOCASE); }},
-      {"LXStrcollU", single, 0, [&] { return LXStrcollU(single, u, 3000, u, 2999, 0); }},
-      {"LXStrcollU, width", single, 0, [&] { return LXStrcollU(single, u, 3000, u, 2999, LX_CMP_NOWIDTH); }},
-      {"LXStrxfrm", single, -1, [&] { return LXStrxfrm(single, key.data(), 10, s, 3000, 0); }},
-      {"LXStrxfrm, case", single, -1, [&] { return LXStrxfrm(single, key.data(), kFull, s, 3000, LX_CMP_NOCASE); }},
-      {"LXStrxfrmEx", mixed, -1, [&] { return LXStrxfrmEx(mixed, key.data(), 10, s, 3000, 0, 0); }},
-      {"LXWcsxfrm", single, -1, [&] { return LXWcsxfrm(single, key.data(), 10, w, 3000, 0); }},
-      {"LXStrxfrmU", single, -1, [&] { return LXStrxfrmU(single, key.data(), 10, u, 3000, 0); }},
-      {"LXStrGenSortKey", single, -1, [&] { return LXStrGenSortKey(single, key.data(), 10, u, 3000); }},
-  };
-  for (const Operation& operation : operations) {
-    int32_t good = operation.call();
-    EXPECT_GT(good, 0) << operation.name;
-    EXPECT_EQ(LXGetError(operation.locale), uint32_t{LX_OK}) << operation.name;
-    int live = memory.live;
-    for (bool on : {false, true}) {
-      int n = 0;
-      for (bool failed = true; failed; ++n) {
-        memory.arm(n, on);
-        int32_t result = operation.call();
-        failed = memory.has_failed();
-        memory.disarm();
-        EXPECT_EQ(result, failed ? operation.failed : good) << operation.name << ' ' << n;
-        EXPECT_EQ(LXGetError(operation.locale), failed ? uint32_t{LX_E_MEMORY} : uint32_t{LX_OK}) << operation.name;
-        ASSERT_EQ(memory.live, live) << operation.name << ' ' << n;
+  ASSERT_EQ(memory.init(directory.path()), LX_OK);
+  static char key[1000000];
+  for (Form::Kind kind : {Form::plain, Form::shifted, Form::wide, Form::ucs2}) {
+    const Collation form(kind, kind == Form::shifted ? 930 : 819, "Combining", kGerman);
+    const Units text = form.store(std::u16string(3000, u'q')), shorter = first_units(text, 2999);
+    for (uint32_t options : {0u, LX_CMP_NOCASE, LX_CMP_NOWIDTH, LX_COLL_TRIM}) {
+      for (bool compares : {false, true}) {
+        if (options == LX_COLL_TRIM && !(compares && form.form.is_bytes())) continue;
+        auto call = [&] {
+          return compares ? form.compare(text, shorter, options) : form.transform(key, 10, text, 3000, options);
+        };
+        const int32_t good = call();
+        EXPECT_GT(good, 0) << form.name;
+        EXPECT_EQ(LXGetError(form.locale()), LX_OK) << form.name;
+        const int live = memory.live;
+        for (bool on : {false, true}) {
+          int n = 0;
+          for (bool failed = true; failed; ++n) {
+            memory.arm(n, on);
+            const int32_t result = call();
+            failed = memory.has_failed();
+            memory.disarm();
+            EXPECT_EQ(result, !failed ? good : compares ? 0 : -1) << form.name << options << ' ' << n;
+            EXPECT_EQ(LXGetError(form.locale()), failed ? LX_E_MEMORY : LX_OK) << form.name << options << ' ' << n;
+            ASSERT_EQ(memory.live, live) << form.name << options << ' ' << n;
+          }
+          EXPECT_GT(n, 1) << form.name << options << " takes no memory";
+        }
       }
-      EXPECT_GT(n, 1) << operation.name << " takes no memory";
     }
+    // With room for the work no memory is wanted.
+    const std::vector<LXUChar> units(3000, 'q');
+    memory.arm(0, true);
+    EXPECT_EQ(LXStrGenSortKey(form.locale(), key, 10, units.data(), 3000), -1);
+    memory.arm(0, true);
+    EXPECT_GT(LXStrGenSortKey(form.locale(), key + 1, 999999, units.data(), 3000), 0);
+    EXPECT_EQ(memory.calls, 0);
+    memory.disarm();
   }
-  // With room for the work no memory is wanted.
-  memory.arm(0, true);
-  EXPECT_GT(LXStrGenSortKey(single, key.data() + 1, kFull - 1, u, 3000), 0);
-  EXPECT_EQ(memory.calls, 0);
-  memory.disarm();
-  LXReleaseLocale(single, 0);
-  LXReleaseLocale(mixed, 0);
   LXTerm();
   EXPECT_EQ(memory.live, 0);
 }

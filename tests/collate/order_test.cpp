@@ -1,47 +1,43 @@
 // SPDX-License-Identifier: Apache-2.0
-// Texts compared directly, against a slow reading of the same rules and against their keys.
+// Texts compared directly, against a slow reading of the same rules and against their keys; options; shipped sorts.
 #include <random>
 
-#include "collate/collation.hpp"
+#include "collate/sort_model.hpp"
 
 namespace lx::test {
 namespace {
 
 using Order = CollationTest;
 
-struct Text {
+struct Stored {
   std::u16string characters;
-  std::vector<Stored> stored;  // a form each
+  std::vector<Units> forms;
 };
-
-void expect_order(const std::vector<TextForm>& forms, const Text& a, const Text& b) {
-  ModelResult wanted = model_compare(forms.back().reader(a.stored.back()), forms.back().reader(b.stored.back()));
-  for (size_t i = 0; i < forms.size(); ++i) {
-    int32_t got = forms[i].compare(a.stored[i], b.stored[i]);
-    ASSERT_EQ(wanted.exact ? got : sign(got), wanted.value)
-        << forms[i].name() << ' ' << shown(a.characters) << ' ' << shown(b.characters);
-  }
-}
-
-std::vector<Text> stored(const std::vector<TextForm>& forms, const std::vector<std::u16string>& texts) {
-  std::vector<Text> result;
+std::vector<Stored> stored(const std::vector<Collation>& forms, const std::vector<std::u16string>& texts) {
+  std::vector<Stored> result;
   for (const std::u16string& text : texts) {
     result.push_back({text, {}});
-    for (const TextForm& form : forms) result.back().stored.push_back(form.store(text));
+    for (const Collation& form : forms) result.back().forms.push_back(form.store(text));
   }
   return result;
+}
+void expect_order(const std::vector<Collation>& forms, const Stored& a, const Stored& b) {
+  int wanted = model_compare(forms.back().reader(a.forms.back()), forms.back().reader(b.forms.back()));
+  for (size_t i = 0; i < forms.size(); ++i) {
+    int32_t got = forms[i].compare(a.forms[i], b.forms[i]);
+    ASSERT_EQ(std::abs(wanted) > 1 ? got : sign(got), wanted)
+        << forms[i].name << ' ' << hex_units(a.forms[i]) << "| " << hex_units(b.forms[i]);
+  }
 }
 
 TEST_F(Order, OfAllPairsOfShortTexts) {
   for (const char* sort : {"Plain", "Combining"}) {
-    const std::vector<TextForm> forms = own_forms(sort);
+    const std::vector<Collation> forms = own_forms(sort);
     for (const auto& [letters, length] : {std::pair(u"aABcefpqQ-*mntdxyzw0", 2), {u"ab-c", 3}, {u"ap-y", 3}}) {
-      const std::vector<Text> texts = stored(forms, all_texts(letters, static_cast<size_t>(length)));
-      for (const Text& a : texts) {
-        for (const Text& b : texts) {
-          expect_order(forms, a, b);
-          if (HasFatalFailure()) return;
-        }
+      const std::vector<Stored> texts = stored(forms, all_texts(letters, static_cast<size_t>(length)));
+      for (const Stored& a : texts) {
+        for (const Stored& b : texts) expect_order(forms, a, b);
+        if (HasFatalFailure()) return;
       }
     }
   }
@@ -51,7 +47,7 @@ TEST_F(Order, OfLongerTexts) {
   constexpr std::u16string_view kLetters = u"aAbBcefpqQ-+*mntdxyzw0\u3041\u3042";
   std::mt19937 random(7);
   for (const char* sort : {"Plain", "Combining"}) {
-    const std::vector<TextForm> forms = own_forms(sort);
+    const std::vector<Collation> forms = own_forms(sort);
     for (int round = 0; round < 4000; ++round) {
       // A text and one that differs from it in few places.
       std::u16string a(random() % (round % 50 == 0 ? 400 : 20), u'a');
@@ -63,7 +59,7 @@ TEST_F(Order, OfLongerTexts) {
         size_t gone = std::min<size_t>(random() % 3, b.size() - at);
         b.replace(at, gone, random() % 3, kLetters[random() % kLetters.size()]);
       }
-      const std::vector<Text> texts = stored(forms, {a, b});
+      const std::vector<Stored> texts = stored(forms, {a, b});
       expect_order(forms, texts[0], texts[1]);
       expect_order(forms, texts[1], texts[0]);
       if (HasFatalFailure()) return;
@@ -71,117 +67,389 @@ TEST_F(Order, OfLongerTexts) {
   }
 }
 
-// As long as the primary weights stand in order, and what is left out of keys has no part, keys say the same.
+// As long as the primary weights stand in order, and what is left out of keys has no part, keys say the same. Pairs
+// combine only without special weights, whose positions the readers count in their own way.
 TEST_F(Order, IsThatOfTheKeys) {
-  auto expect_agreement = [](const TextForm& form, std::u16string_view letters, size_t length) {
-    std::vector<std::pair<Stored, std::string>> texts;
-    for (const std::u16string& text : all_texts(letters, length)) {
-      texts.emplace_back(form.store(text), model_key(form.sort(), text));
+  for (const auto& [sort, letters] :
+       {std::pair("Plain", u"aAbBef-m"), {"Plain", u"ab-+mx"}, {"Combining", u"aAbBcm"}}) {
+    Collation form(Form::plain, 819, sort);
+    std::vector<std::pair<Units, std::string>> texts;
+    for (const std::u16string& text : all_texts(letters, 3)) {
+      texts.emplace_back(form.store(text), model_key(form.sort, text));
     }
     for (const auto& [a, key_a] : texts) {
       for (const auto& [b, key_b] : texts) {
-        ASSERT_EQ(sign(form.compare(a, b)), sign(key_a.compare(key_b))) << form.name() << ' ' << a.raw << ' ' << b.raw;
+        ASSERT_EQ(sign(form.compare(a, b)), sign(key_a.compare(key_b))) << sort << hex_units(a) << hex_units(b);
       }
     }
-  };
-  expect_agreement(TextForm(Kind::plain, "Single", "Plain"), u"aAbBef-m", 3);
-  expect_agreement(TextForm(Kind::plain, "Single", "Plain"), u"ab-+mx", 3);
-  // Where pairs combine only without special weights, whose positions the readers count in their own way.
-  expect_agreement(TextForm(Kind::plain, "Single", "Combining"), u"aAbBcm", 3);
+  }
 }
 
 // And here is where they do not.
 TEST_F(Order, DiffersFromThatOfTheKeys) {
-  struct Case {
+  const struct {
     const char* sort;
     std::u16string_view a, b;
     int direct, keys;
-  };
-  const Case cases[] = {
+  } cases[] = {
       {"Plain", u"am", u"amd", -1, 0},       // a default weight at the end of a level
       {"Plain", u"p", u"pa", -1, -1},        // not in order: the longer one goes on with the secondary weights
       {"Plain", u"pm", u"pa", 1, -1},        // where the shorter one may be the greater
       {"Plain", u"0-", u"-", 1, 0},          // alone, special weights have no positions in keys
       {"Combining", u"a-b", u"ab-", 0, -1},  // characters looked at ahead are not counted
   };
-  for (const Case& one : cases) {
-    TextForm form(Kind::plain, "Single", one.sort);
-    Stored a = form.store(one.a), b = form.store(one.b);
-    EXPECT_EQ(sign(form.compare(a, b)), one.direct) << shown(one.a) << shown(one.b);
-    EXPECT_EQ(sign(form.key(a).compare(form.key(b))), one.keys) << shown(one.a) << shown(one.b);
-  }
-}
-
-TEST_F(Order, GivesTheDifferenceOfPrimaryWeights) {
-  struct Case {
-    std::u16string_view a, b;
-    int32_t result;
-  };
-  const Case cases[] = {{u"b", u"a", 2},   {u"a", u"b", -2}, {u"aa", u"a", 1},          {u"a", u"aa", -1},
-                        {u"-b", u"a-", 2}, {u"B", u"ab", 2}, {u"\u3041", u"a", 0x2F31}, {u"x", u"aB", 0},
-                        {u"", u"", 0},     {u"", u"a", -1},  {u"z0", u"", 0},           {u"Ab", u"ab", 1}};
-  for (const TextForm& form : own_forms("Plain")) {
-    for (const Case& one : cases) {
-      EXPECT_EQ(form.compare(form.store(one.a), form.store(one.b)), one.result)
-          << form.name() << shown(one.a) << shown(one.b);
-    }
+  for (const auto& one : cases) {
+    Collation form(Form::plain, 819, one.sort);
+    Units a = form.store(one.a), b = form.store(one.b);
+    EXPECT_EQ(sign(form.compare(a, b)), one.direct) << hex_units(a) << hex_units(b);
+    EXPECT_EQ(sign(form.key(a).compare(form.key(b))), one.keys) << hex_units(a) << hex_units(b);
   }
 }
 
 TEST_F(Order, OfMeasuredAndCutTexts) {
-  TextForm form(Kind::plain, "Small", "Plain");
+  Collation form(Form::plain, 954, "Plain");
   EdgeBuffer edge(64);
-  const char* a = edge.text({"ab\x81", 3});
-  EXPECT_EQ(LXStrcoll(form.locale(), a, 3, "ab", -1, 0), 0);
-  EXPECT_EQ(LXStrcoll(form.locale(), "ab\0c", -1, "ab", 2, 0), 0);
-  EXPECT_EQ(LXStrcoll(form.locale(), "ab", -7, "ab", -2, 0), 0);
-  // Characters: three of six bytes, against the same text whole.
-  EXPECT_EQ(LXStrcoll(form.locale(), "\x81\x41\x81\x42\x81\x43-", 3, "\x81\x41\x81\x42\x81\x43", 3, LX_OPT_CHARS), 0);
-  EXPECT_EQ(LXStrcoll(form.locale(), "\x81\x41\x81\x42", 2, "\x81\x41\x81\x42", 1, LX_OPT_CHARS), 1);
-  TextForm mixed(Kind::shifted, "Mixed", "Plain");
-  EXPECT_EQ(LXStrcollEx(mixed.locale(),
-                        "\x41\x40\x0F"
-                        "a",
-                        4, 1,
-                        "\x0F\x0E\x41\x40\x0F\x0E\x0F"
-                        "a",
-                        8, 1, 0),
-            0);
-  EXPECT_EQ(LXStrcollEx(mixed.locale(), "\x0E\x41\x40\x41\x41", 2, 0, "\x0E\x41\x40\x41\x42", 1, 0, LX_OPT_CHARS), 1);
+  LXLocale* l = form.locale();
+  EXPECT_EQ(LXStrcoll(l, edge.text("ab\xA4"), 3, "ab", -1, 0), 0);
+  EXPECT_EQ(LXStrcoll(l, "ab\0c", -1, "ab", -7, 0), 0);
+  EXPECT_EQ(LXStrcoll(l, edge.text("\xA4\xA1\xA4\xA2\xA4\xA3-"), 3, "\xA4\xA1\xA4\xA2\xA4\xA3", 3, LX_OPT_CHARS), 0);
+  EXPECT_EQ(LXStrcoll(l, "\xA4\xA1\xA4\xA2", 2, "\xA4\xA1\xA4\xA2", 1, LX_OPT_CHARS), 1);
+  Collation mixed(Form::shifted, 930, "Plain");
+  EXPECT_EQ(LXStrcollEx(mixed.locale(), "\x44\x81\x0F\x62", 4, 1, "\x0F\x0E\x44\x81\x0F\x0E\x0F\x62", 8, 1, 0), 0);
+  EXPECT_EQ(LXStrcollEx(mixed.locale(), "\x0E\x44\x81\x44\x82", 2, 0, "\x0E\x44\x81\x44\x83", 1, 0, LX_OPT_CHARS), 1);
 }
 
-// On pages with larger tables all forms agree with UCS-2.
-TEST_F(Order, IsTheSameOnOtherPages) {
-  constexpr std::u16string_view kLetters = u"aABcefpQ-*mxyz0\u3041\u3042\u4E00";
-  std::mt19937 random(3);
+// ---- Keys ----
+
+const LXUChar* units_at(std::u16string_view text) { return reinterpret_cast<const LXUChar*>(text.data()); }
+
+TEST_F(Order, KeysFillBuffersOfEverySize) {
+  Collation form(Form::ucs2, 819, "Combining");
+  EdgeBuffer edge(1024);
+  for (std::u16string_view text :
+       std::initializer_list<std::u16string_view>{u"a", u"aaabBB", u"efefa", u"-+*", u"a-b*c-cbcc", u"xyzwx", u"mntd0m",
+                                                  u"Qpqaq", u"\u51FFz00", u"\u3041\u4E03\u50FF-"}) {
+    const std::string wanted = model_key(form.sort, text);
+    const auto n = static_cast<int32_t>(text.size()), length = static_cast<int32_t>(wanted.size());
+    size_t work = (8 * text.size() + 3 + 3) / 4 * 4 + 8 * text.size();
+    for (size_t size = 0; size <= work + 8; ++size) {
+      for (size_t behind = 0; behind < 4; ++behind) {
+        for (bool generate : {false, true}) {
+          char* key = edge.room(size + behind);
+          size_t gap = (4 - reinterpret_cast<uintptr_t>(key) % 4) % 4;
+          std::string expected(size + behind, '\x5A');
+          if (wanted.size() <= size) {
+            expected.replace(0, wanted.size(), wanted);
+            if (size >= gap + work) expected.replace(wanted.size(), size - wanted.size(), size - wanted.size(), '\0');
+          }
+          auto room = static_cast<int32_t>(size);
+          ASSERT_EQ(generate ? LXStrGenSortKey(form.locale(), key, room, units_at(text), n)
+                             : LXStrxfrmU(form.locale(), key, room, units_at(text), n, 0),
+                    length);
+          ASSERT_EQ(std::string_view(key, expected.size()), expected) << length << ' ' << size << ' ' << behind;
+        }
+      }
+    }
+    EXPECT_EQ(LXStrGenSortKey(form.locale(), nullptr, 0, units_at(text), n), length);
+  }
+}
+
+TEST_F(Order, KeysOfAnEmptyText) {
+  for (const char* sort : {"Plain", "BINARY"}) {
+    Collation form(Form::plain, 819, sort);
+    for (int32_t size = 0; size < 6; ++size) {
+      std::string key(6, '\x9');
+      EXPECT_EQ(LXStrxfrm(form.locale(), key.data(), size, "", 0, 0), size == 0 ? 0 : 3);
+      auto zeros = static_cast<size_t>(std::min(size, 3));
+      EXPECT_EQ(key, std::string(zeros, '\0') + std::string(6 - zeros, '\x9')) << size;
+      if (std::string_view(sort) == "BINARY") continue;
+      key.assign(6, '\x9');
+      EXPECT_EQ(LXStrGenSortKey(form.locale(), key.data(), size, nullptr, 0), 3);
+      EXPECT_EQ(key, size < 3 ? std::string(6, '\x9') : std::string(3, '\0') + std::string(3, '\x9')) << size;
+    }
+  }
+}
+
+// Positions and lengths beyond sixteen bits wrap round.
+TEST_F(Order, KeysOfLongTexts) {
+  Collation form(Form::ucs2, 819, "Plain");
+  std::u16string text(69999, u'a');
+  text += u'-';
+  std::string key(text.size() * 16 + 16, '\x5A');
+  int32_t length = LXStrGenSortKey(form.locale(), key.data(), static_cast<int32_t>(key.size()), units_at(text), 70000);
+  ASSERT_EQ(length, 2 * 69999 + 3 + 4);
+  EXPECT_EQ(key.substr(2 * 69999, 7), std::string("\0\0\0\x11\x70\0\x11", 7));
+}
+
+TEST_F(Order, KeysNeedGoodOptions) {
+  for (const Collation& form : own_forms("Plain")) {
+    const Units text = form.store(u"ab");
+    char key[64];
+    for (uint32_t options : {1u, 0x40u, 0x80000000u, LX_CMP_TRIM, LX_CMP_NOCASE | 2, LX_CMP_NOWIDTH | LX_CMP_TRIM}) {
+      EXPECT_EQ(form.transform(key, 64, text, 2, options), -1) << form.name << ' ' << options;
+      EXPECT_EQ(LXGetError(form.locale()), LX_E_ARGUMENT);
+    }
+    EXPECT_EQ(form.transform(key, 64, text, 2, LX_OPT_CHARS), 2 * 2 + 3) << form.name;
+    EXPECT_EQ(LXGetError(form.locale()), LX_OK);
+    EXPECT_EQ(form.transform(key, 64, text, -1, 0), 7) << "measured; the terminator is no part of the text";
+  }
+}
+
+// ---- Case, width and blanks ----
+
+TEST_F(Order, KeysAreThoseOfTheMappedText) {
   for (const char* sort : {"Plain", "Combining"}) {
-    TextForm ucs2(Kind::ucs2, "Single", sort);
-    for (const char* page : {"IBM930", "UTF8"}) {
-      TextForm bytes(Kind::shifted, page, sort);
-      TextForm wide(Kind::wide, page, sort);
-      auto convert = [&](const std::u16string& text, Stored& a, Stored& b) {
-        auto at = reinterpret_cast<const LXUChar*>(text.data());
-        auto length = static_cast<int32_t>(text.size());
-        char out[256];
-        LXWChar out_wide[64];
-        a.units = LXUnicodeToStringEx(bytes.locale(), out, 0, 256, at, length, 0);
-        b.units = LXUnicodeToStringW(wide.locale(), out_wide, 64, at, length, 0);
-        a.raw.assign(out, static_cast<size_t>(a.units));
-        b.raw.assign(reinterpret_cast<const char*>(out_wide), static_cast<size_t>(b.units) * sizeof(LXWChar));
-      };
-      for (int round = 0; round < 5000; ++round) {
-        std::u16string a(1 + random() % 8, u'a');
-        for (char16_t& letter : a) letter = kLetters[random() % kLetters.size()];
-        std::u16string b = a;
-        b[random() % b.size()] = kLetters[random() % kLetters.size()];
-        Stored bytes_a, bytes_b, wide_a, wide_b;
-        convert(a, bytes_a, wide_a);
-        convert(b, bytes_b, wide_b);
-        int32_t wanted = ucs2.compare(ucs2.store(a), ucs2.store(b));
-        ASSERT_EQ(bytes.compare(bytes_a, bytes_b), wanted) << bytes.name() << shown(a) << shown(b);
-        ASSERT_EQ(wide.compare(wide_a, wide_b), wanted) << wide.name() << shown(a) << shown(b);
-        ASSERT_EQ(bytes.key(bytes_a), model_key(ucs2.sort(), a)) << bytes.name() << shown(a);
-        ASSERT_EQ(wide.key(wide_b), model_key(ucs2.sort(), b)) << wide.name() << shown(b);
+    for (LanguageIndex language : {kEnglish, kGerman, kTurkish, kLithuanian}) {
+      std::vector<Collation> forms;
+      forms.reserve(5);
+      for (const auto& [kind, page] : {std::pair(Form::plain, 819),
+                                       {Form::plain, 57352},
+                                       {Form::shifted, 930},
+                                       {Form::wide, 954},
+                                       {Form::ucs2, 819}}) {
+        forms.emplace_back(kind, static_cast<uint16_t>(page), sort, language);
+      }
+      for (const Collation& form : forms) {
+        std::u16string letters;
+        for (char16_t c : std::u16string_view(u"aAisS\u00DF\u0307-c\uFF41\uFF21\u3000 \u3041")) {
+          if (form.form.kind == Form::ucs2 || form.form.page->has(c)) letters += c;
+        }
+        std::vector<std::pair<Units, std::string>> texts;
+        for (const std::u16string& text : all_texts(letters, 3)) {
+          const Units units = form.store(text);
+          if (text.empty()) continue;
+          const std::string upper = model_key(form.sort, form.mapped({Form::ucs2, nullptr}, text, LX_MAP_UPPER));
+          ASSERT_EQ(form.key(units), model_key(form.sort, text)) << form.name << hex_units(units);
+          ASSERT_EQ(form.key(units, LX_CMP_NOCASE), upper) << form.name << hex_units(units);
+          ASSERT_EQ(form.key(units, LX_CMP_NOWIDTH), model_key(form.sort, form.mapped(form.form, text, LX_MAP_F2H)))
+              << form.name << hex_units(units);
+          if (text.size() < 3 && text.find(u'-') == text.npos) texts.emplace_back(units, upper);
+        }
+        for (const auto& [a, key_a] : texts) {
+          for (const auto& [b, key_b] : texts) {
+            ASSERT_EQ(sign(form.compare(a, b, LX_CMP_NOCASE)), sign(key_a.compare(key_b)))
+                << form.name << hex_units(a) << hex_units(b);
+          }
+        }
+      }
+    }
+  }
+}
+
+// All characters may become two.
+TEST_F(Order, CaseMayDoubleATextOfAnyLength) {
+  for (Form::Kind kind : {Form::plain, Form::wide, Form::ucs2}) {
+    Collation form(kind, 819, "Plain", kGerman);
+    for (size_t length : {1u, 15u, 16u, 17u, 31u, 32u, 33u, 200u, 1000u}) {
+      Units sharp = form.store(std::u16string(length, u'\u00DF')), two = form.store(std::u16string(2 * length, u's'));
+      EXPECT_EQ(form.compare(sharp, two, LX_CMP_NOCASE), 0) << form.name << length;
+      EXPECT_EQ(form.key(sharp, LX_CMP_NOCASE), form.key(two, LX_CMP_NOCASE)) << form.name << length;
+    }
+  }
+}
+
+// Both texts are cut in one scratch buffer, the second to the length of the first.
+void cut_in_turn(const Collation& form, Units& a, Units& b) {
+  std::string scratch(std::max(a.size(), b.size()) + 1, '\0');
+  auto cut = [&](Units& text, size_t used) {
+    bytes_of_units(text).copy(scratch.data(), used);
+    scratch[text.size()] = '\0';
+    auto size = static_cast<int32_t>(text.size() + 1);
+    int32_t left = form.form.kind == Form::plain
+                       ? LXTruncateString(form.locale(), scratch.data(), size, 0x80800041)
+                       : LXTruncateStringEx(form.locale(), scratch.data(), 0, size, 0x80800041);
+    text = units_of(std::string_view(scratch).substr(0, static_cast<size_t>(left - 1)));
+  };
+  cut(a, a.size());
+  cut(b, std::min(a.size(), b.size()));
+}
+
+TEST_F(Order, TrailingBlanksAreCutInOneBuffer) {
+  for (const auto& [kind, page] : {std::pair(Form::plain, 819), {Form::plain, 954}, {Form::shifted, 930}}) {
+    Collation form(kind, static_cast<uint16_t>(page), "Plain");
+    const auto texts = all_texts(page != 819 ? u"ab \u3000" : u"ab A", 4);
+    for (const std::u16string& x : texts) {
+      for (const std::u16string& y : texts) {
+        const Units a = form.store(x), b = form.store(y);
+        Units cut_a = a, cut_b = b;
+        cut_in_turn(form, cut_a, cut_b);
+        ASSERT_EQ(form.compare(a, b, LX_COLL_TRIM), form.compare(cut_a, cut_b, 0))
+            << form.name << hex_units(a) << hex_units(b);
+        if (x.size() > 2 || y.size() > 2) continue;
+        ASSERT_EQ(sign(form.compare(a, b, LX_CMP_NOWIDTH)),
+                  sign(form.key(cut_a, LX_CMP_NOWIDTH).compare(form.key(cut_b, LX_CMP_NOWIDTH))))
+            << form.name << hex_units(a) << hex_units(b);
+      }
+    }
+  }
+}
+
+TEST_F(Order, TrailingBlanksOfEachForm) {
+  constexpr uint32_t kBoth = LX_CMP_NOWIDTH | LX_CMP_TRIM;
+  const struct {
+    Form::Kind kind;
+    uint16_t page;
+    std::u16string_view a, b;
+    uint32_t options;
+    int result;
+    uint32_t error = LX_OK;
+  } cases[] = {
+      {Form::plain, 819, u"ab", u"abc", LX_CMP_NOWIDTH, 0},
+      {Form::plain, 819, u"ab", u"aB  ", 1, -1},
+      {Form::plain, 819, u"ab  ", u"ab", LX_CMP_TRIM | 1, 0},
+      {Form::plain, 819, u"b", u"a", LX_CMP_TRIM, 0, LX_E_ARGUMENT},
+      {Form::plain, 819, u"b", u"a", LX_CMP_TRIM | LX_CMP_NOCASE, 0, LX_E_ARGUMENT},
+      {Form::plain, 819, u"b", u"a", 2, 0, LX_E_ARGUMENT},
+      {Form::shifted, 930, u"b", u"a", LX_CMP_TRIM, 0, LX_E_ARGUMENT},
+      {Form::wide, 930, u"ab  ", u"ab", LX_CMP_TRIM, 0},
+      {Form::wide, 954, u"ab\u3000", u"ab", LX_CMP_TRIM, 1},
+      {Form::wide, 954, u"ab \u3000 ", u"ab", kBoth, 0},
+      {Form::wide, 954, u"ab ", u"AB", LX_CMP_TRIM | LX_CMP_NOCASE, 0},
+      {Form::wide, 954, u"b", u"a", 1, 0, LX_E_ARGUMENT},
+      {Form::ucs2, 954, u"ab\u3000", u"ab", LX_CMP_TRIM, 1},
+      {Form::ucs2, 954, u"ab\u3000 ", u"ab", kBoth, 0},
+      {Form::ucs2, 954, u"b", u"a", 0x80000000, 0, LX_E_ARGUMENT},
+  };
+  for (const auto& one : cases) {
+    Collation form(one.kind, one.page, "Plain");
+    Units a = form.store(one.a), b = form.store(one.b);
+    EXPECT_EQ(sign(form.compare(a, b, one.options)), one.result) << form.name << hex_units(a) << hex_units(b);
+    EXPECT_EQ(LXGetError(form.locale()), one.error) << form.name << hex_units(a) << hex_units(b);
+  }
+}
+
+// ---- Without a sort object ----
+
+TEST_F(Order, OfABinaryLocaleIsThatOfTheOtherComparison) {
+  const std::u16string_view texts[] = {u"", u"a", u"A", u"ab", u"aB ", u"ab  ", u"a\uFF21", u"a\uFF41", u"\uFF21"};
+  const Units options = {0,
+                         1,
+                         2,
+                         0x40,
+                         LX_CMP_NOCASE,
+                         LX_CMP_NOWIDTH,
+                         LX_CMP_TRIM,
+                         LX_CMP_TRIM | LX_CMP_NOCASE,
+                         LX_CMP_TRIM | LX_CMP_NOWIDTH};
+  EdgeBuffer edge_a(64), edge_b(64);
+  for (uint16_t page : {uint16_t{954}, uint16_t{930}}) {
+    for (Form::Kind kind : {Form::plain, Form::shifted, Form::wide, Form::ucs2}) {
+      Collation form(kind, page, "BINARY", kGerman);
+      for (std::u16string_view x : texts) {
+        for (std::u16string_view y : texts) {
+          for (uint32_t given : options) {
+            uint32_t option = given;
+            if (form.form.follows_shifts()) {
+              option &= (given & LX_CMP_NOWIDTH) > LX_CMP_NOCASE ? 0x80200041 : 0x80200040;
+            }
+            if (kind == Form::wide) option &= 0x80200040;
+            const Units a = form.store(x), b = form.store(y);
+            int32_t wanted = with_calls(form.form, [&](auto calls) {
+              using U = typename decltype(calls)::Unit;
+              return calls(kStrcmp, form.locale(), place<U>(edge_a, a, 0), State{0}, static_cast<int32_t>(a.size()),
+                           place<U>(edge_b, b, 0), State{0}, static_cast<int32_t>(b.size()), option);
+            });
+            uint32_t error = LXGetError(form.locale());
+            ASSERT_EQ(form.compare(a, b, given), wanted) << form.name << hex_units(a) << hex_units(b) << given;
+            ASSERT_EQ(LXGetError(form.locale()), error) << form.name << given;
+          }
+        }
+      }
+    }
+  }
+  Collation form(Form::plain, 954, "BINARY");
+  EXPECT_EQ(LXStrcoll(form.locale(), "a\xA4", -1, "a", -1, 0), LXStrcmp(form.locale(), "a\xA4", -1, "a", -1, 0));
+  const Units text = form.store(u"aB\uFF21");
+  EXPECT_EQ(form.key(text), bytes_of_units(text));
+  EXPECT_EQ(form.key(form.store(u"aB\uFF41"), LX_CMP_NOCASE), "AB\xA3\xC1");
+  EXPECT_EQ(form.key(text, LX_CMP_NOWIDTH), "aBA");
+  char key[5] = {};
+  EXPECT_EQ(form.transform(key, 3, text, 4, 0), 4);
+  EXPECT_EQ(form.transform(key, 3, text, 4, LX_CMP_NOCASE), 4);
+  EXPECT_EQ(std::string_view(key, 5), std::string_view("AB\0\0\0", 5)) << "as many as fit";
+  EXPECT_EQ(form.transform(key, 5, text, 4, 1), -1);
+  EXPECT_EQ(LXGetError(form.locale()), LX_E_ARGUMENT);
+  EXPECT_EQ(LXStrGenSortKey(form.locale(), key, 5, nullptr, 0), -1);
+}
+
+TEST_F(Order, NeedsALocale) {
+  ASSERT_EQ(lxglocale, nullptr);
+  char key[8];
+  EXPECT_EQ(LXStrcoll(nullptr, "b", 1, "a", 1, 0), 0);
+  EXPECT_EQ(LXStrxfrm(nullptr, key, 8, "a", 1, 0), -1);
+  ASSERT_EQ(LXSetLocale("English_UnitedStates.Latin1@Plain", 0), LX_OK);
+  EXPECT_EQ(LXStrcoll(nullptr, "b", 1, "a", 1, 0), 2);
+  EXPECT_EQ(LXStrxfrm(nullptr, key, 8, "a", 1, 0), 5);
+}
+
+// ---- Texts in texts ----
+
+TEST_F(Order, OfTextsInTexts) {
+  const struct {
+    uint16_t page;
+    std::string_view text, wanted;
+    uint32_t options;
+    int found;  // -1: not
+  } cases[] = {
+      {954, "xxAbC", "aBc", LX_CMP_NOCASE, 2},
+      {954, "xxAbC", "aBc", 0, -1},
+      {954, "aZ", "a0", LX_CMP_NOCASE, 0},   // both weigh nothing
+      {819, "aZ", "a0", LX_CMP_NOCASE, -1},  // but are not the same bytes
+      {954, "ab", "abc", LX_CMP_NOCASE, -1},
+      {954, "b\xA3\xC1", "A", LX_CMP_NOWIDTH, 1},
+      {954, "bA", "\xA3\xC1", LX_CMP_NOWIDTH, -1},  // trimming cuts what is sought to one byte
+      {954, "b\xA3\xE1", "\xA3\xC1", LX_CMP_NOCASE, 1},
+      {954, "A\xA4", "A", LX_CMP_NOCASE, 0},
+      {954, "xA", "", LX_CMP_NOCASE, 0},
+      {819, "xA", "a", LX_CMP_NOWIDTH, -1},
+  };
+  for (const auto& one : cases) {
+    for (const char* sort : {"Plain", "Combining"}) {
+      Collation form(Form::plain, one.page, sort);
+      Guarded text(one.text), wanted(one.wanted);
+      const char* at = LXStrstr(form.locale(), text.data(), static_cast<int32_t>(one.text.size()), wanted.data(),
+                                static_cast<int32_t>(one.wanted.size()), one.options);
+      EXPECT_EQ(at != nullptr ? at - text.data() : -1, one.found) << one.page << ' ' << one.text << ' ' << one.wanted;
+      EXPECT_EQ(LXGetError(form.locale()), LX_OK);
+    }
+  }
+  Collation form(Form::ucs2, 819, "Combining");
+  const LXUChar text[] = {'x', 'a', 'Z'}, wanted[] = {'A', '0'};
+  EXPECT_EQ(LXStrstrU(form.locale(), text, 3, wanted, 2, LX_CMP_NOCASE), text + 1);
+}
+
+// ---- The sort objects that come with the library ----
+
+TEST(ShippedOrder, OfWords) {
+  const std::pair<const char*, std::vector<std::string>> cases[] = {
+      // in order
+      {"Default", {"", "1", "2", "a", "A", "ab", "B", "cote", "coté", "côte", "côté", "z", "α", "β", "я"}},
+      {"Default", {"resume", "Resume", "résumé", "resumes"}},
+      {"Default", {"Strasse", "Straße", "Strassen"}},
+      {"Default", {"coop", "co-op", "Coop"}},
+      {"Default", {"co-op", "coops"}},
+      {"Spanish", {"nube", "nzz", "ñandú", "Ñandú", "obra"}},
+      {"Swedish", {"zebra", "ål", "ärlig", "öl"}},
+      {"Finnish", {"zebra", "ål", "ärlig", "öl"}},
+      {"CanadianFrench", {"cote", "côte", "coté", "côté"}},
+      {"Czech", {"cukr", "čaj", "dům", "hora", "hz", "chata", "ikona"}},
+      {"Hungarian", {"cukor", "cz", "csak", "dal"}},
+  };
+  Session session;
+  for (const auto& [sort, words] : cases) {
+    Locale locale(LXGetLocale((std::string("English_UnitedStates.UTF-8@") + sort).c_str(), 0, nullptr));
+    ASSERT_NE(locale, nullptr) << sort;
+    auto keys = [&](const std::string& word) {
+      std::string room(400, '\0');
+      auto length = static_cast<size_t>(LXStrxfrm(locale.get(), room.data(), 400, word.c_str(), -1, 0));
+      return room.substr(0, length);
+    };
+    for (size_t i = 0; i < words.size(); ++i) {
+      for (size_t j = 0; j < words.size(); ++j) {
+        const int wanted = (i > j) - (i < j);
+        const std::string &a = words[i], &b = words[j];
+        EXPECT_EQ(sign(LXStrcoll(locale.get(), a.c_str(), -1, b.c_str(), -1, 0)), wanted) << sort << a << ' ' << b;
+        EXPECT_EQ(sign(keys(a).compare(keys(b))), wanted) << sort << ": keys of " << a << ' ' << b;
       }
     }
   }

@@ -5,7 +5,7 @@
 
 #include <thread>
 
-#include "support/session.hpp"
+#include "nls1/names.hpp"
 #include "support/trace_capture.hpp"
 
 namespace lx::test {
@@ -13,23 +13,10 @@ namespace {
 
 constexpr uint32_t kThread = NLS1_THREAD, kProcess = NLS1_PROCESS;
 
-std::string full_name(LXLocale* locale) {
-  char name[136];
-  return locale != nullptr && LXLocaleGetLocaleString(locale, name) > 0 ? name : "-";
-}
-
 std::string thread_name() { return full_name(NLS1_PrivateFunction_GetThreadLocale()); }
 
-// The name that a locale of that name has: what it leaves out comes from the language's defaults.
-std::string complete(const char* name) { return full_name(Locale(LXGetLocale(name, 0, nullptr)).get()); }
-
-int32_t both(uint32_t language, uint32_t territory) { return static_cast<int32_t>(territory << 16 | language); }
-
-// The process's and the thread's locale as the program began.
-class Locales : public testing::Test {
+class Locales : public FrenchProcess {
  protected:
-  void SetUp() override { ASSERT_EQ(NLS1_SetLocale(both(3, 250), 819, kThread | kProcess), LX_OK); }
-  void TearDown() override { SetUp(); }
   const std::string kBefore = complete("French_France.Latin1");
 };
 

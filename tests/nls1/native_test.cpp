@@ -5,34 +5,22 @@
 
 #include <clocale>
 
-#include "support/session.hpp"
+#include "nls1/names.hpp"
 #include "support/system_locales.hpp"
 #include "support/trace_capture.hpp"
 
 namespace lx::test {
 namespace {
 
-constexpr int32_t kJapanese = 392 << 16 | 11, kEnglish = 840 << 16 | 1;
-
-std::string full_name(LXLocale* locale) {
-  char name[136];
-  return locale != nullptr && LXLocaleGetLocaleString(locale, name) > 0 ? name : "-";
-}
-
-// Puts the locales of the process, of the thread and of the system back.
-class Native : public testing::Test {
+class Native : public FrenchProcess {
  protected:
-  void SetUp() override {
-    ASSERT_EQ(NLS1_SetLocale(250 << 16 | 3, 819, NLS1_THREAD | NLS1_PROCESS), LX_OK);
-    system_ = std::setlocale(LC_ALL, nullptr);
-  }
   void TearDown() override {
     std::setlocale(LC_ALL, system_.c_str());
-    SetUp();
+    FrenchProcess::TearDown();
   }
   static std::string system(int category) { return std::setlocale(category, nullptr); }
 
-  std::string system_;
+  const std::string system_ = std::setlocale(LC_ALL, nullptr);
 };
 
 TEST_F(Native, ConvertsNames) {
@@ -57,7 +45,7 @@ TEST_F(Native, MakesTheProcessLocale) {
   EXPECT_EQ(NLS1_SetLocaleFromNative("C", 8), LX_OK) << "options that no step knows are left out";
   EXPECT_EQ(full_name(lxglocale), "English_UnitedStates.US-ASCII@Binary");
   EXPECT_EQ(NLS1_SetLocaleFromNative("xx", LX_GET_SUBSTITUTE), LX_OK);
-  EXPECT_EQ(full_name(lxglocale), full_name(Locale(LXGetLocale("English", 0, nullptr)).get()));
+  EXPECT_EQ(full_name(lxglocale), complete("English"));
   EXPECT_EQ(NLS1_SetLocaleFromNative("ja", LX_GET_USER), LX_OK);
   EXPECT_EQ(full_name(lxglocale), "French_France.Latin1@Binary") << "the user's instead of the name";
 }
@@ -83,13 +71,13 @@ TEST_F(Native, SwitchesTheSystem) {
   EXPECT_EQ(NLS1_SetNativeFromLocale(japanese.get(), LC_NUMERIC, 0), LX_OK);
   EXPECT_EQ(system(LC_NUMERIC), "ja");
   EXPECT_EQ(system(LC_CTYPE), "C") << "only the category that was asked for";
-  EXPECT_EQ(NLS1_SetNativeLocale(kEnglish, 367, LC_NUMERIC, LX_GET_SUBSTITUTE), LX_OK);
+  EXPECT_EQ(NLS1_SetNativeLocale(both(1, 840), 367, LC_NUMERIC, LX_GET_SUBSTITUTE), LX_OK);
   EXPECT_EQ(system(LC_NUMERIC), "C");
   ASSERT_EQ(NLS1_SetLocaleFromNative("ja", 0), LX_OK);
   EXPECT_EQ(NLS1_SetNativeFromLocale(nullptr, LC_TIME, 0), LX_OK) << "null is the locale of the process";
   EXPECT_EQ(system(LC_TIME), "ja");
-  if (full_name(Locale(NLS1_GetLocale(kJapanese, 954, 0, nullptr)).get()) == "Japanese_Japan.JapanEUC@Binary") {
-    EXPECT_EQ(NLS1_SetNativeLocale(kJapanese, 954, LC_CTYPE, 0), LX_OK);
+  if (full_name(Locale(NLS1_GetLocale(both(11, 392), 954, 0, nullptr)).get()) == "Japanese_Japan.JapanEUC@Binary") {
+    EXPECT_EQ(NLS1_SetNativeLocale(both(11, 392), 954, LC_CTYPE, 0), LX_OK);
     EXPECT_EQ(system(LC_CTYPE), "ja");
   }
 }

@@ -15,19 +15,6 @@ namespace {
 
 constexpr unsigned kThreads = 16;
 
-template <class Body>
-void in_threads(Body body) {
-  std::barrier start(kThreads);
-  std::vector<std::thread> threads;
-  for (unsigned number = 0; number < kThreads; ++number) {
-    threads.emplace_back([&, number] {
-      start.arrive_and_wait();
-      body(number);
-    });
-  }
-  for (std::thread& thread : threads) thread.join();
-}
-
 struct Field {
   uint16_t to, from;
   std::string_view in, out;
@@ -73,12 +60,18 @@ TEST(Nls1Threads, FirstUseAndAllThatFollows) {
   setenv("NLS1_LOCALEDIR", LEXARO_DATA, 1);
   setenv("LX_LANG", "French_France.Latin1@BINARY", 1);
   EXPECT_EQ(qlginflg, 0);
-  in_threads([](unsigned number) {
-    for (int round = 0; round < 40; ++round) {
-      if ((number + static_cast<unsigned>(round)) % 2 == 0) expect_own_locale(number, round);
-      for (size_t i = 0; i < std::size(kFields); ++i) expect_translated(kFields[(i + number) % std::size(kFields)]);
-    }
-  });
+  std::barrier start(kThreads);
+  std::vector<std::thread> threads;
+  for (unsigned number = 0; number < kThreads; ++number) {
+    threads.emplace_back([&start, number] {
+      start.arrive_and_wait();
+      for (int round = 0; round < 40; ++round) {
+        if ((number + static_cast<unsigned>(round)) % 2 == 0) expect_own_locale(number, round);
+        for (size_t i = 0; i < std::size(kFields); ++i) expect_translated(kFields[(i + number) % std::size(kFields)]);
+      }
+    });
+  }
+  for (std::thread& thread : threads) thread.join();
   EXPECT_EQ(qlginflg, 1);
   EXPECT_EQ(LXGetLocaleNumInfo(lxglocale, 1, 0), 3) << "the locale of the process is as it was";
   TermThread(HSV1_ResolveThread(&qlgnlthr_HSV1__T, "test"));

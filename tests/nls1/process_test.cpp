@@ -12,7 +12,6 @@
 #include <functional>
 #include <thread>
 #include <utility>
-#include <vector>
 
 #include "support/counting_allocator.hpp"
 #include "support/object_builder.hpp"
@@ -56,64 +55,57 @@ uint32_t process_result() { return *static_cast<uint32_t*>(HSV1_ResolveProcess(&
 void end_thread_block() { TermThread(HSV1_ResolveThread(&qlgnlthr_HSV1__T, "test")); }
 void end_process_block() { TermProcess(HSV1_ResolveProcess(&qlgnlprc_HSV1__P, "test")); }
 
-// Every function, and what it answers as long as the library is not initialised.
-struct Function {
-  const char* name;
-  std::function<bool()> refuses;
-};
+// Every function; true when it answers as long as the library is not initialised.
+using Refusal = bool (*)();
 
-const std::vector<Function>& functions() {
-  static char buffer[32] = "kept";
-  static uint32_t rc;
-  auto null_with_rc_1 = [](LXLocale* locale) {
-    LXReleaseLocale(locale, 0);
-    return locale == nullptr && std::exchange(rc, 99) == 1;
-  };
-  auto zero_with_rc_11 = [](uint32_t id) { return id == 0 && std::exchange(rc, 99) == LX_E_MANAGER; };
-  auto kept = [](uint32_t status) { return status == LX_E_MANAGER && std::string_view(buffer) == "kept"; };
-  auto translate = [] {
-    int32_t consumed = 99;
-    uint32_t error = 99;
-    const int32_t count = NLS1_TranslateString(367, buffer, sizeof buffer, 37, "\xC1", 1, &consumed, 0, &error);
-    return count == -1 && consumed == 0 && error == LX_E_MANAGER && std::string_view(buffer) == "kept";
-  };
-  static const std::vector<Function> all = {
-      {"GetLocale", [=] { return null_with_rc_1(NLS1_GetLocale(1, 0, 0, &rc)); }},
-      {"SetLocale", [] { return NLS1_SetLocale(1, 0, 0) == LX_E_MANAGER; }},
-      {"SetLocale of the thread", [] { return NLS1_SetLocale(1, 0, NLS1_THREAD) == LX_E_MANAGER; }},
-      {"GetLocaleNumInfo", [] { return NLS1_GetLocaleNumInfo(nullptr, 1, 0) == -1; }},
-      {"SetLocaleNumInfo", [] { return NLS1_SetLocaleNumInfo(nullptr, 1, 1) == 0; }},
-      {"GetLocaleTextInfo", [=] { return NLS1_GetLocaleTextInfo(nullptr, 2, buffer, 32, 0, 0) == -1; }},
-      {"SetLocaleTextInfo", [] { return NLS1_SetLocaleTextInfo(nullptr, 64, "$", 1, 37, 0) == 0; }},
-      {"SetLocaleFromNative", [] { return NLS1_SetLocaleFromNative("C", 0) == LX_E_MANAGER; }},
-      {"SetNativeLocale", [] { return NLS1_SetNativeLocale(1, 0, LC_TIME, 0) == LX_E_MANAGER; }},
-      {"SetNativeFromLocale", [] { return NLS1_SetNativeFromLocale(nullptr, LC_TIME, 0) == LX_E_MANAGER; }},
-      {"ConvertNativeLocale", [=] { return null_with_rc_1(NLS1_ConvertNativeLocale("C", 0, &rc)); }},
-      {"GetCodepageId", [=] { return zero_with_rc_11(NLS1_GetCodepageId("IBM037", &rc)); }},
-      {"GetLanguageId", [=] { return zero_with_rc_11(NLS1_GetLanguageId("English", &rc)); }},
-      {"GetTerritoryId", [=] { return zero_with_rc_11(NLS1_GetTerritoryId("Germany", &rc)); }},
-      {"GetSortId", [=] { return zero_with_rc_11(NLS1_GetSortId("BINARY", &rc)); }},
-      {"GetObjectName", [=] { return kept(NLS1_GetObjectName(1, buffer, 32, LX_LANGUAGE)); }},
-      {"GetLanguageName", [=] { return kept(NLS1_GetLanguageName(1, buffer, 32)); }},
-      {"GetTerritoryName", [=] { return kept(NLS1_GetTerritoryName(276, buffer, 32)); }},
-      {"GetCodepageName", [=] { return kept(NLS1_GetCodepageName(37, buffer, 32)); }},
-      {"GetSortName", [=] { return kept(NLS1_GetSortName(0, buffer, 32)); }},
-      {"TranslateString", translate},
-  };
-  return all;
+char g_buffer[32] = "kept";
+uint32_t g_rc = 99;
+
+bool null_with_rc_1(LXLocale* locale) {
+  LXReleaseLocale(locale, 0);
+  return locale == nullptr && std::exchange(g_rc, 99) == 1;
 }
+bool zero_with_rc_11(uint32_t id) { return id == 0 && std::exchange(g_rc, 99) == LX_E_MANAGER; }
+bool kept(uint32_t status) { return status == LX_E_MANAGER && std::string_view(g_buffer) == "kept"; }
+
+const Refusal kFunctions[] = {[] { return null_with_rc_1(NLS1_GetLocale(1, 0, 0, &g_rc)); },
+                              [] { return NLS1_SetLocale(1, 0, 0) == LX_E_MANAGER; },
+                              [] { return NLS1_SetLocale(1, 0, NLS1_THREAD) == LX_E_MANAGER; },
+                              [] { return NLS1_GetLocaleNumInfo(nullptr, 1, 0) == -1; },
+                              [] { return NLS1_SetLocaleNumInfo(nullptr, 1, 1) == 0; },
+                              [] { return NLS1_GetLocaleTextInfo(nullptr, 2, g_buffer, 32, 0, 0) == -1; },
+                              [] { return NLS1_SetLocaleTextInfo(nullptr, 64, "$", 1, 37, 0) == 0; },
+                              [] { return NLS1_SetLocaleFromNative("C", 0) == LX_E_MANAGER; },
+                              [] { return NLS1_SetNativeLocale(1, 0, LC_TIME, 0) == LX_E_MANAGER; },
+                              [] { return NLS1_SetNativeFromLocale(nullptr, LC_TIME, 0) == LX_E_MANAGER; },
+                              [] { return null_with_rc_1(NLS1_ConvertNativeLocale("C", 0, &g_rc)); },
+                              [] { return zero_with_rc_11(NLS1_GetCodepageId("IBM037", &g_rc)); },
+                              [] { return zero_with_rc_11(NLS1_GetLanguageId("English", &g_rc)); },
+                              [] { return zero_with_rc_11(NLS1_GetTerritoryId("Germany", &g_rc)); },
+                              [] { return zero_with_rc_11(NLS1_GetSortId("BINARY", &g_rc)); },
+                              [] { return kept(NLS1_GetObjectName(1, g_buffer, 32, LX_LANGUAGE)); },
+                              [] { return kept(NLS1_GetLanguageName(1, g_buffer, 32)); },
+                              [] { return kept(NLS1_GetTerritoryName(276, g_buffer, 32)); },
+                              [] { return kept(NLS1_GetCodepageName(37, g_buffer, 32)); },
+                              [] { return kept(NLS1_GetSortName(0, g_buffer, 32)); },
+                              [] {
+                                int32_t consumed = 99;
+                                const int32_t count =
+                                    NLS1_TranslateString(367, g_buffer, 32, 37, "\xC1", 1, &consumed, 0, &g_rc);
+                                return count == -1 && consumed == 0 && kept(std::exchange(g_rc, 99));
+                              }};
 
 void expect_all_refuse() {
-  for (const Function& function : functions()) EXPECT_TRUE(function.refuses()) << function.name;
+  for (size_t i = 0; i < std::size(kFunctions); ++i) EXPECT_TRUE(kFunctions[i]()) << i;
   EXPECT_EQ(NLS1_PrivateFunction_GetProcessLocale(), 0u);
 }
 
 TEST(Process, EveryFunctionInitialisesTheLibrary) {
-  for (const Function& function : functions()) {
-    in_child([&] {
+  for (size_t i = 0; i < std::size(kFunctions); ++i) {
+    in_child([=] {
       EXPECT_EQ(qlginflg, 0);
-      EXPECT_FALSE(function.refuses()) << function.name;
-      EXPECT_EQ(qlginflg, 1) << function.name;
+      EXPECT_FALSE(kFunctions[i]()) << i;
+      EXPECT_EQ(qlginflg, 1) << i;
       EXPECT_EQ(process_result(), LX_OK);
       EXPECT_EQ(g_locks_made, 1);
       end_process_block();
@@ -273,35 +265,25 @@ TEST(Process, EveryAllocationMayFail) {
   }
 }
 
-TEST(Process, WithoutMemoryForItsLocale) {
-  in_child([] {
-    CountingAllocator allocator;
-    ASSERT_EQ(allocator.init(LEXARO_DATA), LX_OK);
-    allocator.arm(0, true);
-    TraceCapture trace;
-    EXPECT_EQ(NLS1_PrivateFunction_GetThreadLocale(), nullptr);
-    EXPECT_EQ(qlginflg, 1);
-    EXPECT_EQ(process_result(), LX_E_MEMORY);
-    EXPECT_TRUE(trace.has("Unable to set global locale, rc = 20")) << trace.all();
-    end_process_block();
-    EXPECT_EQ(LXTerm(), LX_OK);
-    EXPECT_EQ(allocator.live, 0);
-  });
-}
-
-TEST(Process, ThreadsWithoutMemoryForTheirLocale) {
-  in_child([] {
-    CountingAllocator allocator;
-    ASSERT_EQ(allocator.init(LEXARO_DATA), LX_OK);
-    ASSERT_EQ(NLS1_PrivateFunction_GetProcessLocale(), 0u);
-    allocator.arm(0, true);
-    TraceCapture trace;
-    EXPECT_EQ(NLS1_PrivateFunction_GetThreadLocale(), nullptr);
-    EXPECT_TRUE(trace.has("Unable to set thread locale, rc = 20")) << trace.all();
-    allocator.disarm();
-    end_process_block();
-    EXPECT_EQ(LXTerm(), LX_OK);
-  });
+TEST(Process, WithoutMemoryForLocales) {
+  for (bool of_thread : {false, true}) {
+    in_child([=] {
+      CountingAllocator allocator;
+      ASSERT_EQ(allocator.init(LEXARO_DATA), LX_OK);
+      ASSERT_TRUE(!of_thread || NLS1_PrivateFunction_GetProcessLocale() == 0u);
+      allocator.arm(0, true);
+      TraceCapture trace;
+      EXPECT_EQ(NLS1_PrivateFunction_GetThreadLocale(), nullptr);
+      EXPECT_EQ(qlginflg, 1);
+      EXPECT_EQ(process_result(), of_thread ? LX_OK : LX_E_MEMORY);
+      EXPECT_TRUE(trace.has(std::string("Unable to set ") + (of_thread ? "thread" : "global") + " locale, rc = 20"))
+          << trace.all();
+      allocator.disarm();
+      end_process_block();
+      EXPECT_EQ(LXTerm(), LX_OK);
+      EXPECT_EQ(allocator.live, 0);
+    });
+  }
 }
 
 TEST(Process, ThreadsTakeTheirLocalesWithThem) {

@@ -1,19 +1,19 @@
 // SPDX-License-Identifier: Apache-2.0
-// Translation of a field done slowly, one character after the other. It works on the readable sources of the code pages
-// and shares no code with the library.
+// Translation of a field done slowly, one character after the other.
 #pragma once
 
 #include <lexaro/nls1.h>
 
-#include <string>
-
-#include "support/page_source.hpp"
+#include "support/text_model.hpp"
 
 namespace lx::test {
 
+// Of the page; UCS-2 for 1200.
+Form form_of(uint16_t page);
+
 struct FieldCall {
-  const PageSource* to;  // null: UCS-2
-  const PageSource* from;
+  Form to;
+  Form from;
   std::string text;  // the whole input, bytes as they stand in memory
   bool measured;     // by its terminator, which is not part of the text
   size_t size;       // of the output: bytes, or characters
@@ -33,16 +33,10 @@ struct FieldResult {
 
 FieldResult translate_model(const FieldCall& call);
 
-// The whole characters of the text, and where the last one ends.
-struct Counted {
-  int32_t characters;
-  size_t bytes;
-};
-Counted count_characters(const PageSource* page, const std::string& text);
-
-const PageSource* page_of(uint16_t id);  // null: UCS-2
-// Text of the page, or UCS-2; mixed pages have their shift bytes.
-std::string spelled(const PageSource* page, std::u16string_view text);
-std::string ucs2_bytes(std::u16string_view text);
+// The elements of a text in memory; half a unit at the end is left out.
+Units units_in(const Form& form, std::string_view bytes);
+inline std::string spelled_bytes(uint16_t page, std::u16string_view text) {
+  return raw(form_of(page), spelled(form_of(page), text));
+}
 
 }  // namespace lx::test

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
-// Linked into a test, this lets LEXARO_TEST_VECTORS choose the way that runs of characters take: 0 plain loops, 1 blocks
-// of 32 bytes, 2 lookups in tables. What the processor lacks is never taken.
+// Linked into a test, this lets LEXARO_TEST_VECTORS choose the way that runs of characters take: 0 plain loops, 1
+// blocks of 32 bytes, 2 lookups in tables. What the processor lacks is never taken.
 #include <cstdlib>
 
 #include "codepage/text/byte_runs.hpp"

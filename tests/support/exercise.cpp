@@ -20,33 +20,26 @@ struct Room {
 };
 
 // Every byte, lead bytes at the end, runs of double bytes between shift bytes, and the characters of the built pages.
-const std::string& sample_bytes() {
-  static const std::string sample = [] {
-    std::string text = "Plain text, long enough for a word or two of the fast paths: 0123456789.";
-    text += "\x81\x40\x81\x41\x8E\xA0\xA0\x8F\xA1\xA1\xA7z\x81";
-    text += std::string("\x0E\x41\x40\x42\x41\x0F ab\x0E\x0E\x41\x40\x0F\x0F\x0E\x41", 18);
-    text += "\xE3\x81\x82\xC3\xA9\xF0\x9F\x98\x80";
-    for (int byte = 0; byte < 256; ++byte) text += {static_cast<char>(byte), 'a'};
-    for (int byte = 255; byte >= 0x80; --byte) text += {static_cast<char>(byte), '\x7F'};
-    text += "\x8F\xA1\xA1";
-    return text;
-  }();
-  return sample;
+std::string sample_bytes() {
+  std::string text = "Plain text, long enough for a word or two of the fast paths: 0123456789.";
+  text += "\x81\x40\x81\x41\x8E\xA0\xA0\x8F\xA1\xA1\xA7z\x81";
+  text += std::string("\x0E\x41\x40\x42\x41\x0F ab\x0E\x0E\x41\x40\x0F\x0F\x0E\x41", 18);
+  text += "\xE3\x81\x82\xC3\xA9\xF0\x9F\x98\x80";
+  for (int byte = 0; byte < 256; ++byte) text += {static_cast<char>(byte), 'a'};
+  for (int byte = 255; byte >= 0x80; --byte) text += {static_cast<char>(byte), '\x7F'};
+  return text + "\x8F\xA1\xA1";
 }
 
-const std::vector<LXUChar>& sample_units() {
-  static const std::vector<LXUChar> sample = [] {
-    std::vector<LXUChar> units;
-    for (unsigned unit = 0; unit < 0x180; ++unit) units.push_back(static_cast<LXUChar>(unit));
-    for (unsigned first : {0x3040u, 0x3100u, 0x4E00u, 0x5000u, 0xD800u, 0xFFF8u}) {
-      for (unsigned i = 0; i < 8; ++i) {
-        units.push_back(static_cast<LXUChar>(first + i));
-        if (i % 3 == 0) units.push_back('x');
-      }
+std::vector<LXUChar> sample_units() {
+  std::vector<LXUChar> units;
+  for (unsigned unit = 0; unit < 0x180; ++unit) units.push_back(static_cast<LXUChar>(unit));
+  for (unsigned first : {0x3040u, 0x3100u, 0x4E00u, 0x5000u, 0xD800u, 0xFFF8u}) {
+    for (unsigned i = 0; i < 8; ++i) {
+      units.push_back(static_cast<LXUChar>(first + i));
+      if (i % 3 == 0) units.push_back('x');
     }
-    return units;
-  }();
-  return sample;
+  }
+  return units;
 }
 
 // `source` and `converted` have room for the longest character.
@@ -84,14 +77,14 @@ const char* use_unit(const LXObjEntry* page, LXUChar unit, Room<char>& out) {
 bool within(int32_t result, int32_t room) { return result >= 0 && result <= room; }
 
 const char* use_strings(LXLocale* locale) {
-  const std::string& text = sample_bytes();
+  static const std::string text = sample_bytes();
   auto length = static_cast<int32_t>(text.size());
   for (uint32_t state : {0u, 1u}) {
     for (int32_t room : {1, 7, 1500}) {
       Room<LXUChar> units(static_cast<size_t>(room));
       Room<LXWChar> wide(static_cast<size_t>(room));
       Room<char> bytes(static_cast<size_t>(room));
-      const auto& given = sample_units();
+      static const auto given = sample_units();
       auto count = static_cast<int32_t>(given.size());
       int32_t results[] = {
           LXStringToUnicode(locale, units.data(), room, text.data(), length, 0),
@@ -172,7 +165,7 @@ const char* exercise_page(const LXObjEntry* page) {
 
 const char* exercise_conversions(LXLocale* locale, LXLocale* other) {
   if (const char* wrong = use_strings(locale)) return wrong;
-  const std::string& text = sample_bytes();
+  static const std::string text = sample_bytes();
   auto length = static_cast<int32_t>(text.size());
   for (auto [target, source] : {std::pair(other, locale), {locale, other}}) {
     for (int32_t room : {1, 100, 3000}) {

@@ -11,15 +11,6 @@ namespace {
 
 constexpr size_t kRoom = 4096;
 
-template <class Unit>
-Unit* as(void* text) {
-  return static_cast<Unit*>(text);
-}
-template <class Unit>
-const Unit* as(const void* text) {
-  return static_cast<const Unit*>(text);
-}
-
 bool is_name(uint32_t item) { return item == 2 || item == 6 || item == 10 || (item >= 12 && item <= 15); }
 
 std::u16string ascii(std::string_view text) { return std::u16string(text.begin(), text.end()); }
@@ -61,45 +52,22 @@ std::string delivery_difference(LXLocale* locale, uint32_t item, const TextForm&
 
 // ---- Forms of text --------------------------------------------------------------------------------------------------
 
-int32_t TextForm::get(LXLocale* locale, uint32_t item, void* buffer, int32_t size, uint32_t options) const {
-  if (kind == Form::wide) return LXGetLocaleTextInfoW(locale, item, as<LXWChar>(buffer), size, options);
-  if (kind == Form::ucs2) return LXGetLocaleTextInfoU(locale, item, as<LXUChar>(buffer), size, options);
-  if (kind == Form::plain) return LXGetLocaleTextInfo(locale, item, as<char>(buffer), size, options);
-  return LXGetLocaleTextInfoEx(locale, item, as<char>(buffer), size, record, options);
+int32_t TextForm::get(LXLocale* l, uint32_t item, void* buffer, int32_t size, uint32_t options) const {
+  if (kind == Form::wide) return LXGetLocaleTextInfoW(l, item, static_cast<LXWChar*>(buffer), size, options);
+  if (kind == Form::ucs2) return LXGetLocaleTextInfoU(l, item, static_cast<LXUChar*>(buffer), size, options);
+  if (kind == Form::plain) return LXGetLocaleTextInfo(l, item, static_cast<char*>(buffer), size, options);
+  return LXGetLocaleTextInfoEx(l, item, static_cast<char*>(buffer), size, record, options);
 }
 
-int32_t TextForm::set(LXLocale* locale, uint32_t item, const void* text, int32_t length, uint32_t options) const {
-  if (kind == Form::wide) return LXSetLocaleTextInfoW(locale, item, as<LXWChar>(text), length, options);
-  if (kind == Form::ucs2) return LXSetLocaleTextInfoU(locale, item, as<LXUChar>(text), length, options);
-  if (kind == Form::plain) return LXSetLocaleTextInfo(locale, item, as<char>(text), length, options);
-  return LXSetLocaleTextInfoEx(locale, item, as<char>(text), length, record, options);
+int32_t TextForm::set(LXLocale* l, uint32_t item, const void* text, int32_t length, uint32_t options) const {
+  if (kind == Form::wide) return LXSetLocaleTextInfoW(l, item, static_cast<const LXWChar*>(text), length, options);
+  if (kind == Form::ucs2) return LXSetLocaleTextInfoU(l, item, static_cast<const LXUChar*>(text), length, options);
+  if (kind == Form::plain) return LXSetLocaleTextInfo(l, item, static_cast<const char*>(text), length, options);
+  return LXSetLocaleTextInfoEx(l, item, static_cast<const char*>(text), length, record, options);
 }
 
 Units TextForm::spell(const PageSource& own, std::u16string_view text) const {
-  const PageSource& target = page != nullptr ? *page : own;
-  if (kind == Form::ucs2) return Units(text.begin(), text.end());
-  if (kind == Form::shifted) return units_of(encoded(target, text));
-  Units units;
-  for (char16_t character : text) {
-    const std::string code = target.encode(character);
-    if (kind == Form::wide) {
-      units.push_back(packed(code));
-    } else {
-      for (uint32_t byte : units_of(code)) units.push_back(byte);
-    }
-  }
-  return units;
-}
-
-std::string TextForm::raw(const Units& units) const {
-  std::string bytes;
-  for (uint32_t unit : units) {
-    auto unit16 = static_cast<uint16_t>(unit);
-    if (unit_size() == 1) bytes += static_cast<char>(unit);
-    if (unit_size() == 2) bytes.append(reinterpret_cast<const char*>(&unit16), 2);
-    if (unit_size() == 4) bytes.append(reinterpret_cast<const char*>(&unit), 4);
-  }
-  return bytes;
+  return spelled({kind, page != nullptr ? page : &own}, text);
 }
 
 std::vector<TextForm> text_forms(bool pages) {

@@ -30,8 +30,7 @@ struct TextForm {
   int32_t set(LXLocale* locale, uint32_t item, const void* text, int32_t length, uint32_t options) const;
   // The text in this form, of a locale with the page `own`; shift bytes are closed.
   Units spell(const PageSource& own, std::u16string_view text) const;
-  // The same as it stands in memory.
-  std::string raw(const Units& units) const;
+  std::string raw(const Units& units) const { return test::raw({kind, nullptr}, units); }
 };
 
 // Plain, W, U and Ex; with `pages` also Ex in UTF-8, IBM037 and IBM930.

@@ -2,7 +2,6 @@
 #include "support/text_model.hpp"
 
 #include <algorithm>
-#include <optional>
 
 namespace lx::test {
 namespace {
@@ -10,105 +9,30 @@ namespace {
 constexpr uint32_t kFull = 52;
 constexpr uint32_t kPartial = 53;
 
-struct Character {
-  uint16_t unicode;
-  uint32_t packed;
-};
-
-struct Parsed {
-  std::vector<Character> characters;
-  std::vector<size_t> ends;  // units up to and with each character
-  bool complete = true;      // no character is cut off by the end
-};
-
-bool is_shift(const PageSource& page, uint32_t unit) { return unit == page.enter || unit == page.leave; }
-
-// The character of a packed value, whose zero bytes behind the first are not there.
-uint16_t unicode_of_packed(const PageSource& page, uint32_t value) { return page.decode(unpacked(value)); }
-
-Parsed parse_bytes(const Form& form, const Units& text) {
-  const PageSource& page = *form.page;
-  bool inside = form.state != 0;
-  Parsed parsed;
-  size_t at = 0;
-  while (at < text.size()) {
-    if (form.follows_shifts() && is_shift(page, text[at])) {
-      inside = text[at] == page.enter;
-      if (++at == text.size()) break;
-    }
-    size_t length =
-        form.follows_shifts() ? (inside ? page.max_length : 1u) : page.length_of(static_cast<uint8_t>(text[at]));
-    if (length > text.size() - at) {
-      parsed.complete = false;
-      break;
-    }
-    std::string bytes;
-    for (size_t i = 0; i < length; ++i) bytes += static_cast<char>(text[at + i]);
-    at += length;
-    parsed.characters.push_back({page.decode(bytes), packed(bytes)});
-    parsed.ends.push_back(at);
-  }
-  return parsed;
-}
-
-Parsed parse(const Form& form, const Units& text) {
-  if (form.is_bytes()) return parse_bytes(form, text);
-  Parsed parsed;
-  for (uint32_t unit : text) {
-    auto unicode = form.kind == Form::wide ? unicode_of_packed(*form.page, unit) : static_cast<uint16_t>(unit);
-    parsed.characters.push_back({unicode, unit});
-    parsed.ends.push_back(parsed.ends.size() + 1);
-  }
-  return parsed;
-}
-
 // Zero bytes in the middle of a packed value are not written.
 std::string written_bytes(uint32_t value) {
   std::string bytes = unpacked(value);
-  char last = bytes.back();
-  bytes.pop_back();
   std::erase(bytes, '\0');
-  return bytes + last;
+  return (value & 0xFF) != 0 ? bytes : bytes + '\0';
 }
 
-// A target that grows by whole characters.
-struct Written {
-  const Form& form;
-  Units units;
-  bool inside;
-
-  explicit Written(const Form& target) : form(target), inside(target.state != 0 && target.follows_shifts()) {}
-
-  Units piece(const Character& character, bool packed_transfer) const {
-    if (form.kind == Form::ucs2) return {character.unicode};
-    std::string code = packed_transfer ? written_bytes(character.packed) : form.page->encode(character.unicode);
-    if (form.kind == Form::wide) return {packed_transfer ? character.packed : packed(code)};
-    bool shift = form.follows_shifts() && inside != (code.size() > 1);
-    Units piece = units_of(code);
-    if (shift) piece.insert(piece.begin(), inside ? form.page->leave : form.page->enter);
-    return piece;
+// Back to the single-byte state; false when nothing can make way for the leave byte.
+bool close(Writer& out, size_t size, size_t needed) {
+  if (!out.inside) return true;
+  const PageSource& page = *out.form.page;
+  auto ends_with_enter = [&] { return !out.units.empty() && out.units.back() == page.enter; };
+  if (!ends_with_enter() && size - out.units.size() < needed) {
+    if (out.units.size() < page.max_length) return false;
+    out.units.resize(out.units.size() - page.max_length);
   }
-  void add(const Units& piece) {
-    if (form.follows_shifts() && is_shift(*form.page, piece[0])) inside = !inside;
-    units.insert(units.end(), piece.begin(), piece.end());
+  out.inside = false;
+  if (ends_with_enter()) {  // a run that nothing is left of
+    out.units.pop_back();
+  } else {
+    out.units.push_back(page.leave);
   }
-  // Back to the single-byte state; false when nothing can make way for the leave byte.
-  bool close(size_t size, size_t needed) {
-    if (!inside) return true;
-    auto ends_with_enter = [&] { return !units.empty() && units.back() == form.page->enter; };
-    if (!ends_with_enter() && size - units.size() < needed) {
-      if (units.size() < form.page->max_length) return false;
-      units.resize(units.size() - form.page->max_length);
-    }
-    inside = false;
-    if (ends_with_enter()) {  // a run that nothing is left of
-      units.pop_back();
-    } else {
-      units.push_back(form.page->leave);
-    }
-    return true;
-  }
-};
+  return true;
+}
 
 }  // namespace
 
@@ -130,13 +54,91 @@ std::string hex_units(const Units& units) {
   return text;
 }
 
-std::string encoded(const PageSource& page, std::u16string_view text) {
-  Form form = {Form::shifted, &page};
-  Written out(form);
-  for (char16_t character : text) out.add(out.piece({character, 0}, false));
-  if (out.inside) out.units.push_back(page.leave);
-  return bytes_of_units(out.units);
+Units first_units(const Units& text, size_t count) {
+  return {text.begin(), text.begin() + static_cast<ptrdiff_t>(std::min(count, text.size()))};
 }
+
+size_t Form::length_of(uint32_t first, uint32_t in_state) const {
+  if (!is_bytes()) return 1;
+  if (follows_shifts()) return in_state != 0 ? page->max_length : 1;
+  return page->length_of(static_cast<uint8_t>(first));
+}
+
+std::string Form::name() const {
+  static const char* const kKinds[] = {"plain ", "Ex ", "W ", "U "};
+  return kKinds[kind] + (page != nullptr ? page->name : "") + (state != 0 ? " inside" : "");
+}
+
+Characters characters_of(const Form& form, const Units& text, size_t most_shifts) {
+  Characters found;
+  found.state = form.state;
+  size_t at = 0;
+  auto skip_shifts = [&] {
+    for (size_t n = 0; n < most_shifts && at < text.size() && form.is_shift(text[at]); ++n, ++at) {
+      found.state = text[at] == form.page->enter;
+    }
+    found.whole = at;
+  };
+  skip_shifts();
+  while (at < text.size()) {
+    size_t size = form.length_of(text[at], found.state);
+    if (size > text.size() - at) break;
+    Character character = {at, size, 0, text[at], found.state};
+    while (++at < character.own_end()) character.code = character.code << 8 | text[at];
+    skip_shifts();
+    character.end = at;
+    found.list.push_back(character);
+  }
+  found.cut = at < text.size();
+  return found;
+}
+
+std::string bytes_of_code(uint32_t code, size_t size) {
+  std::string bytes(size, '\0');
+  for (; size != 0; code >>= 8) bytes[--size] = static_cast<char>(code);
+  return bytes;
+}
+
+char16_t unicode_of(const Form& form, const Character& c) {
+  if (form.kind == Form::ucs2) return static_cast<char16_t>(c.code);
+  return form.page->decode(form.is_bytes() ? bytes_of_code(c.code, c.size) : unpacked(c.code));
+}
+
+Units Writer::piece(uint16_t unicode) const {
+  return form.kind == Form::ucs2 ? Units{unicode} : piece_of_bytes(form.page->encode(unicode));
+}
+
+Units Writer::piece_of_bytes(const std::string& code) const {
+  if (form.kind == Form::wide) return {packed(code)};
+  Units piece = units_of(code);
+  bool shift = form.follows_shifts() && inside != (code.size() > 1);
+  if (shift) piece.insert(piece.begin(), inside ? form.page->leave : form.page->enter);
+  return piece;
+}
+
+void Writer::add(const Units& piece) {
+  if (form.is_shift(piece[0])) inside = !inside;
+  units.insert(units.end(), piece.begin(), piece.end());
+}
+
+Units spelled(const Form& form, std::u16string_view text) {
+  Writer out{form};
+  for (char16_t character : text) out.add(out.piece(character));
+  if (out.inside) out.units.push_back(form.page->leave);
+  return out.units;
+}
+
+std::string encoded(const PageSource& page, std::u16string_view text) {
+  return bytes_of_units(spelled({Form::shifted, &page}, text));
+}
+
+std::string raw(const Form& form, const Units& units) {
+  std::string bytes;
+  for (uint32_t unit : units) bytes.append(reinterpret_cast<const char*>(&unit), form.unit_size());  // little-endian
+  return bytes;
+}
+
+// ---- Conversion ----
 
 StringResult convert_model(const Form& to, const Form& from, const Units& text, const StringOptions& options,
                            bool packed_transfer) {
@@ -144,12 +146,12 @@ StringResult convert_model(const Form& to, const Form& from, const Units& text, 
   size_t size = options.out_size > 0 ? static_cast<size_t>(options.out_size) : 0;
   bool measured = options.in_length < 0;
   bool by_characters = options.characters && to.is_bytes();
-  Written out(to);
+  Writer out{to};
   Units source = text;
   if (!measured && options.characters && from.is_bytes()) {
-    auto ends = parse(from, text).ends;
+    auto list = characters_of(from, text, 1).list;
     auto wanted = static_cast<size_t>(options.in_length);
-    source.resize(wanted == 0 ? 0 : wanted <= ends.size() ? ends[wanted - 1] : text.size());
+    source.resize(wanted == 0 ? 0 : wanted <= list.size() ? list[wanted - 1].own_end() : text.size());
   } else if (!measured) {
     source.resize(static_cast<size_t>(options.in_length));
   }
@@ -167,22 +169,25 @@ StringResult convert_model(const Form& to, const Form& from, const Units& text, 
   }
 
   size_t text_size = options.terminate ? size - 1 : size;
-  Parsed parsed = parse(from, source);
+  Characters parsed = characters_of(from, source, 1);
   // Packing takes the terminator for text, also behind a character that it cuts off.
-  if (packed_transfer && to.kind == Form::wide) parsed.complete = true;
+  bool complete = !parsed.cut || (packed_transfer && to.kind == Form::wide);
   size_t characters = 0;
-  for (; characters < parsed.characters.size(); ++characters) {
-    Units piece = out.piece(parsed.characters[characters], packed_transfer);
+  for (; characters < parsed.list.size(); ++characters) {
+    const Character& c = parsed.list[characters];
+    Units piece = !packed_transfer        ? out.piece(unicode_of(from, c))
+                  : to.kind == Form::wide ? Units{c.code}
+                                          : out.piece_of_bytes(written_bytes(c.code));
     if (by_characters ? characters + 1 > text_size : out.units.size() + piece.size() > text_size) break;
     out.add(piece);
-    result.consumed = parsed.ends[characters];
+    result.consumed = c.own_end();
   }
-  bool all = parsed.complete && characters == parsed.characters.size();
+  bool all = complete && characters == parsed.list.size();
   if (all) result.consumed = source.size();
   size_t used = by_characters ? characters : out.units.size();
   bool due = options.terminate || (measured && all && used < size);
   size_t room = by_characters ? out.units.size() + 8 : text_size;
-  bool closed = out.close(room, options.terminate || !due ? 1 : 2);
+  bool closed = close(out, room, options.terminate || !due ? 1 : 2);
   result.count = static_cast<int32_t>(by_characters ? characters : out.units.size());
   if (due && closed) {
     out.units.push_back(0);
@@ -193,84 +198,60 @@ StringResult convert_model(const Form& to, const Form& from, const Units& text, 
 }
 
 int32_t char_to_byte_model(const PageSource& page, std::string_view text, uint32_t state, int32_t chars) {
-  bool inside = state != 0;
+  Form form = {Form::shifted, &page, state};
   size_t at = 0;
   auto take_shift = [&] {
-    if (at >= text.size() || !is_shift(page, static_cast<uint8_t>(text[at]))) return;
-    inside = static_cast<uint8_t>(text[at]) == page.enter;
-    ++at;
+    if (at >= text.size() || !form.is_shift(static_cast<uint8_t>(text[at]))) return;
+    form.state = static_cast<uint8_t>(text[at++]) == page.enter;
   };
   for (int32_t i = 0; i < chars; ++i) {
-    if (page.mixed()) take_shift();
-    at += page.mixed() ? (inside ? page.max_length : 1u) : page.length_of(static_cast<uint8_t>(text[at]));
-    if (page.mixed()) take_shift();
+    take_shift();
+    at += form.length_of(at < text.size() ? static_cast<uint8_t>(text[at]) : 0, form.state);
+    take_shift();
   }
   return static_cast<int32_t>(at);
 }
 
 int32_t byte_to_char_model(const PageSource& page, std::string_view text, uint32_t state) {
-  Form form = {Form::shifted, &page, state};
-  return static_cast<int32_t>(parse_bytes(form, units_of(text)).characters.size());
+  return static_cast<int32_t>(characters_of({Form::shifted, &page, state}, units_of(text), 1).list.size());
 }
 
-size_t BufferModel::length_of(char first) const {
-  if (source_.mixed()) return source_inside_ ? source_.max_length : 1u;
-  return source_.length_of(static_cast<uint8_t>(first));
+// What is pending; false when the room does not do.
+bool BufferModel::deliver(std::string& out, size_t& room) {
+  size_t count = std::min(room, pending_.size());
+  out += pending_.substr(0, count);
+  pending_.erase(0, count);
+  room -= count;
+  return pending_.empty();
 }
 
 uint32_t BufferModel::convert(std::string& out, size_t room, std::string_view& in) {
-  if (!pending_.empty()) {
-    if (room == 0) return kFull;
-    size_t count = std::min(room, pending_.size());
-    out += pending_.substr(0, count);
-    pending_.erase(0, count);
-    room -= count;
-    if (!pending_.empty()) return kFull;
-  }
-  for (;;) {
-    std::string character;
-    if (!held_.empty()) {
-      size_t missing = length_of(held_[0]) - held_.size();
-      if (in.size() < missing) {
-        held_ += in;
-        in = {};
-        return kPartial;
-      }
-      character = held_ + std::string(in.substr(0, missing));
-      held_.clear();
-      in.remove_prefix(missing);
-    } else {
+  while (deliver(out, room)) {
+    if (held_.empty()) {
       if (in.empty()) return 0;
       // One shift byte before a character, also when the text is cut behind it.
-      if (source_.mixed() && !past_shift_ && is_shift(source_, static_cast<uint8_t>(in[0]))) {
-        source_inside_ = static_cast<uint8_t>(in[0]) == source_.enter;
+      if (!past_shift_ && source_.is_shift(static_cast<uint8_t>(in[0]))) {
+        source_.state = static_cast<uint8_t>(in[0]) == source_.page->enter;
         in.remove_prefix(1);
         past_shift_ = true;
         if (in.empty()) return 0;
       }
       past_shift_ = false;
-      size_t length = length_of(in[0]);
-      if (in.size() < length) {
-        held_ = in;
-        in = {};
-        return kPartial;
-      }
-      character = in.substr(0, length);
-      in.remove_prefix(length);
     }
-    std::string piece = target_.encode(source_.decode(character));
-    if (target_.mixed() && target_inside_ != (piece.size() > 1)) {
-      piece.insert(piece.begin(), static_cast<char>(target_inside_ ? target_.leave : target_.enter));
-      target_inside_ = !target_inside_;
+    std::string character = held_ + std::string(in);
+    size_t length = source_.length_of(static_cast<uint8_t>(character[0]), source_.state);
+    if (character.size() < length) {
+      held_ = character;
+      in = {};
+      return kPartial;
     }
-    size_t count = std::min(room, piece.size());
-    out += piece.substr(0, count);
-    room -= count;
-    if (count < piece.size()) {
-      pending_ = piece.substr(count);
-      return kFull;
-    }
+    in.remove_prefix(length - held_.size());
+    held_.clear();
+    Units piece = target_.piece(source_.page->decode(character.substr(0, length)));
+    target_.add(piece);
+    pending_ = bytes_of_units(piece);
   }
+  return kFull;
 }
 
 }  // namespace lx::test
