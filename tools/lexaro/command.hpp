@@ -20,9 +20,12 @@ struct Command {
   std::function<ExitStatus(const CommonOptions&)> run;
 };
 
+Command add_catalog_command(CLI::App& program);
 Command add_convert_command(CLI::App& program);
+Command add_format_command(CLI::App& program);
 Command add_list_command(CLI::App& program);
 Command add_locale_command(CLI::App& program);
+Command add_parse_command(CLI::App& program);
 Command add_records_command(CLI::App& program);
 Command add_sort_command(CLI::App& program);
 

@@ -16,6 +16,7 @@
 #include "tools/lexaro/command.hpp"
 #include "tools/lexaro/output_file.hpp"
 #include "tools/lexaro/temporary_file.hpp"
+#include "tools/lexaro/values.hpp"
 
 namespace lx::tool {
 namespace {
@@ -77,9 +78,12 @@ ExitStatus report_parse_error(const CLI::App& program, const CLI::ParseError& er
 }
 
 // The arguments in the reversed order that the parser takes them in. It would read [x] as a list of values and treat
-// what follows "--" as options once a file was named: both are file names here, and "./" makes that plain.
+// what follows "--" as options once a file was named: both are file names here, and "./" makes that plain; or values,
+// which get a mark, as negative numbers do.
 std::vector<std::string> parser_arguments(int argument_count, char** arguments) {
   std::vector<std::string> all;
+  const auto is_value_command = [](std::string_view argument) { return argument == "format" || argument == "parse"; };
+  const bool values = std::any_of(arguments + 1, arguments + argument_count, is_value_command);
   bool only_files = false;
   for (int i = 1; i < argument_count; ++i) {
     std::string argument = arguments[i];
@@ -89,7 +93,11 @@ std::vector<std::string> parser_arguments(int argument_count, char** arguments) 
     }
     const bool like_option = only_files && argument.size() > 1 && argument.front() == '-';
     const bool like_list = argument.starts_with('[') && argument.ends_with(']');
-    if (like_option || like_list) argument.insert(0, "./");
+    if (values) {
+      if (like_option || like_list || is_negative_value(argument)) argument.insert(0, 1, kValueMark);
+    } else if (like_option || like_list) {
+      argument.insert(0, "./");
+    }
     all.push_back(std::move(argument));
   }
   std::reverse(all.begin(), all.end());
@@ -103,9 +111,10 @@ ExitStatus run(int argument_count, char** arguments) {
   program.set_version_flag("--version", std::string("lexaro ") + LXVersion());
   program.footer(kProgramNotes);
 
-  const std::vector<Command> commands = {add_convert_command(program), add_list_command(program),
-                                         add_locale_command(program),  add_records_command(program),
-                                         add_sort_command(program),    add_help_command(program)};
+  const std::vector<Command> commands = {
+      add_catalog_command(program), add_convert_command(program), add_format_command(program),
+      add_list_command(program),    add_locale_command(program),  add_parse_command(program),
+      add_records_command(program), add_sort_command(program),    add_help_command(program)};
   program.require_subcommand(1);
   program.fallthrough();
   for (const Command& command : commands) command.app->fallthrough();

@@ -33,28 +33,6 @@ bool is_in(const Range (&ranges)[count], LXUChar unit) {
 
 bool is_control(LXUChar unit) { return unit < 0x20 || (unit >= 0x7F && unit < 0xA0); }
 
-// Texts of the library, and names that a user typed: what is not well-formed, or beyond UCS-2, shows as U+FFFD.
-std::vector<LXUChar> ucs2_of(std::string_view text) {
-  std::vector<LXUChar> units;
-  for (std::size_t i = 0; i < text.size();) {
-    const auto byte = [&](std::size_t at) { return at < text.size() ? static_cast<unsigned char>(text[at]) : 0U; };
-    const auto trail = [&](std::size_t at) { return (byte(at) & 0xC0) == 0x80; };
-    const unsigned lead = byte(i);
-    unsigned unit = lead < 0x80 ? lead : kReplacement;
-    std::size_t length = 1;
-    if (lead >= 0xC2 && lead < 0xE0 && trail(i + 1)) {
-      unit = (lead & 0x1F) << 6 | (byte(i + 1) & 0x3F);
-      length = 2;
-    } else if (lead >= 0xE0 && lead < 0xF0 && trail(i + 1) && trail(i + 2)) {
-      unit = (lead & 0x0F) << 12 | (byte(i + 1) & 0x3F) << 6 | (byte(i + 2) & 0x3F);
-      length = 3;
-    }
-    units.push_back(static_cast<LXUChar>(unit));
-    i += length;
-  }
-  return units;
-}
-
 // The code set of the user's locale, which need not be installed here.
 std::string terminal_code_set() {
   if (std::setlocale(LC_CTYPE, "")) return ::nl_langinfo(CODESET);
@@ -107,19 +85,53 @@ std::string utf8_of(const std::vector<LXUChar>& text) {
   return utf8;
 }
 
+std::vector<LXUChar> ucs2_of(std::string_view text) {
+  std::vector<LXUChar> units;
+  for (std::size_t i = 0; i < text.size();) {
+    const auto byte = [&](std::size_t at) { return at < text.size() ? static_cast<unsigned char>(text[at]) : 0U; };
+    const auto trail = [&](std::size_t at) { return (byte(at) & 0xC0) == 0x80; };
+    const unsigned lead = byte(i);
+    unsigned unit = lead < 0x80 ? lead : kReplacement;
+    std::size_t length = 1;
+    if (lead >= 0xC2 && lead < 0xE0 && trail(i + 1)) {
+      unit = (lead & 0x1F) << 6 | (byte(i + 1) & 0x3F);
+      length = 2;
+    } else if (lead >= 0xE0 && lead < 0xF0 && trail(i + 1) && trail(i + 2)) {
+      unit = (lead & 0x0F) << 12 | (byte(i + 1) & 0x3F) << 6 | (byte(i + 2) & 0x3F);
+      length = 3;
+    }
+    units.push_back(static_cast<LXUChar>(unit));
+    i += length;
+  }
+  return units;
+}
+
 std::size_t display_width(std::string_view utf8) {
   std::size_t width = 0;
   for (LXUChar unit : ucs2_of(utf8)) width += is_in(kWide, unit) ? 2 : is_in(kCombining, unit) ? 0 : 1;
   return width;
 }
 
-void print_text(std::string_view utf8) {
+std::vector<LXUChar> terminal_ucs2(std::string_view text) {
+  constexpr uint16_t kAscii = 367;  // the C locale, in which text beyond ASCII is UTF-8 today
+  const LXObjEntry* page = terminal_page();
+  if (!page || LXGetObjId(page) == kAscii) return ucs2_of(text);
+  std::vector<LXUChar> units(text.size() + 1);
+  const int32_t length = LXCpStrToUnicode(page, units.data(), static_cast<int32_t>(units.size()), text.data(),
+                                          static_cast<int32_t>(text.size()), 0);
+  units.resize(static_cast<std::size_t>(std::max(length, 0)));
+  return units;
+}
+
+std::string terminal_text(std::string_view utf8) {
   std::vector<LXUChar> text = ucs2_of(utf8);
   std::replace_if(
       text.begin(), text.end(), [](LXUChar unit) { return unit != '\n' && is_control(unit); }, LXUChar{'?'});
   const LXObjEntry* page = terminal_page();
-  print(page ? in_code_page(text, page) : utf8_of(text));
+  return page ? in_code_page(text, page) : utf8_of(text);
 }
+
+void print_text(std::string_view utf8) { print(terminal_text(utf8)); }
 
 std::string TextTable::text() const {
   const std::size_t columns = rows_.front().size();

@@ -13,12 +13,17 @@
 namespace lx::tool {
 
 std::string utf8_of(const std::vector<LXUChar>& text);
+// What is not well-formed, or beyond UCS-2, becomes U+FFFD.
+std::vector<LXUChar> ucs2_of(std::string_view utf8);
+// Of an argument, which a terminal sends in its own encoding.
+std::vector<LXUChar> terminal_ucs2(std::string_view text);
 
 // Columns of a terminal: East Asian wide characters take two, combining ones none.
 std::size_t display_width(std::string_view utf8);
 
-// Writes UTF-8 text to standard output in the encoding of the user's terminal: what that lacks becomes "?". Control
-// characters from data do not reach it.
+// Text in the encoding of the user's terminal: what that lacks, and control characters from data, become "?".
+std::string terminal_text(std::string_view utf8);
+// Writes it to standard output, once in the program's life.
 void print_text(std::string_view utf8);
 
 // A table with columns as wide as their widest cell; columns of numbers stand at the right.
