@@ -10,8 +10,6 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "classification", 0};
 
-const CodePage& page_of(const LocaleCall& call) { return code_page_of(*call.locale.code_page); }
-
 // The bits of one class of a character-type word.
 uint32_t bits_of(LocaleCall& call, uint32_t type, uint32_t class_id) {
   switch (class_id) {
@@ -36,7 +34,7 @@ uint32_t type_at(const CodePage& page, const char* s, uint32_t length) {
 template <class Type>
 uint32_t type_call(const char* function, LXLocale* locale, uint32_t class_id, Type type) {
   return locale_call(trace_unit, function, locale, 0, 0, uint32_t{0},
-                     [&](LocaleCall& call) { return bits_of(call, type(page_of(call)), class_id); });
+                     [&](LocaleCall& call) { return bits_of(call, type(page_of(call.locale)), class_id); });
 }
 
 }  // namespace

@@ -42,8 +42,6 @@ struct Output {
   }
 };
 
-const CodePage& page_of(const LXLocale* locale) { return code_page_of(*locale->code_page); }
-
 template <class In>
 void set_up_reader(const LXConversion& handle, In& in) {
   in.strict = (handle.options & LX_CONV_STRICT) != 0;
@@ -214,8 +212,8 @@ bool in_use(const LXConversion& handle) {
 
 // Both pages single-byte: their map lies behind the handle.
 LXConversion* make_handle(LXLocale& target, LXLocale& source) {
-  const CodePage& from = page_of(&source);
-  const CodePage& to = page_of(&target);
+  const CodePage& from = page_of(source);
+  const CodePage& to = page_of(target);
   bool mapped = from.kind == PageKind::single && to.max_length == 1 && !from.shift_sensitive;
   auto block = Owned<uint8_t>::zeroed(sizeof(LXConversion) + (mapped ? sizeof(ByteMap) : 0));
   if (!block) return nullptr;
@@ -292,7 +290,7 @@ int32_t LXConversionRatio(LXLocale* target_locale, LXLocale* source_locale, uint
     LXLocale* source = locale_or_default(source_locale);
     if (source == nullptr) return -1;
     if (call.locale.code_page->id == source->code_page->id) return 1;
-    const CodePage& page = page_of(&call.locale);
+    const CodePage& page = page_of(call.locale);
     return page.max_length + (page.shift_sensitive ? 1 : 0);
   });
 }

@@ -12,8 +12,6 @@ TRC1_Unit trace_unit = {"Lexaro", "convert_string", 0};
 // From here on making the map of a pair of single-byte pages costs less than it saves.
 constexpr size_t kWorthMapping = 1024;
 
-const CodePage& page_of(const LXLocale& locale) { return code_page_of(*locale.code_page); }
-
 template <class In, class Out>
 OneShotResult convert_pair(const Source<uint8_t>& source, const In& in, const Out& out, const Target& target) {
   return convert_source(source, in, out, target);

@@ -11,8 +11,6 @@ TRC1_Unit trace_unit = {"Lexaro", "line_ends", 0};
 
 constexpr uint32_t kAnyOption = ~0u;  // checked by the body, which has more to say than a status
 
-const CodePage& page_of(const LocaleCall& call) { return code_page_of(*call.locale.code_page); }
-
 template <class Kind, class Unit = typename Kind::Unit>
 Unit* get_line_end(const char* function, LXLocale* locale, const Unit* s, uint32_t state, int32_t length,
                    uint32_t* type, int32_t* eol_length, uint32_t flags) {
@@ -29,7 +27,7 @@ Unit* get_line_end(const char* function, LXLocale* locale, const Unit* s, uint32
       return call.fail(LX_E_ARGUMENT, kNone);
     }
     if (wanted == 0) wanted = LX_EOL_1;
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> text = {s, 0, state};
     text.length = length < 0 ? measured_length(s) : static_cast<size_t>(length);
     if (length > 0 && (flags & LX_OPT_CHARS) != 0) text.length = Kind::length_of_characters(page, text, text.length);
@@ -42,7 +40,7 @@ template <class Kind, class Unit = typename Kind::Unit>
 Unit* put_line_end(const char* function, LXLocale* locale, Unit* out, uint32_t state, uint32_t flags) {
   constexpr Unit* kNone = nullptr;
   return locale_call(trace_unit, function, locale, flags, kLineEnds | LX_EOL_DEFAULT, kNone, [&](LocaleCall& call) {
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     const LineCharacters line = line_characters<Kind>(page);
     uint32_t wanted = flags != 0 ? flags : LX_EOL_DEFAULT;
     Unit* at = out;

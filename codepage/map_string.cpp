@@ -197,7 +197,7 @@ struct Mapping {
   Text<typename Kind::Unit> text;
   bool terminated;  // the terminator behind the text belongs to it
 
-  const CodePage& page() const { return code_page_of(*locale.code_page); }
+  const CodePage& page() const { return page_of(locale); }
 
   template <class Step>
   Written run(const Room<Stored<Kind>>& room, const Step& step) const {
@@ -258,7 +258,7 @@ int32_t map_call(const char* function, LXLocale* locale, Unit* out, int32_t out_
                  int32_t in_length, uint32_t flags) {
   constexpr bool kBytes = sizeof(Unit) == 1;
   return locale_call(trace_unit, function, locale, 0, 0, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
-    const CodePage& page = code_page_of(*call.locale.code_page);
+    const CodePage& page = page_of(call.locale);
     uint32_t option = flags & ~LX_OPT_CHARS;
     bool characters = kBytes && (flags & LX_OPT_CHARS) != 0;
     if (!is_mapping(option)) return call.fail(LX_E_ARGUMENT, int32_t{-1});

@@ -12,7 +12,6 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "navigation", 0};
 
-const CodePage& page_of(const LocaleCall& call) { return code_page_of(*call.locale.code_page); }
 size_t length_at(const CodePage& page, const char* s) { return page.char_length[static_cast<uint8_t>(*s)]; }
 size_t length_in_state(const CodePage& page, uint32_t state) { return state != 0 ? page.max_length : 1u; }
 char* position(const char* s) { return const_cast<char*>(s); }
@@ -20,7 +19,7 @@ char* position(const char* s) { return const_cast<char*>(s); }
 template <class Result, class Body>
 Result page_call(const char* function, LXLocale* locale, Result failure, Body body) {
   return locale_call(trace_unit, function, locale, 0, 0, failure,
-                     [&](LocaleCall& call) { return body(page_of(call)); });
+                     [&](LocaleCall& call) { return body(page_of(call.locale)); });
 }
 
 // The same for functions without a result.
@@ -92,7 +91,7 @@ template <class Kind>
 char* move_call(const char* function, LXLocale* locale, const char* s, uint32_t state, int32_t count, uint32_t flags) {
   return locale_call(trace_unit, function, locale, flags, LX_OPT_CHARS, static_cast<char*>(nullptr),
                      [&](LocaleCall& call) -> char* {
-                       const CodePage& page = page_of(call);
+                       const CodePage& page = page_of(call.locale);
                        if (page.max_length == 1) return position(s) + count;
                        if (count < 0) return call.fail(LX_E_ARGUMENT, static_cast<char*>(nullptr));
                        Text<char> text = {s, static_cast<size_t>(count), state};
@@ -187,7 +186,7 @@ LXWChar LXGetChar(LXLocale* locale, const char* s) noexcept {
 LXWChar LXGetCharEx(LXLocale* locale, const char* s, uint32_t state) noexcept {
   return locale_call(trace_unit, __func__, locale, 0, 0, LXWChar{0}, [&](LocaleCall& call) {
     const LXObjEntry* record = call.locale.code_page;
-    return page_of(call).shift_sensitive ? LXMbToWS(record, s, state) : LXMbToW(record, s);
+    return page_of(call.locale).shift_sensitive ? LXMbToWS(record, s, state) : LXMbToW(record, s);
   });
 }
 
@@ -225,7 +224,7 @@ int32_t LXValidCharEx(LXLocale* locale, const char* s, uint32_t state) noexcept 
 
 int32_t LXTerminateStringEx(LXLocale* locale, char* out, uint32_t state, uint32_t flags) noexcept {
   return locale_call(trace_unit, __func__, locale, flags, LX_OPT_TERMINATE, int32_t{-1}, [&](LocaleCall& call) {
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     char* at = out;
     if (page.shift_sensitive && state != 0) *at++ = static_cast<char>(page.leave_byte);
     if ((flags & LX_OPT_TERMINATE) != 0) *at++ = '\0';

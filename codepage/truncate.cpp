@@ -133,7 +133,7 @@ template <class Kind>
 int32_t truncate_call(const char* function, LXLocale* locale, char* string, uint32_t state, int32_t size,
                       uint32_t flags) {
   return locale_call(unit, function, locale, flags, kOptions, int32_t{-1}, [&](LocaleCall& call) {
-    return truncate<Kind>(code_page_of(*call.locale.code_page), string, state, size, flags);
+    return truncate<Kind>(page_of(call.locale), string, state, size, flags);
   });
 }
 

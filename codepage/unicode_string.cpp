@@ -12,8 +12,6 @@ TRC1_Unit trace_unit = {"Lexaro", "unicode_string", 0};
 
 constexpr uint16_t kAsciiCodePage = 367;
 
-const CodePage& page_of(const LXLocale& locale) { return code_page_of(*locale.code_page); }
-
 OneShotResult to_unicode(const CodePage& page, LXUChar* out, int32_t out_size, const char* in, Shifts shifts,
                          int32_t in_length, uint32_t flags) {
   Source<uint8_t> source = byte_source(page, in, shifts, in_length, flags);

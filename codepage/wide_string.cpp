@@ -42,7 +42,7 @@ OneShotResult unpack_text(const CodePage& page, char* out, Shifts shifts, int32_
 template <class Body>
 int32_t wide_call(const char* function, LXLocale* locale, uint32_t flags, Body body) {
   return locale_call(trace_unit, function, locale, flags, kStringOptions, int32_t{-1},
-                     [&](LocaleCall& call) -> int32_t { return body(code_page_of(*call.locale.code_page)).count; });
+                     [&](LocaleCall& call) -> int32_t { return body(page_of(call.locale)).count; });
 }
 
 }  // namespace

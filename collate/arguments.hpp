@@ -9,8 +9,6 @@
 
 namespace lx {
 
-inline const CodePage& page_of(const LocaleCall& call) { return code_page_of(*call.locale.code_page); }
-
 // Whether a measured length takes the terminator in.
 enum class Terminator : bool { excluded, included };
 

@@ -311,7 +311,7 @@ int32_t compare_weights(LocaleCall& call, const SortTables& sort, const Beginnin
 template <class Kind>
 [[gnu::noinline]] int32_t compare_rest(LocaleCall& call, const SortTables& sort, const Beginning& begin,
                                        const Text<typename Kind::Unit>& a, const Text<typename Kind::Unit>& b) {
-  const CodePage& page = page_of(call);
+  const CodePage& page = page_of(call.locale);
   if constexpr (std::same_as<Kind, WideKind>) {
     return compare_weights(call, sort, begin, WideReader(page, a.at, a.length), WideReader(page, b.at, b.length));
   } else if constexpr (std::same_as<Kind, Ucs2Kind>) {
@@ -341,7 +341,7 @@ template <class Kind>
 template <class Kind>
 int32_t compare_directly(LocaleCall& call, const SortTables& sort, const Text<typename Kind::Unit>& a,
                          const Text<typename Kind::Unit>& b) {
-  const Beginning begin = compare_beginnings<Kind>(sort, page_of(call), a, b);
+  const Beginning begin = compare_beginnings<Kind>(sort, page_of(call.locale), a, b);
   return begin.decided ? begin.result : compare_rest<Kind>(call, sort, begin, a, b);
 }
 
@@ -382,14 +382,14 @@ template <class Kind, class Unit = typename Kind::Unit>
 int32_t compare_by_sort(LocaleCall& call, const SortTables& sort, Text<Unit> a, Text<Unit> b, uint32_t options) {
   if constexpr (Kind::kBytes) {
     if ((options & LX_COLL_TRIM) != 0) {
-      trim_both<Kind>(page_of(call), a, b);
+      trim_both<Kind>(page_of(call.locale), a, b);
       options &= ~LX_CMP_TRIM;
       if (options == LX_COLL_TRIM) options = 0;
     }
   } else if ((options & LX_CMP_TRIM) != 0) {
     bool full_width = (options & LX_CMP_NOWIDTH) == LX_CMP_NOWIDTH;
-    trim<Kind>(trace_unit, page_of(call), a, full_width);
-    trim<Kind>(trace_unit, page_of(call), b, full_width);
+    trim<Kind>(trace_unit, page_of(call.locale), a, full_width);
+    trim<Kind>(trace_unit, page_of(call.locale), b, full_width);
     options &= ~LX_CMP_TRIM;
   }
   if (!is_transform(options)) return call.fail(LX_E_ARGUMENT, int32_t{0});
@@ -403,7 +403,7 @@ int32_t compare_binary(PlainKind, LXLocale& locale, const char* str1, uint32_t, 
 }
 int32_t compare_binary(ShiftedKind, LXLocale& locale, const char* str1, uint32_t state1, int32_t len1, const char* str2,
                        uint32_t state2, int32_t len2, uint32_t options) {
-  if (!code_page_of(*locale.code_page).shift_sensitive) return LXStrcmp(&locale, str1, len1, str2, len2, options);
+  if (!page_of(locale).shift_sensitive) return LXStrcmp(&locale, str1, len1, str2, len2, options);
   bool width = (options & LX_CMP_NOWIDTH) == LX_CMP_NOWIDTH;
   options &= LX_CMP_TRIM | LX_OPT_CHARS | (width ? LX_CMP_NOWIDTH : LX_CMP_NOCASE);
   return LXStrcmpEx(&locale, str1, state1, len1, str2, state2, len2, options);
@@ -428,7 +428,7 @@ int32_t collate_call(const char* function, LXLocale* locale, const Unit* str1, u
       call.status = call.locale.last_error;
       return result;
     }
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     auto a = given_text<Kind>(page, str1, state1, len1, options, Terminator::excluded);
     auto b = given_text<Kind>(page, str2, state2, len2, options, Terminator::excluded);
     options &= ~LX_OPT_CHARS;

@@ -134,7 +134,7 @@ int32_t compare_mapped(LocaleCall& call, const Text<Unit>& a, const Text<Unit>& 
   UpperText<Kind> x;
   UpperText<Kind> y;
   if (!x.make(call.locale, a) || !y.make(call.locale, b)) return call.fail(LX_E_MEMORY, int32_t{0});
-  return compare_folded<Kind>(page_of(call), x.text, y.text, Fold::none);
+  return compare_folded<Kind>(page_of(call.locale), x.text, y.text, Fold::none);
 }
 
 // ---- The calls ----
@@ -156,7 +156,7 @@ template <class Kind, class Unit = typename Kind::Unit>
 int32_t compare_call(const char* function, LXLocale* locale, const Unit* str1, uint32_t state1, int32_t len1,
                      const Unit* str2, uint32_t state2, int32_t len2, uint32_t options) {
   return locale_call(trace_unit, function, locale, options, kCompareOptions, int32_t{0}, [&](LocaleCall& call) {
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     auto a = text_to_compare<Kind>(page, str1, state1, len1, options);
     auto b = text_to_compare<Kind>(page, str2, state2, len2, options);
     if (Kind::kShifted && page.shift_sensitive) {
@@ -182,12 +182,12 @@ int32_t compare_call(const char* function, LXLocale* locale, const Unit* str1, u
 template <class Kind>
 int32_t compare_texts(LocaleCall& call, Text<typename Kind::Unit> a, Text<typename Kind::Unit> b, uint32_t options) {
   Fold fold = fold_of(options);
-  bool shifted = Kind::kShifted && page_of(call).shift_sensitive;  // shift bytes alone are no text
+  bool shifted = Kind::kShifted && page_of(call.locale).shift_sensitive;  // shift bytes alone are no text
   if (!shifted && (a.length == 0 || b.length == 0)) return difference_of_lengths(a.length, b.length);
   if (fold == Fold::upper && !SpecialPairs(call.locale.language, kUpperSpecialSlot).empty()) {
     return compare_mapped<Kind>(call, a, b);
   }
-  return compare_folded<Kind>(page_of(call), a, b, fold);
+  return compare_folded<Kind>(page_of(call.locale), a, b, fold);
 }
 
 template int32_t compare_texts<PlainKind>(LocaleCall&, Text<char>, Text<char>, uint32_t);
@@ -225,7 +225,7 @@ int32_t AdjustLength(LXLocale* locale, const char* str, uint32_t state, int32_t 
   return locale_call(trace_unit, __func__, locale, 0, 0, int32_t{0}, [&](LocaleCall& call) {
     Text<char> text = {str, len > 0 ? static_cast<size_t>(len) : 0, state};
     return static_cast<int32_t>(
-        ShiftedKind::with_walker(page_of(call), text, [](auto walker) { return whole_length(walker); }));
+        ShiftedKind::with_walker(page_of(call.locale), text, [](auto walker) { return whole_length(walker); }));
   });
 }
 

@@ -12,7 +12,7 @@ template <class Kind, class Unit = typename Kind::Unit>
 int32_t copy_call(const char* function, LXLocale* locale, Unit* dst, int32_t dst_size, const Unit* src, uint32_t state,
                   int32_t src_len, uint32_t options) {
   return locale_call(trace_unit, function, locale, options, LX_OPT_CHARS, int32_t{-1}, [&](LocaleCall& call) {
-    return copy_text<Kind>(page_of(call), dst, dst_size, src, state, src_len, (options & LX_OPT_CHARS) != 0);
+    return copy_text<Kind>(page_of(call.locale), dst, dst_size, src, state, src_len, (options & LX_OPT_CHARS) != 0);
   });
 }
 
@@ -22,7 +22,7 @@ int32_t join_call(const char* function, LXLocale* locale, Unit* dst, const Unit*
   constexpr uint32_t kOptions = LX_OPT_CHARS | LX_OPT_TERMINATE;
   return locale_call(trace_unit, function, locale, options, kOptions, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     if (dst == nullptr) return call.fail(LX_E_ARGUMENT, -1);
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> before = {dst, measured_length(dst), 0};
     Text<Unit> text = given_text<Kind>(page, src, state, src_len, options, Terminator::excluded);
     bool terminate = src_len < 0 || (options & LX_OPT_TERMINATE) != 0;

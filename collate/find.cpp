@@ -42,7 +42,7 @@ Unit* find_character_call(const char* function, LXLocale* locale, const Unit* st
   constexpr Unit* kNone = nullptr;
   return locale_call(trace_unit, function, locale, options, LX_STR_LAST, kNone, [&](LocaleCall& call) -> Unit* {
     if (options != 0 && options != LX_STR_LAST) return call.fail(LX_E_ARGUMENT, kNone);
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> text = given_text<Kind>(page, str, state, len, 0, Terminator::included);
     Character character = wanted(page);
     if (text.length == 0 || character.units == 0) return kNone;
@@ -72,7 +72,7 @@ template <class Kind>
 class FirstForm {
  public:
   FirstForm(const LXLocale& locale, Fold fold)
-      : characters_(code_page_of(*locale.code_page)),
+      : characters_(page_of(locale)),
         specials_(fold == Fold::upper ? locale.language : nullptr, kUpperSpecialSlot),
         fold_(fold) {}
 
@@ -114,7 +114,7 @@ template <class Kind, class Walker>
 Found find_text(LocaleCall& call, Walker text, Walker pattern, const Text<typename Kind::Unit>& sub, uint32_t options) {
   const Walker begin = text;
   // Single-byte pages are compared by their bytes, of which each has one width.
-  const bool whole_bytes = Kind::kBytes && page_of(call).max_length == 1;
+  const bool whole_bytes = Kind::kBytes && page_of(call.locale).max_length == 1;
   const Fold fold = whole_bytes && fold_of(options) == Fold::half_width ? Fold::none : fold_of(options);
   const FirstForm<Kind> forms(call.locale, fold);
   const size_t count = count_characters(pattern);
@@ -147,7 +147,7 @@ Unit* find_text_call(const char* function, LXLocale* locale, const Unit* str, ui
   constexpr Unit* kNone = nullptr;
   constexpr uint32_t kOptions = LX_CMP_NOWIDTH | LX_OPT_CHARS;
   return locale_call(trace_unit, function, locale, options, kOptions, kNone, [&](LocaleCall& call) -> Unit* {
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> text = given_text<Kind>(page, str, state, len, options, Terminator::included);
     Text<Unit> pattern = given_text<Kind>(page, sub, sub_state, sub_len, options, Terminator::excluded);
     if (Kind::kShifted && page.shift_sensitive) {

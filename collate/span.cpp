@@ -13,7 +13,7 @@ template <class Kind, class Unit = typename Kind::Unit>
 int32_t span_call(const char* function, LXLocale* locale, bool wanted, const Unit* str, uint32_t state, int32_t len,
                   const Unit* set, uint32_t set_state, int32_t set_len, uint32_t options) {
   return locale_call(trace_unit, function, locale, options, LX_OPT_CHARS, int32_t{0}, [&](LocaleCall& call) {
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> text = given_text<Kind>(page, str, state, len, options, Terminator::excluded);
     Text<Unit> members = given_text<Kind>(page, set, set_state, set_len, options, Terminator::excluded);
     text.length = with_walkers<Kind>(page, text, members, [&](auto walker, auto listed) {
@@ -70,7 +70,7 @@ Unit* token_call(const char* function, LXLocale* locale, Unit* str, uint32_t* st
   return locale_call(trace_unit, function, locale, options, LX_OPT_CHARS, kNone, [&](LocaleCall& call) -> Unit* {
     if (next != nullptr) *next = nullptr;
     if (str == nullptr) return kNone;
-    const CodePage& page = page_of(call);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> text = given_text<Kind>(page, str, state != nullptr ? *state : 0, len != nullptr ? *len : -1, options,
                                        Terminator::excluded);
     Text<Unit> set = given_text<Kind>(page, delims, delims_state, delims_len, options, Terminator::excluded);

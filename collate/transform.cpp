@@ -178,7 +178,7 @@ int32_t transform_call(const char* function, LXLocale* locale, void* key, int32_
   return locale_call(trace_unit, function, locale, options, kAny, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     uint32_t transform = options & ~LX_OPT_CHARS;
     if (!is_transform(transform)) return call.fail(LX_E_ARGUMENT, -1);
-    Text<Unit> text = given_text<Kind>(page_of(call), str, state, length, options, Terminator::excluded);
+    Text<Unit> text = given_text<Kind>(page_of(call.locale), str, state, length, options, Terminator::excluded);
     size_t size = key != nullptr && key_size > 0 ? static_cast<size_t>(key_size) : 0;
     return transform_text<Kind>(call, static_cast<uint8_t*>(key), size, text, transform);
   });
@@ -209,7 +209,7 @@ int32_t make_key(const SortTables& sort, uint8_t* key, size_t size, const LXUCha
 template <class Kind>
 int32_t transform_text(LocaleCall& call, uint8_t* key, size_t size, const Text<typename Kind::Unit>& text,
                        uint32_t options) {
-  const CodePage& page = page_of(call);
+  const CodePage& page = page_of(call.locale);
   const SortTables* sort = sort_of(call.locale);
   if (text.length == 0) {
     if (size == 0) return 0;
@@ -270,7 +270,7 @@ int32_t LXStrGenSortKey(LXLocale* locale, void* key, int32_t key_size, const LXU
   return locale_call(trace_unit, __func__, locale, 0, 0, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     const SortTables* sort = sort_of(call.locale);
     if (sort == nullptr) return call.fail(LX_E_ARGUMENT, -1);
-    Text<LXUChar> text = given_text<Ucs2Kind>(page_of(call), chars, 0, count, 0, Terminator::excluded);
+    Text<LXUChar> text = given_text<Ucs2Kind>(page_of(call.locale), chars, 0, count, 0, Terminator::excluded);
     size_t size = key != nullptr && key_size > 0 ? static_cast<size_t>(key_size) : 0;
     int32_t length = make_key(*sort, static_cast<uint8_t*>(key), size, text.at, text.length);
     return length >= 0 ? length : call.fail(LX_E_MEMORY, -1);

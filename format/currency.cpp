@@ -61,7 +61,7 @@ class Amount {
 
   Amount(const LXLocale& locale, double amount, uint32_t flags)
       : locale_(locale),
-        page_(code_page_of(*locale.code_page)),
+        page_(page_of(locale)),
         spelling_(spelling_of<Kind>(page_)),
         flags_(flags),
         international_((flags & LX_NUM_INTLSYM) != 0),

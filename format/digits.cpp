@@ -31,7 +31,7 @@ int32_t digit_call(const char* function, LXLocale* locale, const Unit* string, u
   *position = string;
   if (new_state != nullptr) *new_state = state;
   return locale_call(trace_unit, function, locale, flags, LX_NUM_FULLWIDTH, kNoDigit, [&](LocaleCall& call) {
-    const CodePage& page = code_page_of(*call.locale.code_page);
+    const CodePage& page = page_of(call.locale);
     if (string == nullptr) return kNoDigit;
     Text<Unit> text = {string, length < 0 ? measured_length(string) : static_cast<size_t>(length), state};
     return Kind::with_walker(page, text, [&](auto walker) {

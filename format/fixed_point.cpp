@@ -99,7 +99,7 @@ template <class Kind, class Unit = typename Kind::Unit>
 int32_t write_double(LocaleCall& call, double value, const Destination<Unit>& to) {
   if (to.empty()) return call.fail(LX_E_BUFFER, 0);
   constexpr NumberItems kItems = {LX_ITEM_DECIMAL, LX_ITEM_THOUSANDS, LX_ITEM_GROUPING, LX_ITEM_FRACTION_DIGITS};
-  const CodePage& page = code_page_of(*call.locale.code_page);
+  const CodePage& page = page_of(call.locale);
   const FixedPoint number(value);
   Output<Unit> out(to.buffer, to.room());
   out.widen(character_width<Kind>(page, to));

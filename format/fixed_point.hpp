@@ -66,7 +66,7 @@ class FixedPointText {
     Grouping<Kind> grouping(locale, items.thousands, items.grouping, options);
     zero_ = grouping.spelled('0');
     if (!value.finite()) {
-      put_letters(WideWriter(code_page_of(*locale.code_page), nullptr, 0), value.integer());
+      put_letters(WideWriter(page_of(locale), nullptr, 0), value.integer());
       return;
     }
     using TextKind = typename Grouping<Kind>::TextKind;

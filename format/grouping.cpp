@@ -18,7 +18,7 @@ int32_t next_size(const Spelling& spelling, const Unit* grouping, int32_t* remai
 template <class Kind, class Unit = typename Kind::Unit>
 int32_t size_call(const char* function, LXLocale* locale, const Unit* grouping, int32_t* remaining, const Unit** next) {
   return locale_call(trace_unit, function, locale, 0, 0, int32_t{-1}, [&](LocaleCall& call) {
-    return next_size(spelling_of<Kind>(code_page_of(*call.locale.code_page)), grouping, remaining, next);
+    return next_size(spelling_of<Kind>(page_of(call.locale)), grouping, remaining, next);
   });
 }
 

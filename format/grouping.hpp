@@ -39,7 +39,7 @@ class Grouping {
   static constexpr size_t kRest = SIZE_MAX;  // a group of all digits that are left
 
   Grouping(const LXLocale& locale, uint32_t separator_item, uint32_t grouping_item, uint32_t options)
-      : spelling(spelling_of<Kind>(code_page_of(*locale.code_page))),
+      : spelling(spelling_of<Kind>(page_of(locale))),
         separator(local_separator<TextKind>(locale, separator_item, options)),
         text_(locale, grouping_item, options),
         at_(separator != 0 ? text_.begin() : nullptr),

@@ -21,7 +21,7 @@ size_t characters_behind(const CodePage& page, const Destination<Unit>& to, size
 template <class Kind, class Unit = typename Kind::Unit>
 int32_t write_integer(LocaleCall& call, int32_t value, const Destination<Unit>& to) {
   if (to.empty()) return call.fail(LX_E_BUFFER, 0);
-  const CodePage& page = code_page_of(*call.locale.code_page);
+  const CodePage& page = page_of(call.locale);
   const bool negative = value < 0 && (to.flags & LX_NUM_UNSIGNED) == 0;
   const auto magnitude = static_cast<uint32_t>(value);
 

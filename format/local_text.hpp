@@ -32,7 +32,7 @@ class LocalText {
   // What needs no conversion. Characters of one byte are stored as that byte in all forms but UCS-2.
   bool take_bytes(const LXLocale& locale, uint32_t number) {
     const Item& item = item_of(number);
-    const CodePage& page = code_page_of(*locale.code_page);
+    const CodePage& page = page_of(locale);
     if (item.kind != ItemKind::string || page.shift_sensitive || locale.strings[item.index] == nullptr) return false;
     size_t length = 0;
     for (const uint8_t* text = bytes_of(locale.strings[item.index]); text[length] != 0; ++length) {
@@ -63,7 +63,7 @@ template <class Kind>
 typename Kind::Unit local_separator(const LXLocale& locale, uint32_t item, uint32_t options) {
   if ((options & LX_NUM_TEXTOPT) == 0) {
     const unsigned index = item_of(item).index;
-    [[maybe_unused]] const CodePage& page = code_page_of(*locale.code_page);
+    [[maybe_unused]] const CodePage& page = page_of(locale);
     const LXUChar character = locale.ucs2_separators[index];
     if constexpr (std::same_as<Kind, Ucs2Kind>) {
       return character;

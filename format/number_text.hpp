@@ -32,7 +32,7 @@ auto read_number(const LXLocale& locale, const NumberText<typename Kind::Unit>& 
   using Unit = typename Kind::Unit;
   using Code = std::conditional_t<Kind::kBytes, uint8_t, Unit>;
   constexpr size_t kSignRoom = 32;
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   if constexpr (Kind::kShifted) {
     if (!page.shift_sensitive) return read_number<PlainKind>(locale, given, decimal, flags, read);
   }

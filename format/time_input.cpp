@@ -14,7 +14,7 @@ int32_t string_to_time(const char* function, LXLocale* locale, LXTime* time, con
   constexpr uint32_t kFlags = LX_NUM_TEXTOPT | LX_NUM_CHARLEN;
   return locale_call(trace_unit, function, locale, flags, kFlags, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     if (time == nullptr || string == nullptr || format == nullptr) return call.fail(LX_E_ARGUMENT, -1);
-    const CodePage& page = code_page_of(*call.locale.code_page);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> text = text_of_call<Kind>(page, string, state, length, flags);
     Text<Unit> directives = text_of_call<Kind>(page, format, format_state, format_length, flags);
     if (text.length == 0 || directives.length == 0) return 0;
@@ -60,7 +60,7 @@ uint32_t extract_time(const char* function, LXLocale* locale, LXTime* time, cons
                       const Reading<Kind>& format, int32_t* afternoon, int32_t ascii, uint32_t flags) {
   return locale_call(trace_unit, function, locale, 0, 0, LX_E_ARGUMENT, [&](LocaleCall& call) -> uint32_t {
     if (time == nullptr || !from.given() || !format.given()) return call.status = LX_E_ARGUMENT;
-    const CodePage& page = code_page_of(*call.locale.code_page);
+    const CodePage& page = page_of(call.locale);
     TimeReader<Kind> reader(call.locale, *time, ascii != 0, flags);
     bool is_afternoon = afternoon != nullptr && *afternoon != 0;
     return Kind::with_walker(page, from.rest(), [&](auto text) {
@@ -113,7 +113,7 @@ int32_t read_word_call(const char* function, LXLocale* locale, uint32_t* error, 
   int32_t found = locale_call(trace_unit, function, locale, 0, 0, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     call.status = status;
     if (!from.given()) return -1;
-    const CodePage& page = code_page_of(*call.locale.code_page);
+    const CodePage& page = page_of(call.locale);
     return Kind::with_walker(page, from.rest(), [&](auto walker) {
       auto begin = walker;
       int32_t index = read_word<Kind>(call.locale, walker, first_item, count, text_option);
@@ -205,7 +205,7 @@ int32_t LXStrReadNumberEx(LXLocale* locale, uint32_t* error, const char* string,
   Reading<ShiftedKind> from = {string, state, position, length};
   uint32_t status = LX_E_ARGUMENT;
   int32_t value = locale_call(trace_unit, __func__, locale, 0, 0, int32_t{-1}, [&](LocaleCall& call) {
-    return ShiftedKind::with_walker(code_page_of(*call.locale.code_page), from.rest(), [&](auto walker) {
+    return ShiftedKind::with_walker(page_of(call.locale), from.rest(), [&](auto walker) {
       int32_t number = read_number_at(from, walker, max_digits, max_value, ascii != 0, status);
       call.status = status;
       return number;

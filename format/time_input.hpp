@@ -37,7 +37,7 @@ template <class Kind, class Walker>
 class LongestName {
  public:
   LongestName(const LXLocale& locale, const Walker& text)
-      : page_(code_page_of(*locale.code_page)), codes_(page_, nullptr, 0), text_(text), end_(text) {}
+      : page_(page_of(locale)), codes_(page_, nullptr, 0), text_(text), end_(text) {}
 
   // Behind the longest name so far.
   const Walker& end() const { return end_; }
@@ -112,7 +112,7 @@ class TimeReader {
       : locale_(locale),
         time_(time),
         zero_((ascii ? kAsciiSpelling : kEbcdicSpelling).zero),
-        codes_(DirectiveCodes::of<Kind>(code_page_of(*locale.code_page), ascii)),
+        codes_(DirectiveCodes::of<Kind>(page_of(locale), ascii)),
         text_option_(text_option) {}
 
   const DirectiveCodes& codes() const { return codes_; }

@@ -14,7 +14,7 @@ constexpr uint32_t kFlags = LX_NUM_TEXTOPT | LX_NUM_TERMINATE | LX_NUM_CHARLEN;
 template <class Kind>
 uint32_t write_time(const LXLocale& locale, const LXTime& time, const Text<typename Kind::Unit>& format, uint32_t flags,
                     TimeOutput<Kind>& out) {
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   uint32_t option = flags & LX_NUM_TEXTOPT;
   TimeWriter<Kind> writer(locale, time, spelling_of<Kind>(page).ascii, option, option);
   uint32_t status = Kind::with_walker(page, format, [&](auto walker) { return writer.write(walker, out); });
@@ -30,7 +30,7 @@ int32_t write_characters(LocaleCall& call, const LXTime& time, char* buffer, uin
   constexpr size_t kArea = 512;
   constexpr size_t kLongestCharacter = 6;
   char area[kArea] = {};
-  const CodePage& page = code_page_of(*call.locale.code_page);
+  const CodePage& page = page_of(call.locale);
   size_t terminator = (flags & LX_NUM_TERMINATE) != 0 ? 1 : 0;
   size_t wanted = static_cast<size_t>(length) - terminator;
   size_t room = std::min(static_cast<size_t>(length) * kLongestCharacter, kArea) - terminator;
@@ -59,7 +59,7 @@ int32_t time_to_string(const char* function, LXLocale* locale, const LXTime* tim
     if ((flags & ~kFlags) != 0 || time == nullptr || format == nullptr) return call.fail(LX_E_ARGUMENT, -1);
     if (length <= 0 || buffer == nullptr) return call.fail(LX_E_BUFFER, 0);
 
-    const CodePage& page = code_page_of(*call.locale.code_page);
+    const CodePage& page = page_of(call.locale);
     Text<Unit> text = text_of_call<Kind>(page, format, format_state, format_length, flags);
     if constexpr (Kind::kBytes) {
       if ((flags & LX_NUM_CHARLEN) != 0) return write_characters<Kind>(call, *time, buffer, state, length, text, flags);
@@ -105,7 +105,7 @@ uint32_t expand_time(const char* function, LXLocale* locale, const LXTime* time,
   return status_call(function, locale, [&](LocaleCall& call) -> uint32_t {
     if (!to.given() || time == nullptr || format == nullptr || format_position == nullptr || *format_position < 0)
       return LX_E_ARGUMENT;
-    const CodePage& page = code_page_of(*call.locale.code_page);
+    const CodePage& page = page_of(call.locale);
     TimeOutput<Kind> out = to.output(&page);
     TimeWriter<Kind> writer(call.locale, *time, ascii != 0, text_option, flags & LX_NUM_TEXTOPT);
     const Unit* at = format + *format_position;
@@ -128,7 +128,7 @@ uint32_t write_word_call(const char* function, LXLocale* locale, const Filling<K
                          uint32_t text_option) {
   return status_call(function, locale, [&](LocaleCall& call) -> uint32_t {
     if (!to.given()) return LX_E_ARGUMENT;
-    TimeOutput<Kind> out = to.output(&code_page_of(*call.locale.code_page));
+    TimeOutput<Kind> out = to.output(&page_of(call.locale));
     return to.moved(out, write_word(out, call.locale, item, text_option));
   });
 }
@@ -244,8 +244,8 @@ uint32_t LXStrWriteNumberU(LXUChar* buffer, int32_t* position, int32_t length, i
 uint32_t LXStrWriteNumberEx(LXLocale* locale, char* buffer, uint32_t* state, int32_t* position, int32_t length,
                             int32_t value, int32_t width, int32_t ascii, int32_t alternate) noexcept {
   return status_call(__func__, locale, [&](LocaleCall& call) {
-    return write_number_to<ShiftedKind>({buffer, state, position, length}, &code_page_of(*call.locale.code_page), value,
-                                        width, ascii, alternate);
+    return write_number_to<ShiftedKind>({buffer, state, position, length}, &page_of(call.locale), value, width, ascii,
+                                        alternate);
   });
 }
 

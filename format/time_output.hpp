@@ -194,7 +194,7 @@ class TimeWriter {
   // Formats of the locale take their texts by `nested_option`.
   TimeWriter(const LXLocale& locale, const LXTime& time, bool ascii, uint32_t text_option, uint32_t nested_option)
       : locale_(locale),
-        page_(code_page_of(*locale.code_page)),
+        page_(page_of(locale)),
         time_(time),
         spelling_(ascii ? kAsciiSpelling : kEbcdicSpelling),
         codes_(DirectiveCodes::of<Kind>(page_, ascii)),

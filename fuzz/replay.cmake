@@ -7,6 +7,6 @@ foreach(target ${LEXARO_FUZZ_TARGETS})
   add_executable(${name} ${LEXARO_FUZZ_FOLDER}/${target}.cpp ${LEXARO_FUZZ_FOLDER}/replay_main.cpp
     ${LEXARO_FUZZ_SUPPORT})
   lexaro_fuzz_properties(${name})
-  add_test(NAME ${name} COMMAND ${name} ${LEXARO_FUZZ_FOLDER}/seeds/${target})
+  add_test(NAME ${name} COMMAND ${name} ${LEXARO_FUZZ_FOLDER}/../tests/faults/seeds/${target})
   set_tests_properties(${name} PROPERTIES TIMEOUT 300)
 endforeach()

@@ -33,7 +33,7 @@ bool usable(const LXObjEntry* entry, uint8_t type) {
 uint32_t carry_string(LXLocale& locale, const Item& item, const LXObjEntry& old_page, const char* old_text) {
   if (!is_set(locale, item)) return fill_string(locale, item);
   Owned<char> text = (locale.mirror_bits & item.mirror_bit) != 0
-                         ? text_in_page(code_page_of(*locale.code_page), locale.ucs2_strings[item.index])
+                         ? text_in_page(page_of(locale), locale.ucs2_strings[item.index])
                          : Owned<char>(LXLocaleCnvText(&old_page, locale.code_page, old_text));
   locale.strings[item.index] = text.give_up();
   return locale.strings[item.index] != nullptr ? LX_OK : LX_E_MEMORY;

@@ -102,7 +102,7 @@ uint32_t read_text(const LXLocale& locale, uint32_t number, const TextTarget<Uni
     text.ucs2 = name;
   }
 
-  const CodePage& own = code_page_of(*locale.code_page);
+  const CodePage& own = page_of(locale);
   const CodePage& wanted = to.page != nullptr ? *to.page : own;
   bool separator = item.kind == ItemKind::separator;
   bool plain = std::same_as<Unit, char> && !to.shifts.followed;

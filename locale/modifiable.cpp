@@ -19,7 +19,7 @@ uint32_t fill_item(LXLocale& locale, const TerritoryHeader& territory, const Ite
       return LX_OK;
     case ItemKind::separator:
       locale.ucs2_separators[item.index] = territory.separators[item.index];
-      locale.separators[item.index] = separator_byte(code_page_of(*locale.code_page), territory.separators[item.index]);
+      locale.separators[item.index] = separator_byte(page_of(locale), territory.separators[item.index]);
       return LX_OK;
     case ItemKind::string:
       return fill_string(locale, item);
@@ -65,7 +65,7 @@ Owned<char> text_in_page(const CodePage& page, const LXUChar* text) {
 
 uint32_t fill_string(LXLocale& locale, const Item& item) {
   const LXUChar* text = territory_text(*locale.territory, static_cast<TerritoryText>(item.given));
-  Owned<char> copy = text_in_page(code_page_of(*locale.code_page), text);
+  Owned<char> copy = text_in_page(page_of(locale), text);
   if (!copy) return LX_E_MEMORY;
   TRC1_Sync(&trace_unit);
   if (item.index == item_of(LX_ITEM_CURRENCY).index) {
@@ -77,7 +77,7 @@ uint32_t fill_string(LXLocale& locale, const Item& item) {
 }
 
 void note_code_page(LXLocale& locale) {
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   unsigned flags = locale.flags & ~unsigned{kLocaleSingleByte | kLocaleShiftSensitive};
   if (page.max_length == 1) flags |= kLocaleSingleByte;
   if (page.shift_sensitive) flags |= kLocaleShiftSensitive;

@@ -50,7 +50,7 @@ uint32_t take_grouping(LXLocale& locale, uint32_t number, const char* sizes) {
     length += static_cast<size_t>(added);
   }
   text[length++] = '0';
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   for (size_t i = 0; i < length; ++i) text[i] = separator_byte(page, static_cast<uint8_t>(text[i]));
   return store_string(locale, item_of(number), {text, length});
 }
@@ -60,7 +60,7 @@ void take_separator(LXLocale& locale, uint32_t number, const char* text) {
   if (std::strlen(text) != 1) return;
   unsigned index = item_of(number).index;
   locale.separators[index] = *text;
-  locale.ucs2_separators[index] = code_page_of(*locale.code_page).to_unicode[static_cast<uint8_t>(*text)];
+  locale.ucs2_separators[index] = page_of(locale).to_unicode[static_cast<uint8_t>(*text)];
 }
 
 uint32_t take_text(LXLocale& locale, uint32_t number, const char* text) {

@@ -28,9 +28,9 @@ int32_t get_number(LocaleCall& call, uint32_t number, bool own) {
     case ItemKind::territory_number:
       return given_number(territory, item);
     case ItemKind::page_max_length:
-      return code_page_of(*locale.code_page).max_length;
+      return page_of(locale).max_length;
     case ItemKind::page_ascii_family:
-      return code_page_of(*locale.code_page).ascii_family;
+      return page_of(locale).ascii_family;
     case ItemKind::page_shift_sensitive:
       return (locale.flags & kLocaleShiftSensitive) != 0;
     default:

@@ -40,7 +40,7 @@ bool to_ascii(const CodePage& page, const GivenText& text, size_t length, char* 
 }
 
 uint32_t set_object_by_name(LXLocale& locale, uint8_t type, const GivenText& text) {
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   size_t length = std::min(text.length, kNameLimit);
   const char* name = text.bytes;
   char ascii[kNameLimit];
@@ -71,7 +71,7 @@ bool acceptable(const LXLocale& locale, const CodePage& page, uint32_t number, c
 
 uint32_t set_separator(LXLocale& locale, uint32_t number, const GivenText& text) {
   const Item& item = item_of(number);
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   if (!acceptable(locale, page, number, text)) return LX_E_NOTFOUND;
   char byte = *text.bytes;
   locale.separators[item.index] = byte;
@@ -149,7 +149,7 @@ int32_t set_call(const char* function, LXLocale* locale, uint32_t number, const 
 // Characters as UCS-2 become bytes of the locale's page. Where these do not tell the characters, on shift-sensitive
 // pages, the characters go along: as the page has them, like on other pages.
 uint32_t set_characters(LXLocale& locale, uint32_t number, const LXUChar* ucs2, size_t count) {
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   auto bytes = Owned<char>::array(count * page.max_length + 1);
   auto characters = Owned<LXUChar>::array(page.shift_sensitive ? count + 1 : 1);
   if (!bytes || !characters) return LX_E_MEMORY;
@@ -184,7 +184,7 @@ uint32_t set_read(LXLocale& locale, uint32_t number, In in, size_t limit) {
 }
 
 uint32_t set_wide(LXLocale& locale, uint32_t number, const Source<LXWChar>& source) {
-  const CodePage& page = code_page_of(*locale.code_page);
+  const CodePage& page = page_of(locale);
   WideReader in(page, source.text, source.length);
   if (page.shift_sensitive) return set_read(locale, number, in, source.length);
   // Packed characters are the page's own bytes: the way through UCS-2 might find other codes for them.
@@ -199,7 +199,7 @@ uint32_t set_wide(LXLocale& locale, uint32_t number, const Source<LXWChar>& sour
 }
 
 uint32_t set_bytes(LXLocale& locale, uint32_t number, const char* text, int32_t length, uint32_t options) {
-  Source<uint8_t> source = byte_source(code_page_of(*locale.code_page), text, {}, length, options);
+  Source<uint8_t> source = byte_source(page_of(locale), text, {}, length, options);
   return set_text(locale, number, {text, source.length});
 }
 
@@ -210,7 +210,7 @@ uint32_t store_string(LXLocale& locale, const Item& item, const GivenText& given
   size_t length = given.length;
   size_t characters = given.characters;
   if (given.ucs2 == nullptr) {
-    length = whole_characters(code_page_of(*locale.code_page), given.bytes, given.length, characters);
+    length = whole_characters(page_of(locale), given.bytes, given.length, characters);
   }
   Owned<char> text;
   Owned<LXUChar> mirror;

@@ -13,8 +13,6 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "catalog", 0};
 
-const CodePage& page_of(const LXLocale& locale) { return code_page_of(*locale.code_page); }
-
 // ---- Opening ----
 
 LXCatalog* open_catalog(LocaleCall& call, const char* directory, const char* name, uint32_t flags) {

@@ -63,7 +63,7 @@ class ByteText {
 class Search {
  public:
   Search(LXLocale& locale, const char* name)
-      : locale_(locale), page_(code_page_of(*locale.code_page)), name_(name), name_length_(std::strlen(name)) {}
+      : locale_(locale), page_(page_of(locale)), name_(name), name_length_(std::strlen(name)) {}
 
   uint32_t status() const { return status_; }
   // Once through all the lists, with the language and territory of that locale.

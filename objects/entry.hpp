@@ -33,5 +33,6 @@ inline bool is_loaded_code_page(const LXObjEntry* entry) {
 bool drop_pairs(LXObjMgr& manager);
 
 inline const CodePage& code_page_of(const LXObjEntry& entry) { return *entry.code_page; }
+inline const CodePage& page_of(const LXLocale& locale) { return code_page_of(*locale.code_page); }
 
 }  // namespace lx

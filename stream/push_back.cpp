@@ -28,7 +28,7 @@ template <class Put>
 int32_t push_back_call(const char* function, LXStream* stream, LXLocale* locale, Put put) {
   return stream_call(trace_unit, function, stream, locale, Direction::read, int32_t{0},
                      [&](LocaleCall& call, LXStream& open) -> int32_t {
-                       return put(open, page_of(call)) ? 1 : call.fail(LX_E_BUFFER, 0);
+                       return put(open, page_of(call.locale)) ? 1 : call.fail(LX_E_BUFFER, 0);
                      });
 }
 

@@ -44,7 +44,7 @@ Result read_packed(const char* function, LXStream* stream, LXLocale* locale, uin
   return stream_call(trace_unit, function, stream, locale, Direction::read, failure,
                      [&](LocaleCall& call, LXStream& open) {
                        StreamCharacter character;
-                       if (!read_character(open, page_of(call), character, call.status)) return failure;
+                       if (!read_character(open, page_of(call.locale), character, call.status)) return failure;
                        if (state != nullptr) *state = character.double_byte ? 1 : 0;
                        return character.code;
                      });

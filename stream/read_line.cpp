@@ -141,7 +141,7 @@ int32_t read_line(const char* function, LXStream* stream, LXLocale* locale, Unit
       trace_unit, function, stream, locale, Direction::read, kFailed,
       [&](LocaleCall& call, LXStream& open) -> int32_t {
         if (buffer == nullptr && size > 0) return call.fail(LX_E_ARGUMENT, kFailed);
-        return LineReader<Kind>(open, page_of(call), buffer, size, flags).read(call.status);
+        return LineReader<Kind>(open, page_of(call.locale), buffer, size, flags).read(call.status);
       },
       flags, kFlags);
 }

@@ -145,7 +145,7 @@ LXStream* LXOpenStream(LXLocale* locale, LXTransferFn routine, void* context, ui
 int32_t LXCloseStream(LXStream* stream, LXLocale* locale, uint32_t /*reserved*/) noexcept {
   return locale_call(trace_unit, __func__, locale, 0, 0, int32_t{0}, [&](LocaleCall& call) -> int32_t {
     if (stream == nullptr) return call.fail(LX_E_ARGUMENT, 0);
-    if (stream->writes) call.status = finish(*stream, page_of(call));
+    if (stream->writes) call.status = finish(*stream, page_of(call.locale));
     if (!release(stream) && call.status == LX_OK) call.status = LX_E_FREE;
     return call.status == LX_OK ? 1 : 0;
   });
@@ -154,7 +154,7 @@ int32_t LXCloseStream(LXStream* stream, LXLocale* locale, uint32_t /*reserved*/)
 int32_t LXFlushStream(LXStream* stream, LXLocale* locale, uint32_t /*reserved*/) noexcept {
   return stream_call(trace_unit, __func__, stream, locale, Direction::write, int32_t{0},
                      [](LocaleCall& call, LXStream& open) {
-                       call.status = flush(open, page_of(call));
+                       call.status = flush(open, page_of(call.locale));
                        return call.status == LX_OK ? 1 : 0;
                      });
 }

@@ -30,8 +30,6 @@ struct StreamCharacter : Character {
   bool double_byte = false;
 };
 
-inline const CodePage& page_of(const LocaleCall& call) { return code_page_of(*call.locale.code_page); }
-
 inline bool is_shift(const CodePage& page, uint8_t byte) {
   return page.shift_sensitive && (byte == page.enter_byte || byte == page.leave_byte);
 }

@@ -26,7 +26,7 @@ template <class Put>
 int32_t write_call(const char* function, LXStream* stream, LXLocale* locale, Put put) {
   return stream_call(trace_unit, function, stream, locale, Direction::write, int32_t{0},
                      [&](LocaleCall& call, LXStream& open) {
-                       call.status = put(open, page_of(call));
+                       call.status = put(open, page_of(call.locale));
                        return call.status == LX_OK ? 1 : 0;
                      });
 }
