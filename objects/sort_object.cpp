@@ -86,6 +86,12 @@ bool SortTables::combination_of(uint16_t first, uint16_t second, Weights& weight
   return true;
 }
 
+static bool weighs(const Weights& weights) {
+  return std::any_of(weights.sets, weights.sets + weights.count, [](const WeightSet& set) {
+    return set.primary != 0 || set.secondary != 0 || set.tertiary != 0 || set.special != 0;
+  });
+}
+
 const SortTables* build_sort_tables(const uint8_t* checked_section) {
   using Index = SortTables::Index;
   const auto& header = *reinterpret_cast<const SortHeader*>(checked_section);
@@ -107,12 +113,14 @@ const SortTables* build_sort_tables(const uint8_t* checked_section) {
   tables->expansion_index_ = index;
   tables->combination_index_ = index + expansions;
 
+  tables->ascii_in_order = true;
   for (uint32_t& bits : tables->beginnings_) bits = 0;
   for (uint32_t i = 0; i < expansions; ++i) index[i] = {tables->expansions_[i].character, i};
   for (uint32_t i = 0; i < combinations; ++i) {
     const SortCombination& row = tables->combinations_[i];
     index[expansions + i] = {uint32_t{row.first} << 16 | row.second, i};
     tables->beginnings_[row.first >> 5 & 7] |= 1u << (row.first & 31);
+    if (row.first < 0x80 && single(row.weight).mask != kAllInOrder) tables->ascii_in_order = false;
   }
   auto in_order = [](const Index& a, const Index& b) { return a.key != b.key ? a.key < b.key : a.number < b.number; };
   for (Index* part : {index, index + expansions}) {
@@ -120,7 +128,6 @@ const SortTables* build_sort_tables(const uint8_t* checked_section) {
     if (!std::is_sorted(part, end, in_order)) std::sort(part, end, in_order);
   }
 
-  tables->ascii_in_order = true;
   for (unsigned i = 0; i < SortTables::kQuickCharacters; ++i) {
     auto character = static_cast<uint16_t>(i);
     Weights weights = tables->weights_of(character);
@@ -132,7 +139,7 @@ const SortTables* build_sort_tables(const uint8_t* checked_section) {
     tables->quick[i] = plain     ? uint32_t{set.primary} << 16 | uint32_t{set.secondary} << 8 | set.tertiary
                        : special ? uint32_t{set.special} << 16
                                  : 0;
-    if (i < 0x80 && weights.count != 0 && weights.mask != kAllInOrder) tables->ascii_in_order = false;
+    if (i < 0x80 && weighs(weights) && weights.mask != kAllInOrder) tables->ascii_in_order = false;
   }
   return tables;
 }

@@ -42,7 +42,7 @@ class SortTables {
 
   uint8_t default_secondary;
   uint8_t default_tertiary;
-  bool ascii_in_order;  // no ASCII character has weights that count from the end
+  bool ascii_in_order;  // no ASCII character, or pair that one begins, counts from the end
 
   bool has_combinations() const { return combination_count_ != 0; }
   bool may_begin_combination(uint16_t character) const {

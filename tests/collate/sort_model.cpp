@@ -56,7 +56,7 @@ Bytes SortSpec::section() const {
   return image.bytes();
 }
 
-SortSpec test_sort(bool combinations) {
+SortSpec test_sort(const std::string& name) {
   SortSpec sort;
   sort.pages[0x00] = sort.pages[0x01] = sort.pages[0x03] = {0, 0, 0};
   sort.pages[0x30] = {kPrimaryPage, 15, 0x3000};
@@ -105,12 +105,17 @@ SortSpec test_sort(bool combinations) {
                      {u'x', {0x0999, 0x20, 2}, {0x0999, 0x21, 2}},
                      {u'w', {0, 0x33, 0}, {0x0112, 0, 2}}};
   sort.combinations = {{u'c', u'b', {0x0115, 0x20, 2, kAll}},
+                       {u'c', u'B', {0x0111, 0x20, 2, kAll}},  // before both of its letters
                        {u'c', u'c', {0x0113, 0x26, 5, mask_flags(0xB)}},
                        {u'c', u'-', {0x0040, 1, 1, kIsSpecial | kExpands | kAll}},
                        {u'c', u'b', {0x0999, 0x20, 2, kAll}},
                        {u'a', 0x3041, {0x0111, 0x26, 5, mask_flags(0x1)}},
                        {u'c', 0xFFFF, {0x0111, 0x20, 2, kAll}}};
-  if (!combinations) sort.combinations.clear();
+  if (name == "Plain") sort.combinations.clear();
+  if (name == "Forward") {
+    for (auto& [character, entry] : sort.entries) entry.flags |= kAll;
+    for (SortSpec::Combination& pair : sort.combinations) pair.entry.flags |= kAll;
+  }
   return sort;
 }
 
@@ -125,9 +130,9 @@ void write_collation_directory(const DataDirectory& directory) {
     std::string name = directory.object_name(record.type, record.id);
     std::filesystem::copy_file(std::string(LEXARO_DATA) + "/" + name, directory.file(name));
   }
-  for (uint16_t id : {uint16_t{77}, uint16_t{78}}) {
-    records.push_back({LX_SORT, id, id == 77 ? "Plain" : "Combining"});
-    directory.write_object(LX_SORT, id, test_sort(id == 78).file());
+  for (const auto& [id, name] : {std::pair(uint16_t{77}, "Plain"), {78, "Combining"}, {79, "Forward"}}) {
+    records.push_back({LX_SORT, id, name});
+    directory.write_object(LX_SORT, id, test_sort(name).file());
   }
   directory.write_control(records);
 }
@@ -312,7 +317,7 @@ int model_compare(ModelReader first, ModelReader second) {
 
 Collation::Collation(Form::Kind kind, uint16_t page, const std::string& sort_name, LanguageIndex index)
     : form{kind, &PageSource::of(page)},
-      sort(test_sort(sort_name == "Combining")),
+      sort(test_sort(sort_name)),
       language(test_languages()[index]),
       name(language.name + form.name() + "@" + sort_name) {
   uint32_t rc = 99;

@@ -51,8 +51,9 @@ struct SortSpec {
 };
 
 // Every kind of character on a few letters, see the .cpp.
-SortSpec test_sort(bool combinations);
-// Both sorts, "Plain" and "Combining", beside some compiled languages and pages.
+SortSpec test_sort(const std::string& name);
+// The sorts "Plain", "Combining" (with pairs) and "Forward" (with pairs, nothing stored backwards), beside some
+// compiled languages and pages.
 void write_collation_directory(const DataDirectory& directory);
 
 // ---- Weights ----

@@ -48,6 +48,7 @@ compiler::Catalog read_catalog(const std::string& path) {
   InputFile input(path);
   std::vector<char> piece(64 * 1024);
   while (const std::size_t count = input.read(piece)) bytes.append(piece.data(), count);
+  if (!compiler::is_catalog(bytes)) throw bad_catalog(path, "this is no message catalog");
   try {
     return compiler::unpack_catalog(bytes);
   } catch (const compiler::StructureError& error) {
@@ -89,7 +90,7 @@ std::string on_one_line(const std::string& text) {
 ExitStatus run_catalog(const CatalogOptions& options, const CommonOptions& common) {
   const LibrarySession session(common.locale_directory);
   const compiler::Catalog content = read_catalog(options.file);
-  const LocalePtr locale = open_user_locale();
+  const LocalePtr locale = open_locale("English");  // texts come as UCS-2, so any will do
   const CatalogPtr catalog = open_catalog(locale.get(), options.file);
   OutputFile output("-");
   bool found = false;
