@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
-// A locale, a kind of text and options from the first bytes of the input; the rest is a text that holds a number. It
-// ends where its block of memory ends; results must stay inside and agree with each other.
+// A locale, a kind of text, what to do and options from the first bytes of the input. The rest is a text that holds a
+// number, or a value, a time, a format and a text that holds a time. Texts and rooms end where their blocks of memory
+// end; results must stay inside and agree with each other.
 #include <lexaro/lexaro.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstring>
 #include <memory>
@@ -63,10 +65,26 @@ class Library {
     // A count of characters that the text may not have would be the caller's mistake.
     flags_ = flags < 0x80 ? flags & 0x31u : uint32_t{flags} << 24 | (flags & 0x80);
     std::string_view text = input.rest().substr(0, kLongestText);
-    if (kind % 4 == 0) return read<char, false>(text, LXStringToLong, LXStringToDouble);
-    if (kind % 4 == 1) return read<char, true>(text, LXStringToLongEx, LXStringToDoubleEx);
-    if (kind % 4 == 2) return read<LXWChar, false>(text, LXStringToLongW, LXStringToDoubleW);
-    read<LXUChar, false>(text, LXStringToLongU, LXStringToDoubleU);
+    const bool write = (kind & 0x10) != 0;
+    if ((kind & 0x30) != 0) flags_ = flags & (write ? 0xC9u : 0x09u);
+    switch (kind % 4) {
+      case 0:
+        if (write) return values<char>(text, LXLongToString, LXDoubleToString, LXCurrencyToString);
+        if ((kind & 0x20) != 0) return times<char, false>(text, LXTimeToString, LXStringToTime);
+        return read<char, false>(text, LXStringToLong, LXStringToDouble);
+      case 1:
+        if (write) return states(text);
+        if ((kind & 0x20) != 0) return times<char, true>(text, LXTimeToStringEx, LXStringToTimeEx);
+        return read<char, true>(text, LXStringToLongEx, LXStringToDoubleEx);
+      case 2:
+        if (write) return values<LXWChar>(text, LXLongToStringW, LXDoubleToStringW, LXCurrencyToStringW);
+        if ((kind & 0x20) != 0) return times<LXWChar, false>(text, LXTimeToStringW, LXStringToTimeW);
+        return read<LXWChar, false>(text, LXStringToLongW, LXStringToDoubleW);
+      default:
+        if (write) return values<LXUChar>(text, LXLongToStringU, LXDoubleToStringU, LXCurrencyToStringU);
+        if ((kind & 0x20) != 0) return times<LXUChar, false>(text, LXTimeToStringU, LXStringToTimeU);
+        return read<LXUChar, false>(text, LXStringToLongU, LXStringToDoubleU);
+    }
   }
 
  private:
@@ -98,6 +116,66 @@ class Library {
     };
     twice(text, true, [&](auto... about) { return call(integer, about..., base_, flags_); });
     twice(text, false, [&](auto... about) { return call(decimal, about..., flags_); });
+  }
+
+  // A value or a whole record from the beginning of the bytes; zeros behind their end.
+  template <class Value>
+  static Value take(std::string_view& bytes) {
+    Value value{};
+    const size_t count = std::min(sizeof value, bytes.size());
+    std::memcpy(&value, bytes.data(), count);
+    bytes.remove_prefix(count);
+    return value;
+  }
+
+  // Writes into a block of just the room that the call is told.
+  template <class U, class Write>
+  void write_into(uint8_t room, Write write) {
+    std::unique_ptr<U[]> out(new U[room]);
+    const int32_t count = write(out.get(), int32_t{room});
+    demand(count >= -1 && count <= room, "more than the room");
+    demand(count >= 0 || LXGetError(l_) == LX_E_ARGUMENT, "failure without a reason");
+  }
+
+  template <class U, class Integer, class Decimal, class Currency>
+  void values(std::string_view bytes, Integer integer, Decimal decimal, Currency currency) {
+    const auto room = take<uint8_t>(bytes);
+    const auto number = take<int32_t>(bytes);
+    const auto value = take<double>(bytes);
+    write_into<U>(room, [&](U* out, int32_t size) { return integer(l_, number, out, size, flags_); });
+    write_into<U>(room, [&](U* out, int32_t size) { return decimal(l_, value, out, size, flags_); });
+    write_into<U>(room, [&](U* out, int32_t size) { return currency(l_, value, out, size, flags_); });
+  }
+  void states(std::string_view bytes) {
+    auto with_state = [this](auto function) {
+      return [this, function](LXLocale* l, auto value, char* out, int32_t size, uint32_t flags) {
+        return function(l, value, out, state_, size, flags);
+      };
+    };
+    values<char>(bytes, with_state(LXLongToStringEx), with_state(LXDoubleToStringEx), with_state(LXCurrencyToStringEx));
+  }
+
+  template <class U, bool kStates, class ToString, class ToTime>
+  void times(std::string_view bytes, ToString to_string, ToTime to_time) {
+    const auto room = take<uint8_t>(bytes);
+    const auto format_bytes = take<uint8_t>(bytes);
+    LXTime time{};
+    for (int* field : {&time.tm_sec, &time.tm_min, &time.tm_hour, &time.tm_mday, &time.tm_mon, &time.tm_year,
+                       &time.tm_wday, &time.tm_yday}) {
+      *field = take<int8_t>(bytes);
+    }
+    const Text<U> format(bytes.substr(0, format_bytes));
+    const Text<U> text(bytes.substr(std::min<size_t>(format_bytes, bytes.size())));
+    write_into<U>(room, [&](U* out, int32_t size) {
+      if constexpr (kStates) return to_string(l_, &time, out, state_, size, format.at(), 0, format.length, flags_);
+      if constexpr (!kStates) return to_string(l_, &time, out, size, format.at(), format.length, flags_);
+    });
+    int32_t used = 0;
+    if constexpr (kStates)
+      used = to_time(l_, &time, text.at(), state_, text.length, format.at(), 0, format.length, flags_);
+    if constexpr (!kStates) used = to_time(l_, &time, text.at(), text.length, format.at(), format.length, flags_);
+    demand(used >= -1 && used <= text.length, "more than the text");
+    demand(used >= 0 || LXGetError(l_) != LX_OK, "failure without a reason");
   }
 
   std::vector<LXLocale*> locales_;
