@@ -1,9 +1,10 @@
 // SPDX-License-Identifier: Apache-2.0
-// Numbers and amounts written beside ICU, the C library and {fmt}. Exit status: 0; 1: a row is slower than the fastest
-// peer; 2: it could not be measured.
+// Numbers and amounts written beside ICU, the C library and {fmt}, and numbers read beside the first two. Exit status:
+// 0; 1: a row is slower than the fastest peer; 2: it could not be measured.
 #include <lexaro/lexaro.h>
 #include <monetary.h>
 #include <time.h>
+#include <unicode/unum.h>
 #include <unicode/unumberformatter.h>
 #include <unicode/ustring.h>
 #include <unicode/uvernum.h>
@@ -57,14 +58,26 @@ union Text {
   char16_t ucs2[kRoom];
 };
 
-// Each call returns the length of what it wrote, without a terminator; 0: the contender has no such thing.
+// A text to read, both forms with a zero behind them.
+struct Given {
+  std::string utf8;
+  std::u16string ucs2;
+};
+
+// Each call returns the length of what it wrote, without a terminator, or read; 0: the contender has no such thing.
 class Writer {
  public:
   virtual ~Writer() = default;
   virtual int32_t integer(Text& out, int32_t value) = 0;
   virtual int32_t number(Text& out, double value) = 0;  // with two fraction digits
   virtual int32_t money(Text& out, double value) = 0;
+  virtual int32_t read_integer(const Given& text) = 0;
+  virtual int32_t read_number(const Given& text) = 0;
 };
+
+int32_t length_of(const auto& text) { return static_cast<int32_t>(text.size()); }
+
+double value_read = 0;  // so that no compiler leaves the reading out
 using WriterPtr = std::unique_ptr<Writer>;
 
 class LexaroBytes : public Writer {
@@ -82,6 +95,16 @@ class LexaroBytes : public Writer {
   }
   int32_t money(Text& out, double value) override {
     return LXCurrencyToString(locale_.get(), value, out.bytes, kRoom, 0);
+  }
+  int32_t read_integer(const Given& text) override {
+    const char* end = nullptr;
+    value_read += LXStringToLong(locale_.get(), text.utf8.data(), length_of(text.utf8), &end, 10, 0);
+    return static_cast<int32_t>(end - text.utf8.data());
+  }
+  int32_t read_number(const Given& text) override {
+    const char* end = nullptr;
+    value_read += LXStringToDouble(locale_.get(), text.utf8.data(), length_of(text.utf8), &end, 0);
+    return static_cast<int32_t>(end - text.utf8.data());
   }
 
  protected:
@@ -103,9 +126,20 @@ class LexaroUcs2 : public LexaroBytes {
   int32_t money(Text& out, double value) override {
     return LXCurrencyToStringU(locale_.get(), value, units(out), kRoom, 0);
   }
+  int32_t read_integer(const Given& text) override {
+    const LXUChar* end = nullptr;
+    value_read += LXStringToLongU(locale_.get(), units(text), length_of(text.ucs2), &end, 10, 0);
+    return static_cast<int32_t>(end - units(text));
+  }
+  int32_t read_number(const Given& text) override {
+    const LXUChar* end = nullptr;
+    value_read += LXStringToDoubleU(locale_.get(), units(text), length_of(text.ucs2), &end, 0);
+    return static_cast<int32_t>(end - units(text));
+  }
 
  private:
   static LXUChar* units(Text& out) { return reinterpret_cast<LXUChar*>(out.ucs2); }
+  static const LXUChar* units(const Given& text) { return reinterpret_cast<const LXUChar*>(text.ucs2.data()); }
 };
 
 // The formatters and the place of the result are made once.
@@ -118,6 +152,7 @@ class Icu : public Writer {
         money_(open(country.currency, country)) {
     UErrorCode error = U_ZERO_ERROR;
     result_.reset(unumf_openResult(&error));
+    reader_.reset(unum_open(UNUM_DECIMAL, nullptr, 0, country.tag, nullptr, &error));
     if (U_FAILURE(error)) throw Failure(u_errorName(error));
   }
   int32_t integer(Text& out, int32_t value) override {
@@ -127,11 +162,24 @@ class Icu : public Writer {
   }
   int32_t number(Text& out, double value) override { return write(*number_, out, value); }
   int32_t money(Text& out, double value) override { return write(*money_, out, value); }
+  int32_t read_integer(const Given& text) override {
+    return read(text, [&](const char16_t* at, int32_t length, int32_t* end, UErrorCode* error) {
+      value_read += unum_parse(reader_.get(), at, length, end, error);
+    });
+  }
+  int32_t read_number(const Given& text) override {
+    return read(text, [&](const char16_t* at, int32_t length, int32_t* end, UErrorCode* error) {
+      value_read += unum_parseDouble(reader_.get(), at, length, end, error);
+    });
+  }
 
  private:
   struct Close {
     void operator()(UNumberFormatter* formatter) const { unumf_close(formatter); }
     void operator()(UFormattedNumber* result) const { unumf_closeResult(result); }
+  };
+  struct Reader {
+    void operator()(UNumberFormat* format) const { unum_close(format); }
   };
   using Formatter = std::unique_ptr<UNumberFormatter, Close>;
 
@@ -146,6 +194,20 @@ class Icu : public Writer {
     unumf_formatDouble(&formatter, value, result_.get(), &error);
     return take(out, error);
   }
+  template <class Parse>
+  int32_t read(const Given& text, Parse parse) {
+    char16_t converted[kRoom];
+    const char16_t* at = text.ucs2.data();
+    int32_t length = length_of(text.ucs2);
+    UErrorCode error = U_ZERO_ERROR;
+    if (!ucs2_) {
+      u_strFromUTF8(converted, kRoom, &length, text.utf8.data(), length_of(text.utf8), &error);
+      at = converted;
+    }
+    int32_t end = 0;
+    parse(at, length, &end, &error);
+    return U_FAILURE(error) ? 0 : end;
+  }
   int32_t take(Text& out, UErrorCode& error) {
     char16_t text[kRoom];
     int32_t length = unumf_resultToString(result_.get(), ucs2_ ? out.ucs2 : text, kRoom, &error);
@@ -158,6 +220,7 @@ class Icu : public Writer {
   Formatter number_;
   Formatter money_;
   std::unique_ptr<UFormattedNumber, Close> result_;
+  std::unique_ptr<UNumberFormat, Reader> reader_;
 };
 
 // Its functions take the locale of the thread.
@@ -179,6 +242,20 @@ class CLibrary : public Writer {
   int32_t money(Text& out, double value) override {
     return static_cast<int32_t>(strfmon(out.bytes, kRoom, "%n", value));
   }
+  int32_t read_integer(const Given& text) override {
+    int value = 0;
+    int length = 0;
+    std::sscanf(text.utf8.c_str(), "%'d%n", &value, &length);
+    value_read += value;
+    return length;
+  }
+  int32_t read_number(const Given& text) override {
+    double value = 0;
+    int length = 0;
+    std::sscanf(text.utf8.c_str(), "%'lf%n", &value, &length);
+    value_read += value;
+    return length;
+  }
 
  private:
   locale_t locale_;
@@ -195,6 +272,8 @@ class Fmt : public Writer {
     return static_cast<int32_t>(fmt::format_to(out.bytes, locale_, "{:.2Lf}", value) - out.bytes);
   }
   int32_t money(Text&, double) override { return 0; }
+  int32_t read_integer(const Given&) override { return 0; }
+  int32_t read_number(const Given&) override { return 0; }
 
  private:
   struct Punctuation : std::numpunct<char> {
@@ -237,21 +316,38 @@ class SystemLocales {
 
 int64_t sink = 0;  // what no compiler may leave out
 
+// ASCII, in the countries that are here.
+Given given(const Text& text, int32_t length) {
+  return {std::string(text.bytes, text.bytes + length), std::u16string(text.bytes, text.bytes + length)};
+}
+
 // Of all lengths, and of both signs.
 struct Values {
   std::vector<int32_t> integers;
   std::vector<double> amounts;
+  std::vector<Given> integer_texts;
+  std::vector<Given> amount_texts;
 
-  Values() {
+  explicit Values(Writer& writer) {
     std::mt19937 random(4711);
     for (int i = 0; i < 20000; ++i) {
       integers.push_back(static_cast<int32_t>(random()) >> (random() % 28));
       amounts.push_back(static_cast<double>(static_cast<int32_t>(random()) >> (random() % 20)) / 100);
+      Text text;
+      integer_texts.push_back(given(text, writer.integer(text, integers.back())));
+      amount_texts.push_back(given(text, writer.number(text, amounts.back())));
     }
   }
 };
 
 using Job = int64_t (*)(Writer&, const Values&);
+
+template <auto kRead, auto kTexts>
+int64_t read_all(Writer& writer, const Values& values) {
+  int64_t length = 0;
+  for (const Given& text : values.*kTexts) length += (writer.*kRead)(text);
+  return length;
+}
 
 template <auto kWrite, auto kValues>
 int64_t write_all(Writer& writer, const Values& values) {
@@ -267,7 +363,9 @@ struct Work {
 };
 constexpr Work kWork[] = {{"integers", write_all<&Writer::integer, &Values::integers>},
                           {"numbers", write_all<&Writer::number, &Values::amounts>},
-                          {"money", write_all<&Writer::money, &Values::amounts>}};
+                          {"money", write_all<&Writer::money, &Values::amounts>},
+                          {"read integers", read_all<&Writer::read_integer, &Values::integer_texts>},
+                          {"read numbers", read_all<&Writer::read_number, &Values::amount_texts>}};
 
 // Processor time of this thread: what other processes take away does not count.
 double now() {
@@ -308,9 +406,10 @@ bool print_row(const Country& country, const char* work, const char* text, const
   return ratio >= 1;
 }
 
-bool run_country(const Country& country, const Values& values, int repetitions) {
+bool run_country(const Country& country, int repetitions) {
   std::vector<WriterPtr> bytes(4);
   bytes[0] = std::make_unique<LexaroBytes>(country);
+  const Values values(*bytes[0]);
   bytes[1] = std::make_unique<Icu>(country, false);
   bytes[2] = std::make_unique<CLibrary>(country);
 #ifdef BENCH_FMT
@@ -337,9 +436,8 @@ int run(int repetitions) {
   std::printf("%s\n", machine_description(peers).c_str());
   std::printf("| Country | Work | Lexaro ns a value | ICU | C library | {fmt} | Times the fastest peer |\n");
   std::printf("| --- | --- | ---: | ---: | ---: | ---: | ---: |\n");
-  const Values values;
   bool never_slower = true;
-  for (const Country& country : kCountries) never_slower &= run_country(country, values, repetitions);
+  for (const Country& country : kCountries) never_slower &= run_country(country, repetitions);
   return never_slower ? 0 : 1;
 }
 
