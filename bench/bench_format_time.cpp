@@ -10,9 +10,10 @@
 #include <clocale>
 #include <cstdio>
 #include <cstdlib>
-#include <filesystem>
 #include <stdexcept>
 #include <string>
+
+#include "bench/support/system_locales.hpp"
 
 namespace lx::bench {
 namespace {
@@ -42,30 +43,6 @@ LXTime sample_time() {
   gmtime_r(&moment, &time);
   return time;
 }
-
-// The C library's locales, made with its own tool.
-class SystemLocales {
- public:
-  SystemLocales() {
-    char name[] = "/tmp/bench-format-time-XXXXXX";
-    if (mkdtemp(name) == nullptr) throw std::runtime_error("no temporary directory");
-    directory_ = name;
-    for (const char* locale : {"en_US", "de_DE"}) {
-      std::string command = "localedef -i " + std::string(locale) + " -f UTF-8 " + directory_ + "/" + locale + ".UTF-8";
-      if (std::system((command + " > /dev/null 2>&1").c_str()) != 0) std::fprintf(stderr, "localedef: no %s\n", locale);
-    }
-    setenv("LOCPATH", name, 1);
-  }
-  ~SystemLocales() {
-    std::error_code error;
-    std::filesystem::remove_all(directory_, error);
-  }
-  SystemLocales(const SystemLocales&) = delete;
-  SystemLocales& operator=(const SystemLocales&) = delete;
-
- private:
-  std::string directory_;
-};
 
 // Each contender writes the sample into a buffer, and reads what it wrote.
 class Lexaro {
@@ -160,7 +137,7 @@ void add(const Case& of, const char* contender) {
 int main(int argc, char** argv) {
   using namespace lx::bench;
   benchmark::Initialize(&argc, argv);
-  SystemLocales locales;
+  const SystemLocales locales({"en_US", "de_DE"});
   if (LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, 0) != LX_OK) return 2;
   for (const Case& one : kCases) {
     add<Lexaro>(one, "lexaro");
