@@ -54,6 +54,17 @@ Record catalog_record(const void* bytes) {
   return record;
 }
 
+// An entry of an index, field by field.
+struct MessageEntry {
+  const uint8_t* at;
+
+  MessageEntry(const void* index, uint32_t position)
+      : at(static_cast<const uint8_t*>(index) + size_t{position} * sizeof(CatalogMessage)) {}
+  uint32_t number() const { return catalog_record<uint32_t>(at + offsetof(CatalogMessage, number)); }
+  uint32_t length() const { return catalog_record<uint32_t>(at + offsetof(CatalogMessage, length)); }
+  uint32_t offset() const { return catalog_record<uint32_t>(at + offsetof(CatalogMessage, offset)); }
+};
+
 // Whether `count` records of a size lie inside a file.
 constexpr bool lies_inside(uint32_t file_size, uint32_t offset, uint64_t count, uint64_t record_size) {
   return offset <= file_size && count * record_size <= file_size - offset;

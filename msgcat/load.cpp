@@ -1,5 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
 // Catalogs read whole and checked once; their sets are views into the file's bytes.
+#include <algorithm>
+
+#include "locale/locale.hpp"
 #include "msgcat/catalog.hpp"
 
 namespace lx {
@@ -8,13 +11,12 @@ namespace {
 TRC1_Unit trace_unit = {"Lexaro", "catalog_load", 0};
 
 bool messages_lie_inside(const LXCatSet& set) {
-  const auto* at = static_cast<const uint8_t*>(set.index);
-  bool inside = true;
-  for (uint32_t i = 0; i < set.messages; ++i, at += sizeof(CatalogMessage)) {
-    auto message = catalog_record<CatalogMessage>(at);
-    inside &= uint64_t{message.offset} + message.length <= set.text_size;
+  uint64_t furthest = 0;
+  for (uint32_t i = 0; i < set.messages; ++i) {
+    MessageEntry entry(set.index, i);
+    furthest = std::max(furthest, uint64_t{entry.offset()} + entry.length());
   }
-  return inside;
+  return furthest <= set.text_size;
 }
 
 uint32_t load_set(const LXCatalog& catalog, const CatalogSet& record, LXCatSet& set) {
@@ -41,12 +43,13 @@ uint32_t load_sets(LXCatalog& catalog, const CatalogHeader& header) {
   for (uint32_t i = 0; i < header.sets; ++i) {
     if (!lies_inside(catalog.size, offset, 1, sizeof(CatalogSet))) return LX_E_CATALOG;
     auto record = catalog_record<CatalogSet>(catalog.image + offset);
-    // Sets that share their messages could make a small file take hours.
+    // Sets may share their messages, but not so often that a small file takes hours.
     messages += record.messages;
-    if (messages > catalog.size / sizeof(CatalogMessage)) return LX_E_CATALOG;
+    if (messages > catalog.size) return LX_E_CATALOG;
     uint32_t status = load_set(catalog, record, catalog.sets[i]);
     if (status != LX_OK) return status;
     if (i != 0 && record.number <= catalog.sets[i - 1].number) catalog.ascending = false;
+    if (catalog.dense_sets == i && record.number == i + 1) ++catalog.dense_sets;
     offset = record.next;
     ++catalog.set_count;
   }
@@ -79,6 +82,7 @@ LXCatalog* load_whole(LXLocale* locale, LXFile* file, uint32_t size, uint32_t& r
   *catalog = {.image = image.give_up(),
               .size = size,
               .set_count = 0,
+              .dense_sets = 0,
               .sets = reinterpret_cast<LXCatSet*>(catalog + 1),
               .locale = locale,
               .own_locale = {},
@@ -143,9 +147,9 @@ uint32_t check_catalog_header(const CatalogHeader& header, uint32_t file_size) {
 
 uint32_t find_own_page(LXCatalog& catalog, const CatalogHeader& header) {
   // Mostly it is the caller's locale, which need not be made once more.
-  char callers_name[sizeof header.locale];
-  if (LXGetLocaleTextInfo(catalog.locale, LX_ITEM_LOCALE_NAME, callers_name, sizeof callers_name, 0) > 0 &&
-      std::strcmp(callers_name, header.locale) == 0) {
+  char callers_name[kFullNameRoom];
+  write_full_name(*catalog.locale, callers_name);
+  if (std::strcmp(callers_name, header.locale) == 0) {
     catalog.own_locale.code_page = catalog.locale->code_page;
     return LX_OK;
   }

@@ -34,25 +34,6 @@ uint32_t position_of(uint32_t wanted, uint32_t count, NumberAt number_at) {
   return kNowhere;
 }
 
-LXCatSet* loaded_set(const LXCatalog& catalog, uint32_t number) {
-  LXCatSet* end = catalog.sets + catalog.set_count;
-  if (!catalog.ascending) {
-    LXCatSet* set = std::find_if(catalog.sets, end, [=](const LXCatSet& each) { return each.number == number; });
-    return set != end ? set : nullptr;
-  }
-  uint32_t at = position_of(number, catalog.set_count, [&](uint32_t i) { return catalog.sets[i].number; });
-  return at != kNowhere ? catalog.sets + at : nullptr;
-}
-
-bool find_loaded_message(const LXCatSet& set, uint32_t number, CatalogMessage& message) {
-  const auto* index = static_cast<const uint8_t*>(set.index);
-  auto entry = [=](uint32_t i) { return index + size_t{i} * sizeof message; };
-  uint32_t at = position_of(number, set.messages, [=](uint32_t i) { return catalog_record<uint32_t>(entry(i)); });
-  if (at == kNowhere) return false;
-  message = catalog_record<CatalogMessage>(entry(at));
-  return true;
-}
-
 // ---- On disk ----
 
 // Reads that reach beyond the file are not even tried.
@@ -64,8 +45,8 @@ bool read_at(const LXCatalog& catalog, uint32_t offset, void* out, uint32_t size
 }
 
 // Follows the chain for as many sets as there are. LX_OK with `found` or without.
-uint32_t read_set(const LXCatalog& catalog, const CatalogHeader& header, uint32_t number, CatalogSet& set,
-                  bool& found) {
+uint32_t read_set_record(const LXCatalog& catalog, const CatalogHeader& header, uint32_t number, CatalogSet& set,
+                         bool& found) {
   found = false;
   uint32_t offset = header.first_set;
   for (uint32_t i = 0; i < header.sets; ++i) {
@@ -77,24 +58,6 @@ uint32_t read_set(const LXCatalog& catalog, const CatalogHeader& header, uint32_
     offset = set.next;
   }
   return LX_OK;
-}
-
-LXCatSet* set_on_disk(LXCatalog& catalog, uint32_t number, LXCatSet& scratch, uint32_t& rc) {
-  auto fail = [&](uint32_t status) {
-    rc = status;
-    return static_cast<LXCatSet*>(nullptr);
-  };
-  CatalogHeader header;
-  if (!read_at(catalog, 0, &header, sizeof header)) return fail(LX_E_CATALOG);
-  uint32_t status = check_catalog_header(header, catalog.size);
-  if (status == LX_OK && catalog.own_locale.code_page == nullptr) status = find_own_page(catalog, header);
-  if (status != LX_OK) return fail(status);
-  CatalogSet set;
-  bool found = false;
-  status = read_set(catalog, header, number, set, found);
-  if (status != LX_OK || !found) return fail(status);
-  scratch = set_of_record(set);
-  return &scratch;
 }
 
 // The entry where consecutive numbers have it, else the first of that number.
@@ -123,43 +86,65 @@ uint32_t read_entry(const LXCatalog& catalog, const LXCatSet& set, uint32_t numb
   return LX_OK;
 }
 
-uint32_t read_message(const LXCatalog& catalog, const LXCatSet& set, uint32_t number, FoundMessage& result) {
-  // The set may be the caller's.
-  if (!lies_inside(catalog.size, set.index_offset, set.messages, sizeof(CatalogMessage))) return LX_E_CATALOG;
-  CatalogMessage message;
-  bool found = false;
-  uint32_t status = read_entry(catalog, set, number, message, found);
-  if (status != LX_OK || !found) return status;
-  if (!lies_inside(set.text_size, message.offset, message.length, 1) ||
-      !lies_inside(catalog.size, set.text_offset, set.text_size, 1)) {
-    return LX_E_CATALOG;
-  }
-  auto block = Owned<char>::array(size_t{message.length} + 1);
-  if (!block) return LX_E_MEMORY;
-  if (!read_at(catalog, set.text_offset + message.offset, block.get(), message.length)) return LX_E_CATALOG;
-  block[message.length] = '\0';
-  result.text = block.get();
-  result.length = message.length;
-  result.block = std::move(block);
-  return LX_OK;
-}
-
 }  // namespace
 
-LXCatSet* find_set(LXCatalog& catalog, uint32_t number, LXCatSet& scratch, uint32_t& rc) {
-  rc = LX_OK;
-  return catalog.image != nullptr ? loaded_set(catalog, number) : set_on_disk(catalog, number, scratch, rc);
+LXCatSet* search_sets(const LXCatalog& catalog, uint32_t number) {
+  LXCatSet* end = catalog.sets + catalog.set_count;
+  if (!catalog.ascending) {
+    LXCatSet* set = std::find_if(catalog.sets, end, [=](const LXCatSet& each) { return each.number == number; });
+    return set != end ? set : nullptr;
+  }
+  uint32_t at = position_of(number, catalog.set_count, [&](uint32_t i) { return catalog.sets[i].number; });
+  return at != kNowhere ? catalog.sets + at : nullptr;
 }
 
-uint32_t find_message(const LXCatalog& catalog, const LXCatSet& set, int32_t number, FoundMessage& message) {
-  if (number < 1) return LX_OK;
-  if (catalog.image == nullptr) return read_message(catalog, set, static_cast<uint32_t>(number), message);
-  CatalogMessage entry;
-  if (set.index != nullptr && find_loaded_message(set, static_cast<uint32_t>(number), entry)) {
-    message.text = set.text + entry.offset;
-    message.length = entry.length;
+MessageText search_messages(const LXCatSet& set, uint32_t number) {
+  uint32_t at = position_of(number, set.messages, [&](uint32_t i) { return MessageEntry(set.index, i).number(); });
+  if (at == kNowhere) return {};
+  MessageEntry entry(set.index, at);
+  return {set.text + entry.offset(), entry.length()};
+}
+
+LXCatSet* read_set(LXCatalog& catalog, uint32_t number, LXCatSet& scratch, uint32_t& rc) {
+  auto fail = [&](uint32_t status) {
+    rc = status;
+    return static_cast<LXCatSet*>(nullptr);
+  };
+  CatalogHeader header;
+  if (!read_at(catalog, 0, &header, sizeof header)) return fail(LX_E_CATALOG);
+  uint32_t status = check_catalog_header(header, catalog.size);
+  if (status == LX_OK && catalog.own_locale.code_page == nullptr) status = find_own_page(catalog, header);
+  if (status != LX_OK) return fail(status);
+  CatalogSet set;
+  bool found = false;
+  status = read_set_record(catalog, header, number, set, found);
+  if (status != LX_OK || !found) return fail(status);
+  scratch = set_of_record(set);
+  return &scratch;
+}
+
+Owned<char> read_message(const LXCatalog& catalog, const LXCatSet& set, uint32_t number, uint32_t& length,
+                         uint32_t& rc) {
+  auto fail = [&](uint32_t status) {
+    rc = status;
+    return Owned<char>();
+  };
+  // The set may be the caller's.
+  if (!lies_inside(catalog.size, set.index_offset, set.messages, sizeof(CatalogMessage))) return fail(LX_E_CATALOG);
+  CatalogMessage message;
+  bool found = false;
+  rc = read_entry(catalog, set, number, message, found);
+  if (rc != LX_OK || !found) return {};
+  if (!lies_inside(set.text_size, message.offset, message.length, 1) ||
+      !lies_inside(catalog.size, set.text_offset, set.text_size, 1)) {
+    return fail(LX_E_CATALOG);
   }
-  return LX_OK;
+  auto text = Owned<char>::array(size_t{message.length} + 1);
+  if (!text) return fail(LX_E_MEMORY);
+  if (!read_at(catalog, set.text_offset + message.offset, text.get(), message.length)) return fail(LX_E_CATALOG);
+  text[message.length] = '\0';
+  length = message.length;
+  return text;
 }
 
 }  // namespace lx
@@ -170,11 +155,16 @@ extern "C" {
 
 LXCatSet* MCGetSet(LXCatalog* catalog, uint32_t set, LXCatSet* scratch, uint32_t* rc) noexcept {
   return exported(trace_unit, __func__, [&]() -> LXCatSet* {
-    uint32_t status = catalog != nullptr ? LX_E_ARGUMENT : LX_E_NOCATALOG;
+    uint32_t status = LX_OK;
     LXCatSet* found = nullptr;
-    LXCatSet unused;
-    if (catalog != nullptr && (catalog->image != nullptr || scratch != nullptr)) {
-      found = find_set(*catalog, set, scratch != nullptr ? *scratch : unused, status);
+    if (catalog == nullptr) {
+      status = LX_E_NOCATALOG;
+    } else if (catalog->image != nullptr) {
+      found = loaded_set(*catalog, set);
+    } else if (scratch != nullptr) {
+      found = read_set(*catalog, set, *scratch, status);
+    } else {
+      status = LX_E_ARGUMENT;
     }
     set_status(rc, status);
     return found;
@@ -183,12 +173,19 @@ LXCatSet* MCGetSet(LXCatalog* catalog, uint32_t set, LXCatSet* scratch, uint32_t
 
 char* MCGetMsg(LXCatalog* catalog, LXCatSet* set, int32_t message, uint32_t* length, uint32_t* rc) noexcept {
   return exported(trace_unit, __func__, [&]() -> char* {
-    FoundMessage found;
+    MessageText found;
     uint32_t status = catalog != nullptr ? uint32_t{LX_OK} : LX_E_NOCATALOG;
-    if (catalog != nullptr && set != nullptr) status = find_message(*catalog, *set, message, found);
+    if (catalog != nullptr && set != nullptr && message > 0) {
+      auto number = static_cast<uint32_t>(message);
+      if (catalog->image == nullptr) {
+        found.at = read_message(*catalog, *set, number, found.length, status).give_up();
+      } else if (set->index != nullptr) {
+        found = loaded_message(*set, number);
+      }
+    }
     set_status(rc, status);
     if (length != nullptr) *length = found.length;
-    return found.block ? found.block.give_up() : const_cast<char*>(found.text);
+    return const_cast<char*>(found.at);
   });
 }
 

@@ -84,19 +84,20 @@ Cut cut_characters(const CodePage& page, const Text<char>& text, size_t limit) {
   });
 }
 
-// Bytes of the output's own page: all of them, or what fits.
-void copy_text(const Output<char>& out, const char* text, size_t length) {
+// Bytes of the output's own page: all of them, or what fits. They may have to end with a shift byte.
+[[gnu::noinline]] void cut_text(const Output<char>& out, const char* text, size_t length) {
   const CodePage& page = page_of(out.locale);
-  Cut cut = {length, false};
-  if (out.characters) {
-    cut = cut_characters(page, {text, length}, out.room() - 1);
-  } else if (length >= out.room() || page.shift_sensitive) {
-    cut = find_cut(trace_unit, page, {text, length}, true, out.room(), {});
-  }
+  Cut cut = out.characters ? cut_characters(page, {text, length}, out.room() - 1)
+                           : find_cut(trace_unit, page, {text, length}, true, out.room(), {});
   std::memcpy(out.at, text, cut.at);
   char* end = out.at + cut.at;
   if (cut.double_byte) *end++ = static_cast<char>(page.leave_byte);
   *end = '\0';
+}
+void copy_text(const Output<char>& out, const char* text, size_t length) {
+  if (length >= out.room() || (out.locale.flags & kLocaleShiftSensitive) != 0) return cut_text(out, text, length);
+  out.at[length] = '\0';
+  std::memcpy(out.at, text, length);
 }
 template <class Unit>
 void copy_text(const Output<Unit>& out, const Unit* text, size_t length) {
@@ -106,9 +107,8 @@ void copy_text(const Output<Unit>& out, const Unit* text, size_t length) {
 }
 
 // Bytes of the catalog's page.
-void carry_text(const Output<char>& out, LXLocale& from, const char* text, uint32_t length) {
+[[gnu::noinline]] void convert_text(const Output<char>& out, LXLocale& from, const char* text, uint32_t length) {
   const CodePage& page = page_of(from);
-  if (&page == &page_of(out.locale)) return copy_text(out, text, length);
   uint32_t options = LX_OPT_TERMINATE;
   if (out.characters) {  // then the length counts them too
     options |= LX_OPT_CHARS;
@@ -116,6 +116,10 @@ void carry_text(const Output<char>& out, LXLocale& from, const char* text, uint3
                                       [](auto walker) { return static_cast<uint32_t>(count_characters(walker)); });
   }
   LXConvertStringEx(&out.locale, out.at, 0, out.size, &from, text, 0, static_cast<int32_t>(length), options);
+}
+void carry_text(const Output<char>& out, LXLocale& from, const char* text, uint32_t length) {
+  if (from.code_page != out.locale.code_page) return convert_text(out, from, text, length);
+  copy_text(out, text, length);
 }
 void carry_text(const Output<LXWChar>& out, LXLocale& from, const char* text, uint32_t length) {
   const CodePage& page = page_of(from);
@@ -134,14 +138,28 @@ void carry_text(const Output<LXUChar>& out, LXLocale& from, const char* text, ui
   LXStringToUnicodeEx(&from, out.at, out.size, text, 0, static_cast<int32_t>(length), LX_OPT_TERMINATE);
 }
 
-// LX_OK, LX_E_MESSAGE, LX_E_CATALOG or LX_E_MEMORY.
-uint32_t look_up(LXCatalog& catalog, uint32_t set_number, int32_t number, FoundMessage& message) {
-  if (number < 1) return LX_E_MESSAGE;
-  uint32_t rc = LX_OK;
-  LXCatSet scratch;
-  const LXCatSet* set = find_set(catalog, set_number, scratch, rc);
-  if (set != nullptr) rc = find_message(catalog, *set, number, message);
-  return rc == LX_OK && message.text == nullptr ? LX_E_MESSAGE : rc;
+// What is not in memory: on disk, or nowhere. LX_OK also with the default text, unless it stands in for a failure.
+template <class Unit>
+[[gnu::noinline]] uint32_t write_other(const Output<Unit>& out, LXCatalog& catalog, uint32_t set_number, int32_t number,
+                                       const Unit* default_text) {
+  uint32_t status = LX_OK;
+  if (catalog.image == nullptr && number > 0) {
+    LXCatSet scratch;
+    const LXCatSet* set = read_set(catalog, set_number, scratch, status);
+    uint32_t length = 0;
+    Owned<char> text;
+    if (set != nullptr) text = read_message(catalog, *set, static_cast<uint32_t>(number), length, status);
+    if (text) {
+      carry_text(out, catalog.own_locale, text.get(), length);
+      return LX_OK;
+    }
+  }
+  if (default_text != nullptr) {
+    copy_text(out, default_text, measured_length(default_text));
+    return status;
+  }
+  *out.at = 0;
+  return status != LX_OK ? status : LX_E_MESSAGE;
 }
 
 template <class Unit>
@@ -151,16 +169,14 @@ uint32_t message_call(const char* function, LXCatalog* catalog, uint32_t set, in
   constexpr uint32_t kOptions = LX_OPT_TERMINATE | LX_OPT_CHARS;
   return locale_call(trace_unit, function, catalog->locale, flags, kOptions, LX_E_ARGUMENT, [&](LocaleCall& call) {
     if (out == nullptr || out_size < 1) return call.status;
-    Output<Unit> output = {call.locale, out, out_size, (flags & LX_OPT_CHARS) != 0};
-    FoundMessage message;
-    call.status = look_up(*catalog, set, number, message);
-    if (call.status == LX_OK) {
-      carry_text(output, catalog->own_locale, message.text, message.length);
-    } else if (default_text != nullptr) {
-      copy_text(output, default_text, measured_length(default_text));
-      if (call.status == LX_E_MESSAGE) call.status = LX_OK;
+    const Output<Unit> output = {call.locale, out, out_size, (flags & LX_OPT_CHARS) != 0};
+    const LXCatSet* loaded = number > 0 ? loaded_set(*catalog, set) : nullptr;
+    MessageText text;
+    if (loaded != nullptr) text = loaded_message(*loaded, static_cast<uint32_t>(number));
+    if (text.at != nullptr) {
+      carry_text(output, catalog->own_locale, text.at, text.length);
     } else {
-      *out = 0;
+      call.status = write_other(output, *catalog, set, number, default_text);
     }
     return call.status;
   });

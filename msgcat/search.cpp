@@ -106,8 +106,8 @@ class Search {
       const uint8_t* from = list.at;
       Character character;
       more = list.next(character);
-      const uint8_t* to = list.at - (more ? character.units : 0);
-      path.append(from, static_cast<size_t>(to - from));  // shift bytes
+      const uint8_t* to = more ? list.at - character.units : list.end;
+      path.append(from, static_cast<size_t>(to - from));  // shift bytes, and what is no whole character
       if (more && is(character, '%')) {
         expand(list, path);
       } else if (more && !is(character, ';')) {

@@ -21,7 +21,7 @@ class LineReader {
       : stream_(stream),
         page_(page),
         line_(line_characters<Kind>(page)),
-        flags_(flags),
+        flags_((flags & kLineEnds) != 0 ? flags : flags | LX_EOL_1),
         buffer_(buffer),
         room_(size > 0 ? static_cast<size_t>(size) : 0),
         terminated_((flags & LX_OPT_TERMINATE) != 0 && size > 0) {

@@ -46,10 +46,11 @@ uint32_t flush(LXStream& stream, const CodePage& page) {
   }
 }
 
-// Writes what is kept and ends the output in the single-byte state. The first failure counts.
+// Writes what is kept and ends the output in the single-byte state. The first failure counts; what it leaves is lost.
 uint32_t finish(LXStream& stream, const CodePage& page) {
   uint32_t status = flush(stream, page);
-  if (!page.shift_sensitive || !stream.double_byte) return status;
+  bool run_is_open = status == LX_OK ? stream.double_byte : stream.sent_double_byte;
+  if (!page.shift_sensitive || !run_is_open) return status;
   stream.bytes[0] = page.leave_byte;
   stream.kept = 1;
   uint32_t closed = flush(stream, page);

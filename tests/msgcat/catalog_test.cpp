@@ -108,6 +108,8 @@ TEST_F(CatalogTest, FilesAreFoundByTemplates) {
     check(german, CatalogPtr(LXOpenCatalogU(german.get(), directory.c_str(), name.c_str(), each.flags)));
     check(host, CatalogPtr(LXOpenCatalogU(host.get(), directory.c_str(), name.c_str(), each.flags)));
   }
+  // Half a character at the end is part of the name.
+  EXPECT_FALSE(CatalogPtr(LXOpenCatalog(german.get(), nullptr, "app\xE3", LX_CAT_LOAD)));
 }
 
 TEST_F(CatalogTest, MessagesInAllModesKindsPagesAndLengths) {
@@ -160,7 +162,9 @@ TEST_F(CatalogTest, MessagesInAllModesKindsPagesAndLengths) {
 }
 
 TEST_F(CatalogTest, DefaultTexts) {
-  directory_.write("gaps", std::string_view(catalog_image(kEnglish, {{2, {{3, "three"}, {10, "ten"}}}})));
+  directory_.write("gaps",
+                   std::string_view(catalog_image(
+                       kEnglish, {{5, {{5, "five"}}}, {2, {{3, "three"}, {10, "ten"}}}, {2, {{10, "again"}}}})));
   for (uint32_t mode : kModes) {
     CatalogPtr catalog(LXOpenCatalog(utf8_.get(), nullptr, "gaps", mode));
     for (int32_t number = -1; number < 40; ++number) {
@@ -194,6 +198,17 @@ TEST_F(CatalogTest, SameTextsAsTheCLibrary) {
     for (int i = 0; i < 11 * 1500; i += mode == 0 ? 7 : 1) {
       const char* expected = catgets(peer, i / 1500, i % 1500, "status 72");
       ASSERT_EQ(message(catalog, static_cast<uint32_t>(i / 1500), i % 1500), expected) << i;
+      // The same piece by piece.
+      LXCatSet place, *set = MCGetSet(catalog.get(), static_cast<uint32_t>(i / 1500), &place, nullptr);
+      if (mode == LX_CAT_LOAD && set != nullptr) {
+        const uint32_t record[] = {set->number,    set->next, set->messages, set->index_offset, set->text_offset,
+                                   set->text_size, 0};
+        ASSERT_EQ(LXMcLoadSet(catalog.get(), record, set = &place), LX_OK);
+      }
+      uint32_t length = 0;
+      char* text = MCGetMsg(catalog.get(), set, i % 1500, &length, nullptr);
+      ASSERT_EQ(text != nullptr ? std::string(text, length) : "status 72", expected) << i;
+      if (mode != LX_CAT_LOAD) LXMcFree(text);
     }
   }
   catclose(peer);
@@ -238,6 +253,17 @@ TEST(CatalogFaults, DamagedFiles) {
     std::string image = kSound;
     std::memcpy(image.data() + each.at, &each.value, 4);
     for (uint32_t mode : kModes) EXPECT_EQ(status_of(image, mode), each.status) << each.name << ", mode " << mode;
+  }
+  // Sets may have the same messages, but not so many that checking them takes far longer than reading the file.
+  std::vector<std::pair<uint32_t, std::string>> messages;
+  for (uint32_t i = 1; i <= 100; ++i) messages.emplace_back(i, "x");
+  for (uint32_t sets : {2, 14, 15}) {
+    std::string image = catalog_image("English_UnitedStates.Small@BINARY", {{1, messages}});
+    image[12 + 3 * (LXMcGetByteOrder() == 1)] = static_cast<char>(sets);
+    std::memcpy(image.data() + 156, std::array{152u}.data(), 4);
+    for (uint32_t mode : kModes) {
+      EXPECT_EQ(status_of(image, mode), sets == 15 && mode == LX_CAT_LOAD ? LX_E_CATALOG : LX_E_MESSAGE);
+    }
   }
   for (size_t bit = 0; bit < kSound.size() * 9; ++bit) {  // then each length
     std::string image = kSound.substr(0, bit < kSound.size() * 8 ? kSound.size() : bit - kSound.size() * 8);

@@ -163,14 +163,16 @@ TEST_F(Streams, PutBackLastComesFirst) {
 
 // Refused output waits, up to 80 bytes, in whole characters with their shift bytes.
 TEST_F(Streams, WrittenBytesArriveInOrderWhereverTheyAreRefused) {
-  for (size_t choice = 0; choice < forms_.size() * 60 * 25; ++choice) {
-    use(forms_[choice / 60 / 25], u"aああいb亜1aああいb亜1aああいb亜1aああいb亜1aああいb亜1aああいb亜1aああいb亜1");
+  for (size_t choice = 0; choice < forms_.size() * 80 * 25; ++choice) {
+    use(forms_[choice / 80 / 25], u"aああいb亜1aああいb亜1aああいb亜1aああいb亜1aああいb亜1aああいb亜1aああいb亜1");
     if (bare_) continue;
     const int32_t failure = kFailures[choice % 5];
-    const size_t how = choice / 5 % 3;  // refused once; from there on; then flushed in vain
-    open({{}, true, kMost[choice / 15 % 4], choice / 60 % 25 * 4, failure, how > 0});
+    const size_t how = choice / 5 % 4;  // refused once; from there on; then flushed in vain; or closed in vain
+    const bool fatal = failure == -1 || failure == 0xFFFF;
+    open({{}, true, kMost[choice / 20 % 4], choice / 80 % 25 * 4, failure, how > 0});
     Writer out{wire_};
     std::string expected;
+    auto inside = [&] { return !ucs2_ && characters_of(wire_, units_of(script_.wire)).state != 0; };
     auto add = [&](const Character& c) {
       const Units units = piece(out, c);
       script_.failed = false;
@@ -182,10 +184,17 @@ TEST_F(Streams, WrittenBytesArriveInOrderWhereverTheyAreRefused) {
     };
     for (const Character& c : list_) add(c);
     if (how == 2 && script_.wire != expected) {
-      const bool lost = failure == -1 || failure == 0xFFFF;
-      expect(LXFlushStream(stream_, l_, 0), 0, lost ? LX_E_FLUSH : LX_E_COUNT);
-      if (lost) expected = script_.wire;  // what follows stands in the state of what was taken
-      if (lost) out.inside = !ucs2_ && characters_of(wire_, units_of(expected)).state != 0;
+      expect(LXFlushStream(stream_, l_, 0), 0, fatal ? LX_E_FLUSH : LX_E_COUNT);
+      if (fatal) expected = script_.wire;  // what follows stands in the state of what was taken
+      if (fatal) out.inside = inside();
+    }
+    script_.fail_on = false;
+    if (how == 3 && script_.wire != expected) {
+      expected = script_.wire + (inside() ? std::string(1, static_cast<char>(form_.page->leave)) : "");
+      script_.fail_at = 0;
+      expect(LXCloseStream(stream_, l_, 0), 0, fatal ? LX_E_FLUSH : LX_E_COUNT);
+      ASSERT_EQ(hex(script_.wire), hex(expected)) << form_.name() << choice;
+      continue;
     }
     script_.fail_at = SIZE_MAX;
     expect(LXFlushStream(stream_, l_, 0), 1, LX_OK);
@@ -201,12 +210,13 @@ TEST_F(Streams, LinesOfEveryKindInEveryRoom) {
   for (uint32_t choice = 0; choice < forms_.size() * 128 * 18; ++choice) {
     use(forms_[choice / 128 / 18], u"aあい21b2 1121あ34c亜2112あ2");
     const uint32_t flags = choice % 16 << 8 | (choice & 16) << 11 | (choice & 32) << 9 | (choice & 64) >> 3;
+    const uint32_t ends = choice % 16 != 0 ? flags : LX_EOL_1;
     const bool counted = flags & LX_OPT_CHARS;
     const int32_t size = static_cast<int32_t>(choice / 128 % 18) - 1;
     const size_t ended = flags & LX_OPT_TERMINATE && size > 0, room = size > 0 ? static_cast<size_t>(size) - ended : 0;
     open({bytes_, false, 2});
     auto is = [&](size_t at, size_t i, uint32_t flag) {
-      return (flags & flag) != 0 && list_[at].size == 1 && list_[at].code == line_character(i);
+      return (ends & flag) != 0 && list_[at].size == 1 && list_[at].code == line_character(i);
     };
     auto stored = [&](size_t count) {  // the first characters in memory
       Writer out{form_};
