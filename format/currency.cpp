@@ -140,7 +140,7 @@ template <class Kind, class Unit = typename Kind::Unit>
 int32_t currency_call(const char* function, LXLocale* locale, double value, const Destination<Unit>& to) {
   // Without room for any character the other flags are not looked at.
   constexpr uint32_t kFlags = LX_NUM_TEXTOPT | LX_NUM_TERMINATE | LX_NUM_INTLSYM | LX_NUM_CHARLEN;
-  const uint32_t accepted = to.in_characters() && to.length == 0 ? ~0u : kFlags;
+  const uint32_t accepted = to.in_characters() && to.length <= 0 ? ~0u : kFlags;
   return locale_call(trace_unit, function, locale, to.flags, accepted, int32_t{-1},
                      [&](LocaleCall& call) { return write_amount<Kind>(call, value, to); });
 }

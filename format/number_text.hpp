@@ -58,7 +58,8 @@ auto read_number(const LXLocale& locale, const NumberText<typename Kind::Unit>& 
     auto read_and_stop = [&] {
       auto result = read(reader, spelling);
       auto place = reader.place();
-      uint32_t state = reader.kShifted ? uint32_t{place.double_byte} : given.state;
+      // Behind the whole text, callers have come to expect the state that they gave.
+      uint32_t state = reader.kShifted && !reader.done() ? uint32_t{place.double_byte} : given.state;
       given.stopped(reinterpret_cast<const Unit*>(place.at), state);
       return result;
     };

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // Decimal numbers read.
 #include <algorithm>
+#include <cmath>
 
 #include "format/number_text.hpp"
 #include "format/powers_of_ten.hpp"
@@ -66,7 +67,7 @@ struct Decimal {
   }
 
   double result() const {
-    if (value == 0.0) return mantissa_sign * value;  // not zero times infinity
+    if (value == 0.0 || std::isinf(value)) return mantissa_sign * value;  // not zero times infinity
     return mantissa_sign * value * power_of_ten(exponent_sign * exponent);
   }
 

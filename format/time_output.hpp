@@ -153,7 +153,7 @@ template <class Kind>
     digit = static_cast<uint8_t>(value % 10);
     value /= 10;
   }
-  for (int32_t i = width; i-- > 0;) {
+  for (int32_t i = std::max(width, 0); i-- > 0;) {
     if (!out.put(zero + (i < kMostDigits ? digits[i] : 0u))) return LX_E_BUFFER;
   }
   return out.full() ? LX_E_BUFFER : LX_OK;

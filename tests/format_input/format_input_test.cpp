@@ -69,6 +69,8 @@ const Case kCases[] = {
     {"blanks, a sign and a prefix", u"  -0x1F", 0, 0, -31, 7},
     {"a lone zero", u"0", 0, 0, 0, 1},
     {"no prefix and no octal digit", u"0,7", 0, 0, 0, 1},
+    {"octal", u"0178", 0, 0, 15, 3},
+    {"a separator behind a prefix", u"0x,1", 0, 0, 1, 4},
     {"a prefix without digits", u"0x", 16, 0, 0, 2},
     {"x is a digit in base 36", u"0xz", 36, 0, 33 * 36 + 35, 3},
     {"separators anywhere behind the first digit", u"1,2,,3,", 10, 0, 123, 7},
@@ -77,9 +79,12 @@ const Case kCases[] = {
     {"overflow at the end takes all", u"2147483648", 10, 0, INT32_MAX, 10},
     {"overflow before the end stops at the digit", u"21474836480", 10, 0, INT32_MAX, 9},
     {"the lowest value counts as overflow: it stops before its last digit", u"-2147483648;", 10, 0, INT32_MIN, 10},
+    {"the one above it does not", u"-2147483647;", 10, 0, -INT32_MAX, 11},
     {"the highest unsigned value", u"4294967295;", 10, kUnsigned, -1, 10},
+    {"unsigned overflow", u"4294967296", 10, kUnsigned, -1, 10},
     {"a minus has no place before unsigned values", u"-5", 10, kUnsigned, 0, 0},
     {"bases", u"1", 37, 0, 0, 0, LX_E_BASE},
+    {"base 1 is none", u"0", 1, 0, 0, 0, LX_E_BASE},
     {"the base counts before the flags", u"1", -1, 0x40, 0, 0, LX_E_BASE},
     {"flags", u"1", 10, 0x40, 0, 0, LX_E_ARGUMENT},
     {"full width among half width", u"\uFF0B1\uFF0C2\uFF4634g", 16, kFull, 0x12F34, 7},
@@ -91,6 +96,7 @@ const Case kCases[] = {
     {"D marks an exponent too", u"1,002.5d-3", kDecimal, 0, 1.0025, 10},
     {"no exponent without a point", u"25E3", kDecimal, 0, 25, 2},
     {"a marker without exponent", u"1.5e", kDecimal, 0, 1.5, 3},
+    {"nor with its sign alone", u"1.5e-", kDecimal, 0, 1.5, 3},
     {"no fraction of an exponent", u"1.5e3.2", kDecimal, 0, 1500, 5},
     {"each fraction digit is added", u"0.3", kDecimal, 0, 0.30000000000000004, 3},
     {"but not the one behind a point that comes first", u".3", kDecimal, 0, 0.3, 2},
@@ -110,7 +116,7 @@ TEST(NumbersRead, Cases) {
       for (int32_t length : {static_cast<int32_t>(text.size()), -1, characters}) {
         const uint32_t count = length == characters && one.status == LX_OK ? LX_NUM_CHARLEN : 0;
         auto [value, end, status, state] = read(form, locale, text, one.base, one.flags | count, length);
-        EXPECT_DOUBLE_EQ(value, one.value) << one.name;
+        EXPECT_EQ(value, one.value) << one.name;
         EXPECT_EQ(std::pair(end, status), std::pair(behind, one.status)) << one.name;
         EXPECT_TRUE(end < text.size() || state == 0) << one.name;
       }
@@ -125,6 +131,9 @@ TEST(NumbersRead, DoubleByteRunsGoOnFromTheStateOfTheCall) {
   const Units run = {0x42, 0xF1, 0x42, 0xF2, 0x0F, 0xF3, 0x0E, 0x44, 0x81};
   EXPECT_EQ(read(inside, locale.get(), run, 10, kFull), (Reading{123, 7, LX_OK, 1}));
   EXPECT_EQ(read(inside, locale.get(), {0x42, 0xF1, 0x42}, 10, kFull), (Reading{1, 2, LX_OK, 1}));
+  for (int32_t base : {10, kDecimal}) {  // behind the whole text, the state of its beginning
+    EXPECT_EQ(read(inside, locale.get(), {0x42, 0xF1, 0x0F}, base, kFull), (Reading{1, 3, LX_OK, 1}));
+  }
   EXPECT_EQ(read(inside, locale.get(), run, 10), (Reading{0, 0, LX_OK, 1}));
 }
 
@@ -132,7 +141,7 @@ TEST(NumbersRead, SeparatorsOfLocales) {
   const std::tuple<const char*, std::u16string_view, double, size_t> kTexts[] = {
       {"German_Germany", u"-1.234.567,5", -1234567.5, 12},
       {"Swedish_Sweden", u"1234,5", 1234.5, 6},
-      {"Swedish_Sweden", u"1\u00A0234,5", 1, 1},
+      {"Swedish_Sweden", u"1 234,5", 1, 1},
       {"Polish_Poland", u"1,5", 1.5, 3},
       {"Japanese_Japan", u"1,234.5", 1234.5, 7}};
   for (auto [name, text, value, end] : kTexts) {
@@ -176,6 +185,7 @@ TEST(NumbersRead, DecimalsLieCloseToTheNearestDouble) {
     std::string text = "1.e" + std::to_string(n);
     ASSERT_EQ(value_of(text), std::strtod(text.c_str(), nullptr)) << n;
   }
+  EXPECT_EQ(value_of("-" + std::string(310, '9') + ".e-999"), -HUGE_VAL);
 }
 
 TEST(NumbersRead, BrokenTextsAndTextsThatEndAnywhere) {
@@ -216,7 +226,7 @@ constexpr auto kDigitU = [](auto l, auto s, auto n, auto at, auto thousands, aut
                             auto flags) { return LXStrGetDigitU(l, s, n, at, *thousands, *point, plus, minus, flags); };
 constexpr Family<LXStrGetDigit, LXStrGetDigitEx, kDigitW, kDigitU> kGetDigit;
 
-// The codes of a text up to where there is none, and the units left. Separators "," and ".", signs "<+" and "-".
+// The codes of a text up to where there is none, and the units left. Separators "," and ".", signs "1+" and "-".
 std::vector<int32_t> codes_of(const Form& form, LXLocale* locale, std::u16string_view text, uint32_t flags) {
   std::vector<int32_t> codes;
   with_calls(form, [&](auto call) {
@@ -226,7 +236,7 @@ std::vector<int32_t> codes_of(const Form& form, LXLocale* locale, std::u16string
       std::vector<Unit> result(units.begin(), units.end());
       return result.push_back(0), result;
     };
-    const auto separators = stored(u",."), plus = stored(u"<+"), minus = stored(u"-"), units = stored(text);
+    const auto separators = stored(u",."), plus = stored(u"1+"), minus = stored(u"-"), units = stored(text);
     const Unit *at = units.data(), *end = at + units.size() - 1;
     for (uint32_t state = 0; codes.empty() || codes.back() != -1;) {
       codes.push_back(call(kGetDigit, locale, at, State{state}, static_cast<int32_t>(end - at), &at, StateAt{&state},
@@ -240,11 +250,11 @@ std::vector<int32_t> codes_of(const Form& form, LXLocale* locale, std::u16string
 TEST(Digits, Codes) {
   for_each_form([](const Form& form, LXLocale* locale) {
     const std::vector<int32_t> kCodes = {44, 40, 1, 42, 2, 43, 10, 35, 44, 41, -1, 1},
-                               kWide = {1, 42, 42, 41, 40, 44, -1, 1};
-    EXPECT_EQ(codes_of(form, locale, u" \t <+1,2.aZ\n-<", 0), kCodes);
+                               kWide = {2, 42, 42, 41, 40, 44, -1, 1};
+    EXPECT_EQ(codes_of(form, locale, u" \t 1+1,2.aZ\n-<", 0), kCodes);
     EXPECT_EQ(codes_of(form, locale, u"1", 2), (std::vector<int32_t>{-1, 1}));
     EXPECT_EQ(LXGetError(locale), LX_E_ARGUMENT);
-    std::u16string_view wide = u"\uFF11\uFF0C,-<\uFF0B\u3000<";
+    std::u16string_view wide = u"\uFF12\uFF0C,-1\uFF0B\u3000<";
     EXPECT_TRUE(!can_be_spelled(form, wide) || codes_of(form, locale, wide, LX_NUM_FULLWIDTH) == kWide);
   });
 }

@@ -161,6 +161,11 @@ TEST(WrittenNumbers, NegativeSignHasAtMostThreeCharacters) {
   expect({{LX_ITEM_POSITIVE_SIGN, u"plus"}}, {money, 1}, u"plus$1.00");
 }
 
+TEST(WrittenNumbers, TextsHaveAtMost31Units) {
+  const std::u16string symbol(40, u'x');
+  expect({{LX_ITEM_CURRENCY, symbol.c_str()}}, {money, 1}, symbol.substr(9) + u"1.00");
+}
+
 TEST(WrittenNumbers, SignsStandInFivePlaces) {
   constexpr const char16_t* kLayouts[] = {u"($1.00)", u"($ 1.00)", u"(1.00$)", u"(1.00 $)",  //
                                           u"-$1.00",  u"-$ 1.00",  u"-1.00$",  u"-1.00 $",   //
@@ -175,8 +180,11 @@ TEST(WrittenNumbers, SignsStandInFivePlaces) {
 }
 
 TEST(WrittenNumbers, TerritoryIsAskedOnRequest) {
-  const std::vector<Setting> settings = {{LX_ITEM_MON_GROUPING, u"2;0"}, {LX_ITEM_CURRENCY_DIGITS, kNumber, 3}};
-  expect(settings, {money, 1234}, u"$12,34.000");
+  const std::vector<Setting> settings = {{LX_ITEM_MON_GROUPING, u"2;0"},
+                                         {LX_ITEM_MON_THOUSANDS, u"'"},
+                                         {LX_ITEM_CURRENCY_DIGITS, kNumber, 3},
+                                         {LX_ITEM_P_CS_PRECEDES, kNumber, 0}};
+  expect(settings, {money, 1234}, u"12'34.000$");
   expect(settings, {money, 1234, LX_NUM_TEXTOPT}, u"$1,234.00");
 }
 
@@ -197,7 +205,9 @@ TEST(WrittenNumbers, LengthsAndTextsFollowShiftStates) {
   set(locale.get(), {LX_ITEM_CURRENCY, u"円"});
   EXPECT_EQ(hex(written(Form::shifted, locale.get(), {money, 1})).substr(0, 10), "0E46450FF1");
   static char buffer[1000];
-  EXPECT_EQ(LXLongToStringEx(locale.get(), 12345, buffer, 1, 2, LX_NUM_CHARLEN), 4);  // two of a double-byte run
+  // Digits inside a double-byte run count in pairs; an integer's sign counts for itself.
+  EXPECT_EQ(LXLongToStringEx(locale.get(), -123456, buffer, 1, 3, LX_NUM_CHARLEN), 5);
+  EXPECT_EQ(LXDoubleToStringEx(locale.get(), -123456, buffer, 1, 3, LX_NUM_CHARLEN), 6);
   set(locale.get(), {LX_ITEM_CURRENCY_DIGITS, kNumber, 999});
   EXPECT_EQ(LXCurrencyToString(locale.get(), 1, buffer, 1000, LX_NUM_CHARLEN), 512);
 }
@@ -213,7 +223,9 @@ TEST(WrittenNumbers, RefuseOtherFlags) {
         << i;
     EXPECT_EQ(LXGetError(locale.get()), good ? LX_OK : LX_E_ARGUMENT);
   }
-  EXPECT_EQ(LXCurrencyToString(locale.get(), 1, buffer, 0, LX_NUM_CHARLEN | 0x100), 0);  // no room comes first here
+  for (int32_t length : {0, -1}) {  // no room comes first here
+    EXPECT_EQ(LXCurrencyToString(locale.get(), 1, buffer, length, LX_NUM_CHARLEN | 0x100), 0);
+  }
 }
 
 TEST(WrittenNumbers, NeedNoMemory) {
