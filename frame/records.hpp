@@ -74,6 +74,7 @@ struct LXObjMgr {
   uint8_t no_defaults;
   char directory[256];  // empty on built-in data
   lx::Alias* aliases;
+  uint32_t alias_count;
   char* alias_text;
   std::atomic<const void*> pairs[lx::kPairPlaces];
 };

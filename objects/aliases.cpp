@@ -5,6 +5,7 @@
 
 #include <cstdio>
 #include <cstring>
+#include <span>
 
 #include "frame/call.hpp"
 #include "frame/data_file.hpp"
@@ -24,15 +25,28 @@ constexpr bool is_white(char character) {
   return character == ' ' || character == '\t' || character == '\r' || character == '\n';
 }
 
+// One record for every word is room enough: the names of the code pages take none.
+size_t count_words(const char* text, size_t length) {
+  size_t count = 0;
+  bool before = true;
+  for (size_t i = 0; i < length; ++i) {
+    bool white = is_white(text[i]);
+    count += before && !white ? 1 : 0;
+    before = white;
+  }
+  return count;
+}
+
 // Reads the text in place: names are terminated and aliases turned to upper case where they stand.
 class AliasReader {
  public:
-  explicit AliasReader(LXObjMgr& manager) : tail_(&manager.aliases) {}
+  explicit AliasReader(LXObjMgr& manager) : manager_(manager) {}
 
   // `text` has room for one character more than `length`.
   bool read(char* text, size_t length) {
     char* end = text + length;
     *end = '\n';
+    words_ = count_words(text, length);
     while (text < end) {
       auto* line_end = static_cast<char*>(std::memchr(text, '\n', static_cast<size_t>(end - text) + 1));
       auto line_length = static_cast<size_t>(line_end - text);
@@ -98,27 +112,32 @@ class AliasReader {
                alias.text, kMaxCodePageName);
       return false;
     }
-    auto* record = static_cast<Alias*>(allocate(sizeof(Alias)));
-    if (record == nullptr) {
-      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for codepage %s, alias %s", kRecordSize, code_page_,
-               alias.text);
-      return false;
-    }
+    if (manager_.aliases == nullptr && !make_room(alias)) return false;
     LX_TRACE(TRC1_LEVEL_DETAIL, "Processing alias '%s'", alias.text);
     for (size_t i = 0; i < alias.length; ++i) {
       char character = alias.text[i];
       if (character >= 'a' && character <= 'z') alias.text[i] = static_cast<char>(character - ('a' - 'A'));
     }
-    *record = {nullptr, code_page_, alias.text, static_cast<uint8_t>(alias.length)};
-    LX_TRACE(TRC1_LEVEL_DETAIL, "Saved alias %s, length = %d", record->alias, static_cast<int>(alias.length));
-    *tail_ = record;
-    tail_ = &record->next;
+    Alias& record = manager_.aliases[manager_.alias_count++];
+    record = {code_page_, alias.text, static_cast<uint8_t>(alias.length)};
+    LX_TRACE(TRC1_LEVEL_DETAIL, "Saved alias %s, length = %d", record.alias, static_cast<int>(alias.length));
     return true;
   }
 
-  Alias** tail_;
+  bool make_room(const Token& alias) {
+    manager_.aliases = static_cast<Alias*>(allocate(words_ * sizeof(Alias)));
+    if (manager_.aliases != nullptr) return true;
+    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for codepage %s, alias %s", kRecordSize, code_page_,
+             alias.text);
+    return false;
+  }
+
+  LXObjMgr& manager_;
+  size_t words_ = 0;
   const char* code_page_ = nullptr;
 };
+
+std::span<const Alias> aliases_of(const LXObjMgr& manager) { return {manager.aliases, manager.alias_count}; }
 
 // The text of the file, with room for one character more; null when it cannot be read whole.
 Owned<char> load_text(const char* name, size_t& length) {
@@ -179,10 +198,10 @@ const char* LXGetCodepageFromAlias(LXObjMgr* manager, const char* name) noexcept
     if (manager == nullptr || name == nullptr) return nullptr;
     LX_TRACE(TRC1_LEVEL_PARAMETER, "Searching for %s.", name);
     size_t length = std::strlen(name);
-    for (const Alias* alias = manager->aliases; alias != nullptr; alias = alias->next) {
-      if (alias->alias_length != length || compare_ignoring_case(alias->alias, name, length) != 0) continue;
-      LX_TRACE(TRC1_LEVEL_PARAMETER, "%s -> %s", alias->alias, alias->code_page);
-      return alias->code_page;
+    for (const Alias& alias : aliases_of(*manager)) {
+      if (alias.alias_length != length || compare_ignoring_case(alias.alias, name, length) != 0) continue;
+      LX_TRACE(TRC1_LEVEL_PARAMETER, "%s -> %s", alias.alias, alias.code_page);
+      return alias.code_page;
     }
     return nullptr;
   });
@@ -191,9 +210,8 @@ const char* LXGetCodepageFromAlias(LXObjMgr* manager, const char* name) noexcept
 uint32_t LXDestroyAliasList(LXObjMgr* manager) noexcept {
   return exported(trace_unit, __func__, [&]() -> uint32_t {
     if (manager == nullptr) return 0;
-    for (Alias* alias = std::exchange(manager->aliases, nullptr); alias != nullptr;) {
-      release(std::exchange(alias, alias->next));
-    }
+    Owned<Alias>(std::exchange(manager->aliases, nullptr));
+    manager->alias_count = 0;
     Owned<char>(std::exchange(manager->alias_text, nullptr));
     return 0;
   });
@@ -202,8 +220,8 @@ uint32_t LXDestroyAliasList(LXObjMgr* manager) noexcept {
 int32_t LXEnumAliases(LXObjMgr* manager, LXEnumAliasFn callback, void* context) noexcept {
   return exported(trace_unit, __func__, [&]() -> int32_t {
     if (manager == nullptr || callback == nullptr) return 0;
-    for (const Alias* alias = manager->aliases; alias != nullptr; alias = alias->next) {
-      if (callback(context, alias->alias, alias->code_page) == 0) break;
+    for (const Alias& alias : aliases_of(*manager)) {
+      if (callback(context, alias.alias, alias.code_page) == 0) break;
     }
     return 0;
   });

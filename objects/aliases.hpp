@@ -11,7 +11,6 @@ inline constexpr int kMaxAlias = 64;
 // One further name of a code page, in the order of the file. The names stand in the text of the file, which the manager
 // keeps, with terminators in the place of the white space behind them.
 struct Alias {
-  Alias* next;
   const char* code_page;  // as written
   const char* alias;      // in upper case
   uint8_t alias_length;
