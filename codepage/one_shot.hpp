@@ -52,7 +52,9 @@ struct Target {
 
   size_t text_size() const { return terminate && size != 0 ? size - 1 : size; }
   // Units that a writer of bytes may use.
-  size_t byte_room() const { return characters ? text_size() * (kMaxCharacterLength + 1) + 2 : text_size(); }
+  size_t byte_room() const {
+    return characters && size != 0 ? text_size() * (kMaxCharacterLength + 1) + 2 : text_size();
+  }
 };
 
 struct OneShotResult {

@@ -3,56 +3,22 @@
 // caller has as it was.
 #include <gtest/gtest.h>
 
+#include <clocale>
+
 #include "faults/each_allocation.hpp"
 #include "support/environment.hpp"
 #include "support/session.hpp"
+#include "support/system_locales.hpp"
 
 namespace lx::test {
 namespace {
 
 constexpr char kName[] = "German_Germany.Small@BINARY";
-const LXWChar kWideName[] = {'G', 'e', 'r', 'm', 'a', 'n', '.', 't', 'i', 'n', 'y', 0};
-const LXUChar kUcs2Name[] = {'G', 'e', 'r', 'm', 'a', 'n', '_', 'G', 'e', 'r', 'm', 'a', 'n', 'y', 0};
-
 LXLocale* g_locale;
-LXConversion* g_conversion;
 uint32_t g_rc;
 
 void release_locale() { EXPECT_EQ(LXReleaseLocale(std::exchange(g_locale, nullptr), 0), LX_OK); }
 uint32_t got_locale() { return (g_locale != nullptr) == (g_rc == LX_OK) ? g_rc : kFailed; }
-
-TEST(Allocation, OfLocales) {
-  auto check = [] {
-    ASSERT_NE(g_locale, nullptr);
-    EXPECT_EQ(LXGetObjId(LXGetLocaleObject(g_locale, LX_CODEPAGE)), 900);
-    LXCodePageInfo info;
-    EXPECT_EQ(LXGetCodePageInfo(LXGetLocaleObject(g_locale, LX_CODEPAGE), &info), LX_OK);
-    EXPECT_EQ(info.max_length, 4);
-    release_locale();
-  };
-  fail_each_allocation({"LXGetLocale", [] { return g_locale = LXGetLocale(kName, 0, &g_rc), got_locale(); }, check});
-  fail_each_allocation({"LXGetLocale with substitution",
-                        [] { return g_locale = LXGetLocale(kName, LX_GET_SUBSTITUTE, &g_rc), got_locale(); }, check});
-  fail_each_allocation(
-      {"LXGetLocaleW", [] { return g_locale = LXGetLocaleW(kWideName, 0, &g_rc), got_locale(); }, check});
-}
-
-// The name itself is converted with a code page; when that cannot be loaded the name counts as empty.
-TEST(Allocation, OfLocalesWithUcs2Names) {
-  auto load_ascii = [] { LXGetObjFromID(LXGetObjManager(), LX_CODEPAGE, 367, 0, &g_rc); };
-  fail_each_allocation(
-      {"LXGetLocaleU", [] { return g_locale = LXGetLocaleU(kUcs2Name, 0, &g_rc), got_locale(); }, release_locale},
-      load_ascii);
-}
-
-TEST(Allocation, OfTheDefaultLocale) {
-  fail_each_allocation({"LXSetLocale", [] { return LXSetLocale(kName, 0); },
-                        [] { EXPECT_EQ(LXGetObjId(LXGetLocaleObject(nullptr, LX_TERRITORY)), 2); }, LX_E_MEMORY,
-                        [] { EXPECT_EQ(LXGetObjId(LXGetLocaleObject(nullptr, LX_TERRITORY)), 1); }},
-                       [] { ASSERT_EQ(LXSetLocale("English", 0), LX_OK); });
-  fail_each_allocation({"LXSetLocaleW", [] { return LXSetLocaleW(kWideName, 0); }, [] {}, LX_E_MEMORY,
-                        [] { EXPECT_EQ(lxglocale, nullptr); }});
-}
 
 // Objects of every type and layout, on their own. What was not loaded can still be.
 TEST(Allocation, OfObjects) {
@@ -67,56 +33,6 @@ TEST(Allocation, OfObjects) {
                           LXObjEntry* entry = LXGetObjFromNameW(LXGetObjManager(), LX_LANGUAGE, english, -1, 1, &g_rc);
                           return (entry != nullptr) == (g_rc == LX_OK) ? g_rc : kFailed;
                         }});
-}
-
-TEST(Allocation, OfConversions) {
-  fail_each_allocation(
-      {"LXOpenConversion",
-       [] {
-         g_conversion = LXOpenConversion(g_locale, g_locale, 0);
-         EXPECT_EQ(g_conversion == nullptr, LXGetError(g_locale) == LX_E_MEMORY);
-         return LXGetError(g_locale);
-       },
-       [] { EXPECT_EQ(LXCloseConversion(std::exchange(g_conversion, nullptr)), LX_OK); }},
-      [] { g_locale = LXGetLocale(kName, 0, nullptr); }, release_locale);
-}
-
-TEST(Allocation, OfFiles) {
-  static LXFile* file;
-  static void* block;
-  static const std::string path = small_directory().file("control.nls");
-  auto open = [] { return file = LXOpenFile(1, path.c_str(), 0, 0, &g_rc), g_rc; };
-  auto close = [] { EXPECT_EQ(LXCloseFile(file, 0), 0u); };
-  fail_each_allocation({"LXOpenFile", open, close});
-  fail_each_allocation(
-      {"LXLoadFile", [] { return block = LXLoadFile(file, 0, 76, &g_rc), g_rc; }, [] { LXUnloadFile(block); }},
-      [&] { open(); }, close);
-}
-
-TEST(Allocation, OfAliases) {
-  fail_each_allocation({"LXBuildAliasList", [] { return LXBuildAliasList(LXGetObjManager()); },
-                        [] { EXPECT_NE(LXGetCodepageFromAlias(LXGetObjManager(), "little"), nullptr); }, 1},
-                       [] { LXDestroyAliasList(LXGetObjManager()); });
-}
-
-TEST(Allocation, OfConvertedSections) {
-  const Bytes file = multibyte_page_file(true);
-  const uint8_t* section1 = file.data() + 76;
-  auto size1 = static_cast<uint16_t>(file[10] << 8 | file[11]);
-  auto size2 = static_cast<uint16_t>(file[16] << 8 | file[17]);
-  static uint8_t* made1;
-  static uint8_t* made2;
-  fail_each_allocation({"LXCpV1toV2",
-                        [&] {
-                          made1 = LXCpV1toV2(section1, size1, section1 + size1, size2, &made2);
-                          EXPECT_EQ(made1 == nullptr, made2 == nullptr);
-                          return made1 != nullptr ? LX_OK : kFailed;
-                        },
-                        [] {
-                          LXUnloadFile(made1);
-                          LXUnloadFile(made2);
-                        },
-                        kFailed});
 }
 
 // A second manager: its aliases may be incomplete, all else is told.
@@ -193,38 +109,40 @@ TEST(Allocation, OfObjectsThatHaveStandIns) {
   }
 }
 
-// Nothing on the way of text takes memory.
-TEST(Allocation, NoneForText) {
-  CountingAllocator allocator;
-  ASSERT_EQ(allocator.init(small_directory().path()), LX_OK);
-  Locale small(LXGetLocale("English.Small", 0, nullptr));
-  Locale mixed(LXGetLocale("English.Mixed", 0, nullptr));
-  Conversion handle(LXOpenConversion(small.get(), mixed.get(), 0));
-  allocator.arm(0, true);
-  const std::string text(2000, 'x');
-  std::vector<char> bytes(5000);
-  std::vector<LXUChar> units(5000);
-  std::vector<LXWChar> wide(5000);
-  for (auto [target, source] : {std::pair(small.get(), mixed.get()), {mixed.get(), small.get()}}) {
-    EXPECT_EQ(LXConvertString(target, bytes.data(), 5000, source, text.data(), 2000, 0), 2000);
-    EXPECT_EQ(LXConvertStringEx(target, bytes.data(), 0, 5000, source, text.data(), 0, 2000, 0), 2000);
-    EXPECT_EQ(LXStringToUnicode(source, units.data(), 5000, text.data(), 2000, 0), 2000);
-    EXPECT_EQ(LXUnicodeToString(target, bytes.data(), 5000, units.data(), 2000, 0), 2000);
-    EXPECT_EQ(LXMbToWide(source, wide.data(), 5000, text.data(), 2000, 0), 2000);
-    EXPECT_EQ(LXWideToMb(source, bytes.data(), 5000, wide.data(), 2000, 0), 2000);
+// The system's values are an extra: without memory for them the locale keeps its territory's, each as a whole.
+TEST(Allocation, OfSystemValues) {
+  const SystemLocales system({{"de_CH", "de_CH", "ISO-8859-1"}});
+  Variable lx_lang("LX_LANG", nullptr);
+  Variable all("LC_ALL", system.made() ? "de_CH" : "C");
+  std::string former, latter;
+  for (bool user : {false, true}) {
+    bool failed = true;
+    for (int n = 0; failed; ++n) {
+      SCOPED_TRACE(n);
+      CountingAllocator allocator;
+      ASSERT_EQ(allocator.init(small_directory().path(), LX_INIT_NO_DEFAULTS), LX_OK);
+      allocator.arm(n, n % 2 == 1);
+      uint32_t rc = 99;
+      Locale locale(user ? LXGetLocale(nullptr, LX_GET_USER | LX_GET_SUBSTITUTE, &rc)
+                         : LXConvertNativeLocale(system.made() ? "de_CH" : "C", LX_GET_SUBSTITUTE, &rc));
+      failed = allocator.has_failed();
+      allocator.disarm();
+      EXPECT_EQ(rc, locale != nullptr ? LX_OK : LX_E_MEMORY);
+      EXPECT_STREQ(std::setlocale(LC_ALL, nullptr), "C");
+      if (locale != nullptr) {
+        for (uint32_t item : {LX_ITEM_GROUPING, LX_ITEM_MON_GROUPING}) {
+          char text[16];
+          EXPECT_GT(LXGetLocaleTextInfo(locale.get(), item, text, 16, 0), 1);
+          EXPECT_TRUE(text == std::string("3;0") || text == std::string("3;2;0") || text == std::string("3;3;0"))
+              << text;
+        }
+        EXPECT_EQ(LXGetLocaleNumInfo(locale.get(), LX_ITEM_CURRENCY_DIGITS, 0), system.made() ? 2 : 3);
+      }
+      locale.reset();
+      EXPECT_EQ(LXTerm(), LX_OK);
+      ASSERT_EQ(allocator.live, 0);
+    }
   }
-  const char* in = text.data();
-  char* out = bytes.data();
-  int32_t left = 2000, room = 5000;
-  EXPECT_EQ(LXConvertBuffer(handle.get(), &out, &room, &in, &left, 0), LX_OK);
-  EXPECT_EQ(LXFinishConversion(handle.get(), &out, &room), LX_OK);
-  EXPECT_EQ(allocator.calls, 0);
-  allocator.disarm();
-  handle.reset();
-  small.reset();
-  mixed.reset();
-  EXPECT_EQ(LXTerm(), LX_OK);
-  EXPECT_EQ(allocator.live, 0);
 }
 
 }  // namespace
