@@ -33,7 +33,7 @@ TEST_F(Locale, OfTheUser) {
   } cases[] = {
       {{}, "English_UnitedStates.US-ASCII@Binary", ""},
       {{{"LANG", "ja_JP.PCK"}}, "Japanese_Japan.MS932@Binary", ""},
-      {{{"LANG", "de_CH.UTF-8"}}, "German_German-Switzerland.UTF-8@Default", "de_CH.UTF-8 is taken as German_German-S"},
+      {{{"LANG", "de_CH.UTF-8"}}, "German_German-Switzerland.UTF-8@Default", "de_CH.UTF-8 wird als German_German-S"},
       {{{"LANG", "C.UTF-8"}}, "English_UnitedStates.UTF-8@Binary", "is taken as"},
       {{{"LANG", "en_GB.utf8"}}, "English_UnitedKingdom.UTF-8@Default", "is taken as"},
       {{{"LANG", "nb_NO.UTF-8"}}, "Norwegian_Norway.UTF-8@Danish", "is taken as"},

@@ -38,7 +38,7 @@ struct CatalogDeleter {
 };
 using CatalogPtr = std::unique_ptr<LXCatalog, CatalogDeleter>;
 
-Failure bad_catalog(const std::string& file, const std::string& why) {
+Failure bad_catalog(const std::string& file, const Message& why) {
   return {ExitStatus::kDataProblem, display_name(file) + ": " + why};
 }
 
@@ -48,11 +48,11 @@ compiler::Catalog read_catalog(const std::string& path) {
   InputFile input(path);
   std::vector<char> piece(64 * 1024);
   while (const std::size_t count = input.read(piece)) bytes.append(piece.data(), count);
-  if (!compiler::is_catalog(bytes)) throw bad_catalog(path, "this is no message catalog");
+  if (!compiler::is_catalog(bytes)) throw bad_catalog(path, message("this is no message catalog"));
   try {
     return compiler::unpack_catalog(bytes);
   } catch (const compiler::StructureError& error) {
-    throw bad_catalog(path, error.what());
+    throw bad_catalog(path, message(error.what()));
   }
 }
 
@@ -107,7 +107,8 @@ ExitStatus run_catalog(const CatalogOptions& options, const CommonOptions& commo
     }
   }
   output.commit();
-  if (!found && options.set) throw bad_catalog(options.file, options.message ? "no such message" : "no such set");
+  if (!found && options.set)
+    throw bad_catalog(options.file, options.message ? message("no such message") : message("no such set"));
   return ExitStatus::kExact;
 }
 

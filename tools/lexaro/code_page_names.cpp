@@ -50,17 +50,17 @@ LXObjEntry* find_code_page(const std::string& wanted) {
 }
 
 Failure unknown_code_page(const std::string& wanted) {
-  const std::string shown = display_name(wanted);
+  const Message shown = display_name(wanted);
   if (is_wide_encoding(wanted)) {
-    return {ExitStatus::kCodePage, shown +
-                                       " is not a code page: texts of two or four byte units are not converted; "
-                                       "the Unicode page is UTF-8"};
+    return {ExitStatus::kCodePage, message("{0} is not a code page: texts of two or four byte units are not converted; "
+                                           "the Unicode page is UTF-8",
+                                           shown)};
   }
   NearNames names(wanted);
   LXEnumLocales(offer_page, &names, 0);
   LXEnumAliases(LXGetObjManager(), offer_alias, &names);
-  return {ExitStatus::kCodePage, "unknown code page \"" + shown + "\"" + names.question() +
-                                     "\n\"lexaro list codepages --aliases\" shows all names."};
+  return {ExitStatus::kCodePage, message("unknown code page \"{0}\"", shown) + names.question() + "\n" +
+                                     message("\"lexaro list codepages --aliases\" shows all names.")};
 }
 
 CodePage open_code_page(const std::string& wanted) {
@@ -73,12 +73,12 @@ CodePage open_code_page(const std::string& wanted) {
   page.id = LXGetObjId(entry);
   uint32_t rc = 0;
   if (!LXLoadObj(LXGetObjManager(), entry, &rc) || rc != LX_OK) {
-    throw Failure(ExitStatus::kCodePage, "code page " + page.name + ": " + describe_status(rc));
+    throw Failure(ExitStatus::kCodePage, message("code page {0}: {1}", page.name, describe_status(rc)));
   }
   page.locale.reset(LXGetLocale(("English_UnitedStates." + page.name + "@BINARY").c_str(), 0, &rc));
   if (!page.locale || LXGetLocaleObject(page.locale.get(), LX_CODEPAGE) != entry) {
     throw Failure(ExitStatus::kCodePage,
-                  "code page " + page.name + ": no locale with it (" + describe_status(rc) + ")");
+                  message("code page {0}: no locale with it ({1})", page.name, describe_status(rc)));
   }
   return page;
 }

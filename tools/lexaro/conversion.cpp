@@ -39,7 +39,7 @@ bool Conversion::step(Call call) {
   if (!converted.empty()) sink_(converted);
   if (status == LX_OK || status == LX_E_PARTIAL) return false;
   if (status != LX_E_FULL || converted.empty()) {
-    throw std::logic_error("the conversion stopped: " + describe_status(status));
+    throw std::logic_error("the conversion stopped: " + describe_status(status).english);
   }
   return true;
 }

@@ -9,7 +9,7 @@ namespace lx::tool {
 
 FileResult convert_file(InputFile& input, OutputFile& output, const ConversionSettings& settings, Progress& progress) {
   FileResult result;
-  result.name = input.name();
+  result.name = plain_name(input.path());
   std::optional<Verifier> verifier;
   if (settings.verify) verifier.emplace(settings.from, settings.to);
 

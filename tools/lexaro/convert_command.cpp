@@ -42,17 +42,18 @@ uint32_t line_end_bits(const std::string& name) {
 void settle_options(ConvertOptions& options) {
   settle_run_options(options);
   if (options.verify && options.line_ends != "keep") {
-    throw usage_failure("--verify compares with the unchanged input: it cannot go with --nl " + options.line_ends);
+    throw usage_failure(
+        message("--verify compares with the unchanged input: it cannot go with --nl {0}", options.line_ends));
   }
   if (options.verify && options.discard) {
-    throw usage_failure("--verify compares with the whole input: it cannot go with -c");
+    throw usage_failure(message("--verify compares with the whole input: it cannot go with -c"));
   }
 }
 
-void tell_result(const FileResult& result, bool discarded) {
-  const std::string summary = result.problems.summary(result.counts, discarded);
-  if (!summary.empty()) complain(result.name + ": " + summary);
-  if (result.difference) complain(result.name + ": " + result.difference->describe());
+void tell_result(const std::string& file, const FileResult& result, bool discarded) {
+  const Message summary = result.problems.summary(result.counts, discarded);
+  if (!summary.empty()) complain(display_name(file) + ": " + summary);
+  if (result.difference) complain(display_name(file) + ": " + result.difference->describe());
 }
 
 // Converts all files and puts the output in place.
@@ -63,7 +64,7 @@ void convert_files(const ConvertOptions& options, const ConversionSettings& sett
     InputFile input = open_input(file, output);
     FileResult result = convert_file(input, output, settings, progress);
     progress.clear();
-    if (!options.silent) tell_result(result, options.discard);
+    if (!options.silent) tell_result(file, result, options.discard);
     if (!result.exact()) report.status = ExitStatus::kDataProblem;
     if (options.report.empty()) result.problems = {};
     report.files.push_back(std::move(result));

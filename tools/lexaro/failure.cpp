@@ -2,23 +2,25 @@
 #include "tools/lexaro/failure.hpp"
 
 #include <cstdio>
-#include <system_error>
 
 namespace lx::tool {
 
-Failure usage_failure(const std::string& message) { return {ExitStatus::kUsage, message}; }
+Failure usage_failure(const Message& text) { return {ExitStatus::kUsage, text}; }
 
-Failure system_failure(const std::string& subject, int error_number) {
-  return {ExitStatus::kInputOutput, subject + ": " + std::generic_category().message(error_number)};
+Failure system_failure(const Message& subject, int error_number) {
+  return {ExitStatus::kInputOutput, subject + ": " + system_error_text(error_number)};
 }
 
-void complain(std::string_view text) {
-  std::string line = "lexaro: ";
-  line.append(text).push_back('\n');
+void complain(const Message& text) {
+  const std::string line = "lexaro: " + text.shown + "\n";
   std::fwrite(line.data(), 1, line.size(), stderr);
 }
 
-std::string display_name(const std::string& path) {
+Message display_name(const std::string& path) {
+  return path == "-" ? message("standard input") : Message(plain_name(path));
+}
+
+std::string plain_name(const std::string& path) {
   if (path == "-") return "standard input";
   if (path.empty()) return "\"\"";
   std::string shown = path;

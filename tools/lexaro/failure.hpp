@@ -6,6 +6,8 @@
 #include <string>
 #include <string_view>
 
+#include "tools/messages/message.hpp"
+
 namespace lx::tool {
 
 // The program's exit codes; scripts rely on them.
@@ -20,24 +22,28 @@ enum class ExitStatus : int {
 // Ends the command. A quiet failure is told by the exit code alone.
 class Failure : public std::runtime_error {
  public:
-  Failure(ExitStatus status, const std::string& message, bool quiet = false)
-      : std::runtime_error(message), status_(status), quiet_(quiet) {}
+  Failure(ExitStatus status, const Message& text, bool quiet = false)
+      : std::runtime_error(text.english), status_(status), text_(text), quiet_(quiet) {}
+  const Message& text() const { return text_; }
   ExitStatus status() const { return status_; }
   bool quiet() const { return quiet_; }
 
  private:
   ExitStatus status_;
+  Message text_;
   bool quiet_;
 };
 
-Failure usage_failure(const std::string& message);
+Failure usage_failure(const Message& text);
 // "subject: text of the error number".
-Failure system_failure(const std::string& subject, int error_number);
+Failure system_failure(const Message& subject, int error_number);
 
 // Writes "lexaro: text" to standard error.
-void complain(std::string_view text);
+void complain(const Message& text);
 
 // A file name as messages show it: no control bytes reach the terminal, and "-" reads "standard input".
-std::string display_name(const std::string& path);
+Message display_name(const std::string& path);
+// ... as reports do: in English.
+std::string plain_name(const std::string& path);
 
 }  // namespace lx::tool

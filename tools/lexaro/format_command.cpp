@@ -30,7 +30,7 @@ Exit codes: 0 done, 1 some values could not be written, 2 usage, 3 input or outp
 failed, 4 unknown locale or code page, or bad locale data.
 
 Examples:
-  lexaro format integer --locale German_Switzerland 1234567 -5
+  lexaro format integer --locale de_CH.UTF-8 1234567 -5
   lexaro format currency --locale fr_FR 1234.5
   lexaro format currency --locale English_Canada --international 99
   lexaro format time --locale Japanese --format "%A %#x" 2026-11-22
@@ -123,30 +123,30 @@ class Formatter {
     if (options_.kind == "integer") {
       const auto number = read_integer(given, options_.is_unsigned);
       if (!number)
-        return refuse(value, options_.is_unsigned ? "not an integer from 0 to 4294967295"
-                                                  : "not an integer from -2147483648 to 2147483647");
+        return refuse(value, options_.is_unsigned ? message("not an integer from 0 to 4294967295")
+                                                  : message("not an integer from -2147483648 to 2147483647"));
       count = Out::integer(locale_, *number, buffer_.data(), flags_);
     } else if (options_.kind == "time") {
       const auto time = read_time(given);
-      if (!time) return refuse(value, "not a time such as 2026-11-22 or 2026-11-22T13:05:09");
+      if (!time) return refuse(value, message("not a time such as 2026-11-22 or 2026-11-22T13:05:09"));
       count = Out::time(locale_, *time, buffer_.data(), format_, flags_);
     } else {
       const auto number = read_number<double>(given);
-      if (!number) return refuse(value, "not a number");
+      if (!number) return refuse(value, message("not a number"));
       count = options_.kind == "number" ? Out::number(locale_, *number, buffer_.data(), flags_)
                                         : Out::currency(locale_, *number, buffer_.data(), flags_);
     }
     const uint32_t status = LXGetError(locale_);
     if (status != LX_OK) {
-      return refuse(
-          value, status == LX_E_FORMAT ? "the format has an unknown or incomplete directive" : describe_status(status));
+      return refuse(value, status == LX_E_FORMAT ? message("the format has an unknown or incomplete directive")
+                                                 : describe_status(status));
     }
     text.assign(buffer_.data(), buffer_.data() + count);
     return true;
   }
 
  private:
-  static bool refuse(const Value& value, const std::string& why) {
+  static bool refuse(const Value& value, const Message& why) {
     complain_about(value, why);
     return false;
   }
@@ -183,7 +183,7 @@ bool write_in_code_page(LXLocale* locale, const FormatOptions& options, const st
                         OutputFile& output) {
   const CodePage page = open_code_page(options.code_page);
   if (LXSetLocaleNumInfo(locale, LX_ITEM_CODEPAGE_ID, page.id) == 0) {
-    throw Failure(ExitStatus::kCodePage, "code page " + page.name + ": " + describe_status(LXGetError(locale)));
+    throw Failure(ExitStatus::kCodePage, message("code page {0}: {1}", page.name, describe_status(LXGetError(locale))));
   }
   const LineEnds ends(page);
   std::string page_format;
@@ -202,7 +202,7 @@ void check_options(const CLI::App& app, const FormatOptions& options) {
   } rules[] = {{"--unsigned", "integer"}, {"--international", "currency"}, {"--format", "time"}};
   for (const auto& rule : rules) {
     if (app.count(rule.option) != 0 && options.kind != rule.kind) {
-      throw usage_failure(std::string(rule.option) + " goes with \"" + rule.kind + "\" only");
+      throw usage_failure(message("{0} goes with \"{1}\" only", rule.option, rule.kind));
     }
   }
 }

@@ -10,19 +10,26 @@
 
 namespace lx::tool {
 
-InputFile::InputFile(const std::string& path) : name_(display_name(path)), fd_(STDIN_FILENO) {
+InputFile::InputFile(const std::string& path) : path_(path), fd_(STDIN_FILENO) {
   if (path != "-") {
     owned_ = FileDescriptor(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY));
-    if (!owned_) throw system_failure(name_, errno);
+    if (!owned_) throw failure(errno);
     fd_ = owned_.get();
   }
-  if (::fstat(fd_, &status_) != 0) throw system_failure(name_, errno);
-  if (S_ISDIR(status_.st_mode)) throw system_failure(name_, EISDIR);
+  if (::fstat(fd_, &status_) != 0) throw failure(errno);
+  if (S_ISDIR(status_.st_mode)) throw failure(EISDIR);
 }
+
+Message InputFile::name() const { return display_name(path_); }
+
+Failure InputFile::failure(int error_number) const { return system_failure(name(), error_number); }
 
 std::size_t InputFile::read(std::span<char> buffer) {
   const ssize_t count = persist(fd_, POLLIN, [&] { return ::read(fd_, buffer.data(), buffer.size()); });
-  if (count < 0) throw system_failure(name_ + ": read error at byte " + std::to_string(offset_), errno);
+  if (count < 0) {
+    const int error_number = errno;
+    throw system_failure(message("{0}: read error at byte {1}", name(), offset_), error_number);
+  }
   offset_ += static_cast<uint64_t>(count);
   return static_cast<std::size_t>(count);
 }
@@ -30,10 +37,10 @@ std::size_t InputFile::read(std::span<char> buffer) {
 uint64_t InputFile::skip(uint64_t wanted) {
   if (S_ISREG(status_.st_mode)) {
     const off_t at = ::lseek(fd_, 0, SEEK_CUR);
-    if (at < 0) throw system_failure(name_, errno);
+    if (at < 0) throw failure(errno);
     const uint64_t left = status_.st_size > at ? static_cast<uint64_t>(status_.st_size - at) : 0;
     const uint64_t skipped = std::min(wanted, left);
-    if (::lseek(fd_, static_cast<off_t>(skipped), SEEK_CUR) < 0) throw system_failure(name_, errno);
+    if (::lseek(fd_, static_cast<off_t>(skipped), SEEK_CUR) < 0) throw failure(errno);
     offset_ += skipped;
     return skipped;
   }

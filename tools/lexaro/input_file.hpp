@@ -9,6 +9,7 @@
 #include <span>
 #include <string>
 
+#include "tools/lexaro/failure.hpp"
 #include "tools/lexaro/file_descriptor.hpp"
 
 namespace lx::tool {
@@ -22,11 +23,13 @@ class InputFile {
   // Bytes passed over, fewer than wanted when the file ends. A regular file is not read for it.
   uint64_t skip(uint64_t wanted);
 
-  const std::string& name() const { return name_; }
+  const std::string& path() const { return path_; }
+  Message name() const;
   const struct stat& status() const { return status_; }
 
  private:
-  std::string name_;
+  Failure failure(int error_number) const;
+  std::string path_;
   FileDescriptor owned_;
   int fd_;
   struct stat status_ {};

@@ -14,7 +14,7 @@ std::optional<std::string> data_directory(const std::optional<std::string>& want
     return find_data_directory(wanted);
   } catch (const Failure& failure) {
     if (wanted || without_data == WithoutData::kFail) throw;
-    complain(std::string(failure.what()) + "\nThe built-in English, UnitedStates and US-ASCII serve.");
+    complain(failure.text() + "\n" + message("The built-in English, UnitedStates and US-ASCII serve."));
     return std::nullopt;
   }
 }
@@ -27,39 +27,40 @@ LibrarySession::LibrarySession(const std::optional<std::string>& locale_director
                                     : LXInit(nullptr, nullptr, nullptr, nullptr, 0);
   if (status == LX_OK || (status == LX_E_DEFAULTS && !directory)) return;
   if (status == LX_E_DEFAULTS) LXTerm();
-  throw Failure(ExitStatus::kCodePage, display_name(directory.value_or("built-in objects")) +
-                                           ": the locale data cannot be used (" + describe_status(status) + ")");
+  throw Failure(ExitStatus::kCodePage,
+                message("{0}: the locale data cannot be used ({1})",
+                        directory ? display_name(*directory) : message("built-in objects"), describe_status(status)));
 }
 
-std::string describe_status(uint32_t status) {
+Message describe_status(uint32_t status) {
   switch (status) {
     case LX_E_OPEN:
-      return "a file cannot be opened";
+      return message("a file cannot be opened");
     case LX_E_DEFAULTS:
     case LX_E_MANAGER:
-      return "control.nls is damaged or its path is too long";
+      return message("control.nls is damaged or its path is too long");
     case LX_E_MEMORY:
-      return "out of memory";
+      return message("out of memory");
     case LX_E_CODEPAGE:
-      return "code page not found";
+      return message("code page not found");
     case LX_E_LANGUAGE:
-      return "language not found";
+      return message("language not found");
     case LX_E_TERRITORY:
-      return "territory not found";
+      return message("territory not found");
     case LX_E_SORT:
-      return "sort not found";
+      return message("sort not found");
     case LX_E_NOTFOUND:
-      return "object not found";
+      return message("object not found");
     case LX_E_NOFILE:
-      return "its file is missing";
+      return message("its file is missing");
     case LX_E_ACCESS:
-      return "no permission to read its file";
+      return message("no permission to read its file");
     case LX_E_FILE:
-      return "its file cannot be read";
+      return message("its file cannot be read");
     case LX_E_HEADER:
-      return "its file is damaged";
+      return message("its file is damaged");
     default:
-      return "status " + std::to_string(status);
+      return message("status {0}", status);
   }
 }
 

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "lexaro/lexaro.h"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -36,6 +37,6 @@ struct ConversionDeleter {
 using ConversionPtr = std::unique_ptr<LXConversion, ConversionDeleter>;
 
 // A status code of the library in words.
-std::string describe_status(uint32_t status);
+Message describe_status(uint32_t status);
 
 }  // namespace lx::tool

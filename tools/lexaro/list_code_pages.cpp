@@ -8,6 +8,7 @@
 #include "tools/lexaro/json_output.hpp"
 #include "tools/lexaro/library_session.hpp"
 #include "tools/lexaro/object_names.hpp"
+#include "tools/lexaro/terminal_text.hpp"
 
 namespace lx::tool {
 namespace {
@@ -15,7 +16,7 @@ namespace {
 struct Page {
   std::string name;
   uint16_t id = 0;
-  std::string trouble;  // why it could not be loaded
+  Message trouble;  // why it could not be loaded
   LXCodePageInfo info{};
   std::vector<std::string> aliases;
 
@@ -63,7 +64,7 @@ Json page_json(const Page& page, bool aliases) {
   json["id"] = page.id;
   json["name"] = page.name;
   if (!page.trouble.empty()) {
-    json["error"] = page.trouble;
+    json["error"] = page.trouble.english;
     return json;
   }
   json["kind"] = page.kind();
@@ -96,16 +97,20 @@ std::string wrapped(const std::vector<std::string>& words, std::size_t indent) {
 std::string page_table(const std::vector<Page>& pages) {
   std::size_t width = 4;
   for (const Page& page : pages) width = std::max(width, page.name.size());
-  const auto row = [&](const std::string& id, const std::string& name, const std::string& kind, const char* family) {
-    return std::string(id.size() < 5 ? 5 - id.size() : 0, ' ') + id + "  " + name +
-           std::string(width - name.size() + 2, ' ') + kind +
-           (*family ? std::string(kind.size() < 13 ? 13 - kind.size() : 1, ' ') + family : "") + "\n";
+  const auto blanks = [](const std::string& cell, std::size_t columns) {
+    const std::size_t taken = display_width(cell);
+    return std::string(taken < columns ? columns - taken : 0, ' ');
   };
-  std::string text = row("ID", "NAME", "KIND", "FAMILY");
+  const auto row = [&](const std::string& id, const std::string& name, const std::string& kind,
+                       const std::string& family) {
+    const std::string end = family.empty() ? "" : blanks(kind, 12) + " " + family;
+    return blanks(id, 5) + id + "  " + name + blanks(name, width) + "  " + kind + end + "\n";
+  };
+  std::string text = row(message("ID").utf8, message("NAME").utf8, message("KIND").utf8, message("FAMILY").utf8);
   for (const Page& page : pages) {
     const std::string id = std::to_string(page.id);
-    text += page.trouble.empty() ? row(id, page.name, page.kind(), page.family())
-                                 : row(id, page.name, "unusable: " + page.trouble, "");
+    text += page.trouble.empty() ? row(id, page.name, message(page.kind()).utf8, page.family())
+                                 : row(id, page.name, message("unusable: {0}", page.trouble).utf8, "");
     text += wrapped(page.aliases, 9);
   }
   return text;
@@ -121,12 +126,12 @@ ExitStatus list_code_pages(const CommonOptions& common, bool aliases, bool json)
     for (const Page& page : pages) list.push_back(page_json(page, aliases));
     print_json(list);
   } else {
-    print(page_table(pages));
+    print_text(page_table(pages));
   }
   ExitStatus status = ExitStatus::kExact;
   for (const Page& page : pages) {
     if (page.trouble.empty()) continue;
-    complain("code page " + page.name + ": " + page.trouble);
+    complain(message("code page {0}: {1}", page.name, page.trouble));
     status = ExitStatus::kCodePage;
   }
   return status;

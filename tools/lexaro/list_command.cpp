@@ -54,7 +54,7 @@ Command add_list_command(CLI::App& program) {
             for (std::size_t i = 0; i < lists.size(); ++i) {
               if (lists[i]->parsed()) return kListings[i].run(common, *json);
             }
-            print(kExplanation);
+            print(message(kExplanation).shown);
             return ExitStatus::kExact;
           }};
 }

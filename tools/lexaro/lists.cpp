@@ -31,7 +31,9 @@ std::string cell_text(const Json& cell) {
 void print_list(const std::vector<Column>& columns, const std::vector<Cells>& rows, bool as_json) {
   Json list = Json::array();
   TextTable::Row headings;
-  for (const Column& column : columns) headings.emplace_back(column.heading);
+  for (const Column& column : columns) {
+    headings.push_back(as_json ? column.heading : message(column.heading).utf8);
+  }
   TextTable table(std::move(headings));
   for (const Cells& cells : rows) {
     Json object;
@@ -128,7 +130,7 @@ ExitStatus list_sorts(const CommonOptions& common, bool json) {
     rows.push_back({LXGetObjId(LXGetObjFromName(LXGetObjManager(), LX_SORT, name.c_str(), -1, 1, &rc)), name});
   }
   print_list({{"ID", "id"}, {"NAME", "name"}}, rows, json);
-  if (rows.size() == 1) complain("the locale data hold no sort orders; the binary one is part of the library");
+  if (rows.size() == 1) complain(message("the locale data hold no sort orders; the binary one is part of the library"));
   return ExitStatus::kExact;
 }
 

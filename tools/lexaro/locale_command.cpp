@@ -44,7 +44,7 @@ std::string plain(const ItemValue& value, const LocaleItem& item) {
 
 // Quotes show where a text begins and ends, when its ends cannot be seen.
 std::string visible(const ItemValue& value, const LocaleItem& item) {
-  if (value.status != LX_OK) return "(" + describe_status(value.status) + ")";
+  if (value.status != LX_OK) return "(" + describe_status(value.status).utf8 + ")";
   const std::string text = plain(value, item);
   for (const char* blank : {" ", "\u00A0", "\u2009", "\u202F", "\u3000"}) {
     if (text.starts_with(blank) || text.ends_with(blank)) return "\"" + text + "\"";
@@ -66,7 +66,7 @@ void print_all(LXLocale* locale, const LocaleOptions& options, ValueSource sourc
   Json json = Json::object();
   std::string text;
   for (const ItemGroup& group : item_groups()) {
-    text += (text.empty() ? "" : "\n") + std::string(group.title) + "\n";
+    if (!options.json) text += (text.empty() ? "" : "\n") + message(group.title).utf8 + "\n";
     for (const LocaleItem& item : group.items) {
       if (options.json) {
         json[item.name] = json_of(read_item(locale, item, source), item);
@@ -83,7 +83,8 @@ std::vector<const LocaleItem*> wanted_items(const LocaleOptions& options) {
   for (const std::string& wanted : options.items) {
     const LocaleItem* item = find_item(wanted);
     if (!item) {
-      throw usage_failure("unknown item \"" + display_name(wanted) + "\"; \"lexaro locale\" shows numbers and names");
+      throw usage_failure(
+          message("unknown item \"{0}\"; \"lexaro locale\" shows numbers and names", display_name(wanted)));
     }
     items.push_back(item);
   }
@@ -96,7 +97,7 @@ void print_items(LXLocale* locale, const std::vector<const LocaleItem*>& items, 
   for (const LocaleItem* item : items) {
     const ItemValue value = read_item(locale, *item, source);
     if (value.status != LX_OK) {
-      throw Failure(ExitStatus::kCodePage, "item " + item->name + ": " + describe_status(value.status));
+      throw Failure(ExitStatus::kCodePage, message("item {0}: {1}", item->name, describe_status(value.status)));
     }
     json[item->name] = json_of(value, *item);
     text += plain(value, *item) + "\n";
@@ -116,9 +117,13 @@ void print_native_names(LXLocale* locale, bool as_json) {
                 {"nearest_locale", or_null(meaning)}});
     return;
   }
-  const auto or_none = [](const std::string& name) { return (name.empty() ? "(none)" : name) + "\n"; };
-  print_text("locale             " + own + "\nits system name    " + or_none(names.exact) + "nearest name       " +
-             or_none(names.nearest) + "which is read as   " + or_none(meaning));
+  const auto or_none = [](const std::string& name) { return name.empty() ? message("(none)") : Message(name); };
+  print_text(message("locale             {0}\n"
+                     "its system name    {1}\n"
+                     "nearest name       {2}\n"
+                     "which is read as   {3}\n",
+                     own, or_none(names.exact), or_none(names.nearest), or_none(meaning))
+                 .utf8);
 }
 
 ExitStatus run_locale(const LocaleOptions& options, const CommonOptions& common) {

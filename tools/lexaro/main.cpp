@@ -14,6 +14,7 @@
 
 #include "lexaro/lexaro.h"
 #include "tools/lexaro/command.hpp"
+#include "tools/lexaro/help.hpp"
 #include "tools/lexaro/output_file.hpp"
 #include "tools/lexaro/temporary_file.hpp"
 #include "tools/lexaro/values.hpp"
@@ -46,34 +47,37 @@ Command add_help_command(CLI::App& program) {
   app->add_option("COMMAND", *topic, "A command of the program")->type_name("");
   return {app, [&program, topic](const CommonOptions&) {
             if (topic->empty()) {
+              translate_help(program);
               // help() would answer for the command that was given, which is this one
               print(program.get_formatter()->make_help(&program, "lexaro", CLI::AppFormatMode::Normal));
               return ExitStatus::kExact;
             }
             const auto named = [&](const CLI::App* command) { return command->get_name() == *topic; };
             const std::vector<CLI::App*> found = program.get_subcommands(named);
-            if (found.empty()) throw usage_failure("there is no command \"" + display_name(*topic) + "\"");
+            if (found.empty()) throw usage_failure(message("there is no command \"{0}\"", display_name(*topic)));
+            translate_help(*found.front());
             print(found.front()->help("lexaro"));
             return ExitStatus::kExact;
           }};
 }
 
-ExitStatus report_parse_error(const CLI::App& program, const CLI::ParseError& error) {
+ExitStatus report_parse_error(CLI::App& program, const CLI::ParseError& error) {
   if (error.get_exit_code() == 0) {  // --help and --version come as errors too
     if (dynamic_cast<const CLI::CallForVersion*>(&error)) {
       print(std::string(error.what()) + "\n");
     } else {
+      translate_help(program);
       print(program.help());
     }
     return ExitStatus::kExact;
   }
   std::string command = "lexaro";
-  std::string message = error.what();
+  Message text = std::string(error.what());
   if (const auto unknown = program.remaining(); program.get_subcommands().empty() && !unknown.empty()) {
-    message = "there is no command or option \"" + display_name(unknown.front()) + "\"";
+    text = message("there is no command or option \"{0}\"", display_name(unknown.front()));
   }
-  for (const CLI::App* app : program.get_subcommands()) command += " " + app->get_name();
-  complain(message + "\nTry \"" + command + " --help\".");
+  for (const CLI::App* app : std::as_const(program).get_subcommands()) command += " " + app->get_name();
+  complain(text + "\n" + message("Try \"{0} --help\".", command));
   return ExitStatus::kUsage;
 }
 
@@ -133,12 +137,12 @@ ExitStatus guarded_run(int argument_count, char** arguments) {
   try {
     return run(argument_count, arguments);
   } catch (const Failure& failure) {
-    if (!failure.quiet()) complain(failure.what());
+    if (!failure.quiet()) complain(failure.text());
     return failure.status();
   } catch (const std::bad_alloc&) {
-    complain("out of memory");
+    complain(message("out of memory"));
   } catch (const std::exception& error) {
-    complain(error.what());
+    complain(message(error.what()));
   }
   return ExitStatus::kInputOutput;
 }

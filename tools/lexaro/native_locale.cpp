@@ -75,11 +75,11 @@ std::string territory_of_code(const std::string& language, const std::string& co
 struct Reading {
   Parts parts;
   bool listed = true;
-  std::vector<std::string> missed;
+  std::vector<Message> missed;
 };
 
 // Language and territory of a name without code set and modifier.
-std::optional<Parts> read_stem(const std::string& stem, std::vector<std::string>& missed) {
+std::optional<Parts> read_stem(const std::string& stem, std::vector<Message>& missed) {
   if (auto row = table_row(stem)) return row;
   const std::size_t cut = std::min(stem.find('_'), stem.size());
   const std::string language = stem.substr(0, cut);
@@ -91,7 +91,7 @@ std::optional<Parts> read_stem(const std::string& stem, std::vector<std::string>
   if (std::string found = territory_of_code(parts.language, territory); !found.empty()) {
     parts.territory = found;
   } else {
-    missed.push_back("territory " + territory);
+    missed.push_back(message("territory {0}", plain_name(territory)));
   }
   return parts;
 }
@@ -102,7 +102,7 @@ std::optional<Reading> read_name(const std::string& name) {
   const std::size_t end = std::min(name.find('@'), name.size());
   Reading reading;
   reading.listed = false;
-  if (end < name.size()) reading.missed.push_back("modifier " + name.substr(end + 1));
+  if (end < name.size()) reading.missed.push_back(message("modifier {0}", plain_name(name.substr(end + 1))));
   if (auto row = table_row(name.substr(0, end))) {
     reading.parts = *row;
     return reading;
@@ -114,7 +114,7 @@ std::optional<Reading> read_name(const std::string& name) {
     if (const LXObjEntry* page = find_code_page(code_set)) {
       reading.parts.code_page = LXGetObjName(page);
     } else {
-      reading.missed.push_back("code set " + code_set);
+      reading.missed.push_back(message("code set {0}", plain_name(code_set)));
     }
   }
   return reading;
@@ -133,16 +133,16 @@ std::optional<Reading> read_composite(const std::string& names) {
       whole.listed = whole.listed && reading->listed;
       whole.missed.insert(whole.missed.end(), reading->missed.begin(), reading->missed.end());
     } else {
-      whole.missed.push_back("system locale \"" + name + "\"");
+      whole.missed.push_back(message("system locale \"{0}\"", plain_name(name)));
     }
   }
   return whole;
 }
 
 // A part that the locale data lack is left to the language's default.
-void keep_existing(uint8_t type, const char* title, std::string& part, std::vector<std::string>& missed) {
+void keep_existing(uint8_t type, const char* title, std::string& part, std::vector<Message>& missed) {
   if (part.empty() || object_exists(type, part)) return;
-  missed.push_back(title + (" " + part));
+  missed.push_back(message(title, plain_name(part)));
   part.clear();
 }
 
@@ -154,13 +154,15 @@ std::optional<NativeLocale> find_native_locale(const std::string& native_name) {
   Parts& parts = reading->parts;
   if (!object_exists(LX_LANGUAGE, parts.language)) return std::nullopt;
   NativeLocale result{"", reading->listed, std::move(reading->missed)};
-  keep_existing(LX_TERRITORY, "territory", parts.territory, result.missed);
-  keep_existing(LX_CODEPAGE, "code page", parts.code_page, result.missed);
+  keep_existing(LX_TERRITORY, "territory {0}", parts.territory, result.missed);
+  keep_existing(LX_CODEPAGE, "code page {0}", parts.code_page, result.missed);
   // Only who gave a name of the table can know that a sort belongs to it.
-  std::vector<std::string> unasked;
-  keep_existing(LX_SORT, "sort", parts.sort, result.listed ? result.missed : unasked);
-  std::sort(result.missed.begin(), result.missed.end());
-  result.missed.erase(std::unique(result.missed.begin(), result.missed.end()), result.missed.end());
+  std::vector<Message> unasked;
+  keep_existing(LX_SORT, "sort {0}", parts.sort, result.listed ? result.missed : unasked);
+  const auto less = [](const Message& a, const Message& b) { return a.english < b.english; };
+  const auto equal = [](const Message& a, const Message& b) { return a.english == b.english; };
+  std::sort(result.missed.begin(), result.missed.end(), less);
+  result.missed.erase(std::unique(result.missed.begin(), result.missed.end(), equal), result.missed.end());
   result.locale_name = parts.language + "_" + parts.territory + "." + parts.code_page + "@" + parts.sort;
   return result;
 }

@@ -5,13 +5,14 @@
 #include <optional>
 #include <string>
 #include <vector>
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
 struct NativeLocale {
-  std::string locale_name;          // of parts that the locale data have
-  bool listed = true;               // the library's table has this very name
-  std::vector<std::string> missed;  // what of the name is not reflected: "sort Default", "territory LU"
+  std::string locale_name;      // of parts that the locale data have
+  bool listed = true;           // the library's table has this very name
+  std::vector<Message> missed;  // what of the name is not reflected: "sort Default", "territory LU"
 
   bool exact() const { return listed && missed.empty(); }
 };

@@ -53,14 +53,14 @@ std::vector<std::string> NearNames::best() const {
   return names;
 }
 
-std::string NearNames::question() const {
+Message NearNames::question() const {
   const std::vector<std::string> names = best();
-  std::string text;
-  for (std::size_t i = 0; i < names.size(); ++i) {
-    if (i != 0) text += i + 1 == names.size() ? " or " : ", ";
-    text += names[i];
+  if (names.empty()) return {};
+  Message text = names.front();
+  for (std::size_t i = 1; i < names.size(); ++i) {
+    text = i + 1 == names.size() ? message("{0} or {1}", text, names[i]) : text + ", " + names[i];
   }
-  return text.empty() ? text : "; did you mean " + text + "?";
+  return message("; did you mean {0}?", text);
 }
 
 }  // namespace lx::tool

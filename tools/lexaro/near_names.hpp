@@ -6,6 +6,7 @@
 #include <map>
 #include <string>
 #include <vector>
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -20,7 +21,7 @@ class NearNames {
   // `shown` is what to suggest when `name` is close: the page of an alias.
   void offer(const char* name, const char* shown);
   // "; did you mean A, B or C?", or nothing.
-  std::string question() const;
+  Message question() const;
 
  private:
   std::vector<std::string> best() const;

@@ -19,8 +19,9 @@ bool is_unknown_part(uint32_t status) {
 }
 
 Failure unusable(const std::string& name, uint32_t status) {
-  const std::string why = status == LX_E_MANAGER ? "a part of its data is missing or damaged" : describe_status(status);
-  return {ExitStatus::kCodePage, "locale " + display_name(name) + ": " + why};
+  const Message why =
+      status == LX_E_MANAGER ? message("a part of its data is missing or damaged") : describe_status(status);
+  return {ExitStatus::kCodePage, message("locale {0}: {1}", display_name(name), why)};
 }
 
 // The part of a locale name that follows one delimiter (0: the first part) and ends at others.
@@ -29,23 +30,26 @@ std::string part_of(const std::string& name, char before, const char* after) {
   return name.substr(begin, name.find_first_of(after, begin) - begin);
 }
 
-Failure unknown_part(uint8_t type, const char* title, const char* list, const std::string& wanted) {
+Failure unknown_part(uint8_t type, const Message& what, const char* list, const std::string& wanted) {
   NearNames names(wanted);
   for (const std::string& name : object_names(type)) names.offer(name.c_str(), name.c_str());
-  return {ExitStatus::kCodePage, std::string("unknown ") + title + " \"" + display_name(wanted) + "\"" +
-                                     names.question() + "\n\"lexaro list " + list + "\" shows all names."};
+  return {ExitStatus::kCodePage,
+          what + names.question() + "\n" + message("\"lexaro list {0}\" shows all names.", list)};
 }
 
 Failure unknown_locale(const std::string& name, uint32_t status) {
+  const auto unknown = [](const char* text, uint8_t type, const char* list, const std::string& wanted) {
+    return unknown_part(type, message(text, display_name(wanted)), list, wanted);
+  };
   switch (status) {
     case LX_E_LANGUAGE:
-      return unknown_part(LX_LANGUAGE, "locale or language", "languages", part_of(name, 0, "_.@"));
+      return unknown("unknown locale or language \"{0}\"", LX_LANGUAGE, "languages", part_of(name, 0, "_.@"));
     case LX_E_TERRITORY:
-      return unknown_part(LX_TERRITORY, "territory", "territories", part_of(name, '_', ".@"));
+      return unknown("unknown territory \"{0}\"", LX_TERRITORY, "territories", part_of(name, '_', ".@"));
     case LX_E_CODEPAGE:
       return unknown_code_page(part_of(name, '.', "@"));
     case LX_E_SORT:
-      return unknown_part(LX_SORT, "sort", "sorts", part_of(name, '@', ""));
+      return unknown("unknown sort \"{0}\"", LX_SORT, "sorts", part_of(name, '@', ""));
     default:
       return unusable(name, status);
   }
@@ -58,10 +62,12 @@ LocalePtr open_existing(const std::string& name) {
   return locale;
 }
 
-void tell_taken(const std::string& name, LXLocale* locale, const std::vector<std::string>& missed) {
-  std::string text = display_name(name) + " is taken as " + read_text(locale, LX_ITEM_LOCALE_NAME);
-  for (std::size_t i = 0; i < missed.size(); ++i) text += (i == 0 ? " (not found: " : ", ") + display_name(missed[i]);
-  complain(missed.empty() ? text : text + ")");
+void tell_taken(const std::string& name, LXLocale* locale, const std::vector<Message>& missed) {
+  Message parts;
+  for (const Message& part : missed) parts += (parts.empty() ? "" : ", ") + part;
+  const std::string taken = read_text(locale, LX_ITEM_LOCALE_NAME);
+  complain(missed.empty() ? message("{0} is taken as {1}", display_name(name), taken)
+                          : message("{0} is taken as {1} (not found: {2})", display_name(name), taken, parts));
 }
 
 LocalePtr open_native(const std::string& name) {
@@ -92,8 +98,9 @@ LocalePtr open_user_locale() {
   const uint32_t reason = rc;
   LocalePtr locale(LXGetLocale(name.c_str(), LX_GET_SUBSTITUTE, &rc));
   if (!locale) throw unusable(name, rc);
-  complain("the locale \"" + display_name(name) + "\" of " + (chosen ? "LX_LANG" : "the system") + " is not known (" +
-           describe_status(reason) + "); " + read_text(locale.get(), LX_ITEM_LOCALE_NAME) + " serves instead");
+  complain(message("the locale \"{0}\" of {1} is not known ({2}); {3} serves instead", display_name(name),
+                   chosen ? Message("LX_LANG") : message("the system"), describe_status(reason),
+                   read_text(locale.get(), LX_ITEM_LOCALE_NAME)));
   return locale;
 }
 

@@ -30,20 +30,20 @@ mode_t mode_of_new_files() {
 
 }  // namespace
 
-OutputFile::OutputFile(const std::string& path) : name_(path == "-" ? "standard output" : display_name(path)) {
+OutputFile::OutputFile(const std::string& path) : path_(path) {
   if (path == "-") {
     direct_ = FileDescriptor(STDOUT_FILENO);
     return;
   }
   struct stat existing {};
   if (::stat(path.c_str(), &existing) != 0) {
-    if (errno != ENOENT) throw system_failure(name_, errno);
+    if (errno != ENOENT) throw failure(errno);
     target_ = follow_links(path);
     open_temporary(nullptr);
     return;
   }
   // A file that may not be written is not replaced either, though its directory would allow it.
-  if (::access(path.c_str(), W_OK) != 0) throw system_failure(name_, errno);
+  if (::access(path.c_str(), W_OK) != 0) throw failure(errno);
   std::error_code error;
   if (S_ISREG(existing.st_mode)) target_ = fs::canonical(path, error);
   if (!target_.empty()) {
@@ -51,8 +51,12 @@ OutputFile::OutputFile(const std::string& path) : name_(path == "-" ? "standard 
     return;
   }
   direct_ = FileDescriptor(::open(path.c_str(), O_WRONLY | O_CLOEXEC | O_NOCTTY));
-  if (!direct_) throw system_failure(name_, errno);
+  if (!direct_) throw failure(errno);
 }
+
+Message OutputFile::name() const { return path_ == "-" ? message("standard output") : display_name(path_); }
+
+Failure OutputFile::failure(int error_number) const { return system_failure(name(), error_number); }
 
 void OutputFile::open_temporary(const struct stat* existing) {
   temporary_ = std::make_unique<TemporaryFile>(target_);
@@ -62,7 +66,7 @@ void OutputFile::open_temporary(const struct stat* existing) {
     // Only the superuser gives files away: what was granted to the former owner's identity is not granted to another.
     mode &= static_cast<mode_t>(::fchown(fd, static_cast<uid_t>(-1), existing->st_gid) == 0 ? 01777 : 01707);
   }
-  if (::fchmod(fd, mode) != 0) throw system_failure(name_, errno);
+  if (::fchmod(fd, mode) != 0) throw failure(errno);
 }
 
 void OutputFile::write(std::string_view bytes) {
@@ -71,8 +75,10 @@ void OutputFile::write(std::string_view bytes) {
     const ssize_t count = persist(fd, POLLOUT, [&] { return ::write(fd, bytes.data(), bytes.size()); });
     if (count < 0) {
       // A reader that has seen enough is no news: the exit code tells it.
-      if (errno == EPIPE) throw Failure(ExitStatus::kInputOutput, name_ + ": closed by its reader", true);
-      throw system_failure(name_ + ": write error at byte " + std::to_string(offset_), errno);
+      const int error_number = errno;
+      if (error_number == EPIPE)
+        throw Failure(ExitStatus::kInputOutput, message("{0}: closed by its reader", name()), true);
+      throw system_failure(message("{0}: write error at byte {1}", name(), offset_), error_number);
     }
     offset_ += static_cast<uint64_t>(count);
     bytes.remove_prefix(static_cast<std::size_t>(count));
@@ -80,8 +86,8 @@ void OutputFile::write(std::string_view bytes) {
 }
 
 void OutputFile::commit() {
-  if (!descriptor().close()) throw system_failure(name_, errno);
-  if (temporary_ && !temporary_->rename_to_target()) throw system_failure(name_, errno);
+  if (!descriptor().close()) throw failure(errno);
+  if (temporary_ && !temporary_->rename_to_target()) throw failure(errno);
 }
 
 bool OutputFile::writes_into(const struct stat& file) const {

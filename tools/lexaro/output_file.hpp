@@ -9,6 +9,7 @@
 #include <string>
 #include <string_view>
 
+#include "tools/lexaro/failure.hpp"
 #include "tools/lexaro/file_descriptor.hpp"
 #include "tools/lexaro/temporary_file.hpp"
 
@@ -22,17 +23,18 @@ class OutputFile {
   // Closes the file and puts it in place. Without it, a regular file stays as it was.
   void commit();
 
-  const std::string& name() const { return name_; }
+  Message name() const;
   // The regular file that writing goes into at once, without a temporary, is this one.
   bool writes_into(const struct stat& file) const;
   // The regular file that a commit replaces is, or will be, at this path; empty when there is none.
   const std::string& target() const { return target_; }
 
  private:
+  Failure failure(int error_number) const;
   void open_temporary(const struct stat* existing);
   FileDescriptor& descriptor() { return temporary_ ? temporary_->descriptor() : direct_; }
 
-  std::string name_;
+  std::string path_;
   std::string target_;
   std::unique_ptr<TemporaryFile> temporary_;
   FileDescriptor direct_;

@@ -57,7 +57,7 @@ bool is_blank(LXUChar unit) {
 
 // Why a text was not read, and where.
 struct Refusal {
-  std::string why;
+  Message why;
   std::size_t position;
 };
 
@@ -143,24 +143,45 @@ class Reader {
 
  private:
   // Everything must have been read but blanks at the end.
-  void check_end(const Units& text, const LXUChar* end, const char* kind) const {
+  void check_end(const Units& text, const LXUChar* end) const {
     if (LXGetError(locale_) != LX_OK) throw Refusal{describe_status(LXGetError(locale_)), 0};
     const auto position = static_cast<std::size_t>(end - text.data());
     if (std::all_of(text.begin() + static_cast<std::ptrdiff_t>(position), text.end(), is_blank) && has_digit(text)) {
       return;
     }
-    if (position == text.size()) throw Refusal{std::string("no ") + kind, position};
-    throw Refusal{std::string("this does not belong to ") + (options_.kind == "integer" ? "an integer" : "a number"),
+    const bool integer = options_.kind == "integer";
+    if (position == text.size()) throw Refusal{integer ? message("no integer") : message("no number"), position};
+    throw Refusal{integer ? message("this does not belong to an integer") : message("this does not belong to a number"),
                   position};
   }
   bool has_digit(const Units& text) const {
     for (std::size_t i = 0; i < text.size(); ++i) {
-      const LXUChar* end = nullptr;
-      const int32_t code = LXStrGetDigitU(locale_, &text[i], 1, &end, 0, 0, &no_sign_, &no_sign_,
-                                          options_.full_width ? LX_NUM_FULLWIDTH : 0);
+      const int32_t code = digit_at(&text[i]);
       if (code >= 0 && code < 36) return true;
     }
     return false;
+  }
+
+  int32_t digit_at(const LXUChar* at) const {
+    const LXUChar* end = nullptr;
+    return LXStrGetDigitU(locale_, at, 1, &end, 0, 0, &no_sign_, &no_sign_, options_.full_width ? LX_NUM_FULLWIDTH : 0);
+  }
+  // What the digits before `end` say; too much for 32 bits is all the same.
+  uint64_t magnitude(const Units& text, const LXUChar* end) const {
+    uint64_t base = static_cast<uint64_t>(options_.base);
+    uint64_t sum = 0;
+    bool leading_zero = false;
+    for (const LXUChar* at = text.data(); at != end && sum <= std::numeric_limits<uint32_t>::max(); ++at) {
+      const int32_t digit = digit_at(at);
+      const bool prefix = leading_zero && (*at == 'x' || *at == 'X');
+      if (options_.base == 0 && (base == 0 || prefix) && digit >= 0) base = prefix ? 16 : digit == 0 ? 8 : 10;
+      leading_zero = sum == 0 && digit == 0;
+      if (digit >= 0 && static_cast<uint64_t>(digit) < base) sum = sum * base + static_cast<uint64_t>(digit);
+    }
+    return sum;
+  }
+  static uint64_t magnitude_of(int32_t value) {
+    return static_cast<uint64_t>(value < 0 ? -int64_t{value} : int64_t{value});
   }
 
   std::string read_integer(const Units& text) const {
@@ -172,19 +193,16 @@ class Reader {
     const bool at_limit = options_.is_unsigned ? unsigned_value == std::numeric_limits<uint32_t>::max()
                                                : value == Limits::max() || value == Limits::min();
     // Out of range the library gives the nearest value.
-    if (at_limit && options_.base == 10) {
-      const double exact = LXStringToDoubleU(locale_, text.data(), length_of(text), nullptr, flags_);
-      const double given = options_.is_unsigned ? static_cast<double>(unsigned_value) : value;
-      if (exact != given) throw Refusal{"the value does not fit into 32 bits", 0};
-    }
-    check_end(text, end, "integer");
+    const uint64_t limit = options_.is_unsigned ? unsigned_value : magnitude_of(value);
+    if (at_limit && magnitude(text, end) != limit) throw Refusal{message("the value does not fit into 32 bits"), 0};
+    check_end(text, end);
     return options_.is_unsigned ? std::to_string(unsigned_value) : std::to_string(value);
   }
 
   std::string read_number(const Units& text) const {
     const LXUChar* end = nullptr;
     const double value = LXStringToDoubleU(locale_, text.data(), length_of(text), &end, flags_);
-    check_end(text, end, "number");
+    check_end(text, end);
     char plain[400];
     const auto result = std::to_chars(plain, plain + sizeof plain, value);
     return {plain, result.ptr};
@@ -211,15 +229,16 @@ class Reader {
     if (count < 0) {
       const uint32_t status = LXGetError(locale_);
       const bool bad_format = status == LX_E_FORMAT;
-      throw Refusal{bad_format ? "the format has an unknown or incomplete directive" : "this does not fit the format",
+      throw Refusal{bad_format ? message("the format has an unknown or incomplete directive")
+                               : message("this does not fit the format"),
                     bad_format ? 0 : matched(text)};
     }
     const auto position = static_cast<std::size_t>(count);
     if (!std::all_of(text.begin() + count, text.end(), is_blank)) {
-      throw Refusal{"this is more than the format has", position};
+      throw Refusal{message("this is more than the format has"), position};
     }
     const std::string fields = known_fields(time);
-    if (fields.empty()) throw Refusal{"no time", position};
+    if (fields.empty()) throw Refusal{message("no time"), position};
     return fields;
   }
   // How far the text fits the format: as far as it fits the longest beginning of the format that fits at all.
@@ -250,10 +269,11 @@ void check_options(const CLI::App& app, const ParseOptions& options) {
                {"--format", "time"}};
   for (const auto& rule : rules) {
     if (app.count(rule.option) != 0 && std::string_view(rule.kinds).find(options.kind) == std::string_view::npos) {
-      throw usage_failure(std::string(rule.option) + " does not go with \"" + options.kind + "\"");
+      throw usage_failure(message("{0} does not go with \"{1}\"", rule.option, options.kind));
     }
   }
-  if (options.base < 0 || options.base == 1 || options.base > 36) throw usage_failure("--base is 0 or 2 to 36");
+  if (options.base < 0 || options.base == 1 || options.base > 36)
+    throw usage_failure(message("--base is 0 or 2 to 36"));
 }
 
 ExitStatus run_parse(const CLI::App& app, const ParseOptions& options, const CommonOptions& common) {

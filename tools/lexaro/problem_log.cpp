@@ -37,8 +37,8 @@ std::string quoted_character(uint32_t unicode) {
   return text + '"';
 }
 
-std::string source_bytes(const LXConversionProblem& problem) {
-  if (problem.length == 0) return "the end";  // where a double-byte run was left open
+Message source_bytes(const LXConversionProblem& problem) {
+  if (problem.length == 0) return message("the end");  // where a double-byte run was left open
   return "X'" + hexadecimal(problem.bytes, std::min<std::size_t>(problem.length, sizeof problem.bytes)) + "'";
 }
 
@@ -72,29 +72,30 @@ uint64_t ProblemLog::sequence_key(const LXConversionProblem& problem) {
   return key;
 }
 
-std::string ProblemLog::byte_place(const LXConversionProblem& problem) {
-  return "at byte " + std::to_string(problem.offset);
-}
+Message ProblemLog::byte_place(const LXConversionProblem& problem) { return message("at byte {0}", problem.offset); }
 
-std::string ProblemLog::summary(const LXConversionCounts& counts, bool discarded, const PlaceFn& place) const {
-  std::string text;
-  const auto tell = [&](uint64_t count, uint32_t kind, const char* one, const char* many, const std::string& what) {
+Message ProblemLog::summary(const LXConversionCounts& counts, bool discarded, const PlaceFn& place) const {
+  Message text;
+  const auto tell = [&](uint64_t count, uint32_t kind, const char* one, const char* many) {
     if (count == 0) return;
     const LXConversionProblem& first = first_of_kind_[kind];
+    const Message what = kind == LX_PROBLEM_SUBSTITUTED ? code_point(first.unicode) + quoted_character(first.unicode)
+                                                        : source_bytes(first);
     if (!text.empty()) text += ", ";
-    text += std::to_string(count) + " " + (count == 1 ? one : many) + (count == 1 ? " (" : " (first ") + place(first) +
-            ": " + what + ")";
+    text += count == 1 ? message(one, place(first), what) : message(many, count, place(first), what);
   };
-  const LXConversionProblem& lacking = first_of_kind_[LX_PROBLEM_SUBSTITUTED];
-  tell(counts.substituted, LX_PROBLEM_SUBSTITUTED, discarded ? "character left out" : "character replaced",
-       discarded ? "characters left out" : "characters replaced",
-       code_point(lacking.unicode) + quoted_character(lacking.unicode));
-  tell(counts.malformed, LX_PROBLEM_MALFORMED, "malformed sequence", "malformed sequences",
-       source_bytes(first_of_kind_[LX_PROBLEM_MALFORMED]));
-  tell(counts.shifts, LX_PROBLEM_SHIFT, "unbalanced shift", "unbalanced shifts",
-       source_bytes(first_of_kind_[LX_PROBLEM_SHIFT]));
-  tell(counts.cut, LX_PROBLEM_CUT, "character cut off by the end", "characters cut off by the end",
-       source_bytes(first_of_kind_[LX_PROBLEM_CUT]));
+  if (discarded) {
+    tell(counts.substituted, LX_PROBLEM_SUBSTITUTED, "1 character left out ({0}: {1})",
+         "{0} characters left out (first {1}: {2})");
+  } else {
+    tell(counts.substituted, LX_PROBLEM_SUBSTITUTED, "1 character replaced ({0}: {1})",
+         "{0} characters replaced (first {1}: {2})");
+  }
+  tell(counts.malformed, LX_PROBLEM_MALFORMED, "1 malformed sequence ({0}: {1})",
+       "{0} malformed sequences (first {1}: {2})");
+  tell(counts.shifts, LX_PROBLEM_SHIFT, "1 unbalanced shift ({0}: {1})", "{0} unbalanced shifts (first {1}: {2})");
+  tell(counts.cut, LX_PROBLEM_CUT, "1 character cut off by the end ({0}: {1})",
+       "{0} characters cut off by the end (first {1}: {2})");
   return text;
 }
 

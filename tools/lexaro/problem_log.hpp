@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "lexaro/lexaro.h"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -27,7 +28,7 @@ class Histogram {
 
 class ProblemLog {
  public:
-  using PlaceFn = std::function<std::string(const LXConversionProblem& problem)>;  // "at byte 7"
+  using PlaceFn = std::function<Message(const LXConversionProblem& problem)>;  // "at byte 7"
 
   // Whether the problem is kept with its place; all are counted.
   bool add(const LXConversionProblem& problem);
@@ -37,8 +38,8 @@ class ProblemLog {
   const Histogram& malformed() const { return malformed_; }      // by sequence_key
 
   // "2 characters replaced (first at byte 7: U+20AC), ..."; empty when there was no problem.
-  std::string summary(const LXConversionCounts& counts, bool discarded, const PlaceFn& place = byte_place) const;
-  static std::string byte_place(const LXConversionProblem& problem);
+  Message summary(const LXConversionCounts& counts, bool discarded, const PlaceFn& place = byte_place) const;
+  static Message byte_place(const LXConversionProblem& problem);
 
   // The bytes of a sequence behind a leading 1 byte, which keeps their number.
   static uint64_t sequence_key(const LXConversionProblem& problem);

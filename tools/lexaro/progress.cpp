@@ -6,6 +6,8 @@
 #include <algorithm>
 #include <cstdio>
 
+#include "tools/lexaro/terminal_text.hpp"
+
 namespace lx::tool {
 namespace {
 
@@ -38,8 +40,9 @@ void Progress::advance(uint64_t bytes) {
   const Clock::time_point now = Clock::now();
   if (now < next_) return;
   next_ = now + 200ms;
-  std::string text = line(now);
-  const std::size_t width = text.size();
+  const Message state = line(now);
+  std::string text = state.shown;
+  const std::size_t width = display_width(state.utf8);
   if (width < shown_width_) text.append(shown_width_ - width, ' ');
   shown_width_ = width;
   show("\r" + text);
@@ -51,14 +54,14 @@ void Progress::clear() {
   shown_width_ = 0;
 }
 
-std::string Progress::line(Clock::time_point now) const {
+Message Progress::line(Clock::time_point now) const {
   const double seconds = std::max(std::chrono::duration<double>(now - start_).count(), 1e-3);
-  std::string text = "lexaro: " + megabytes(static_cast<double>(done_));
-  if (total_ && *total_ > 0) {
-    const double percent = std::min(100.0, 100.0 * static_cast<double>(done_) / static_cast<double>(*total_));
-    text += " of " + megabytes(static_cast<double>(*total_)) + " (" + std::to_string(static_cast<int>(percent)) + "%)";
-  }
-  return text + ", " + megabytes(static_cast<double>(done_) / seconds) + "/s";
+  const std::string done = megabytes(static_cast<double>(done_));
+  const std::string rate = megabytes(static_cast<double>(done_) / seconds);
+  if (!total_ || *total_ == 0) return message("lexaro: {0}, {1}/s", done, rate);
+  const double percent = std::min(100.0, 100.0 * static_cast<double>(done_) / static_cast<double>(*total_));
+  return message("lexaro: {0} of {1} ({2}%), {3}/s", done, megabytes(static_cast<double>(*total_)),
+                 static_cast<int>(percent), rate);
 }
 
 }  // namespace lx::tool

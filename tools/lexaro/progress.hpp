@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -26,7 +27,7 @@ class Progress {
  private:
   using Clock = std::chrono::steady_clock;
 
-  std::string line(Clock::time_point now) const;
+  Message line(Clock::time_point now) const;
 
   bool enabled_;
   std::optional<uint64_t> total_;

@@ -25,10 +25,10 @@ Columns parse_range(std::string_view text) {
   const auto first = parse_column(text.substr(0, dash));
   const auto last = dash == std::string_view::npos ? first : parse_column(text.substr(dash + 1));
   if (!first || !last) {
-    throw usage_failure("--keep: \"" + display_name(std::string(text)) +
-                        "\" is no range of columns: write them as 5-8,21-24, from column 1");
+    throw usage_failure(message("--keep: \"{0}\" is no range of columns: write them as 5-8,21-24, from column 1",
+                                display_name(std::string(text))));
   }
-  if (*last < *first) throw usage_failure("--keep: columns " + shown({*first, *last}) + " end before they begin");
+  if (*last < *first) throw usage_failure(message("--keep: columns {0} end before they begin", shown({*first, *last})));
   return {*first, *last};
 }
 
@@ -62,7 +62,7 @@ std::vector<Columns> parse_columns(const std::string& text) {
   std::sort(all.begin(), all.end(), [](const Columns& a, const Columns& b) { return a.first < b.first; });
   for (std::size_t i = 1; i < all.size(); ++i) {
     if (all[i].first <= all[i - 1].last) {
-      throw usage_failure("--keep: columns " + shown(all[i - 1]) + " and " + shown(all[i]) + " overlap");
+      throw usage_failure(message("--keep: columns {0} and {1} overlap", shown(all[i - 1]), shown(all[i])));
     }
   }
   return all;
@@ -76,18 +76,20 @@ bool RecordLayout::keeps(std::size_t column) const {
 
 RecordLayout fixed_layout(std::size_t length, std::size_t to_length, const std::vector<Columns>& kept) {
   if (!kept.empty() && kept.back().last > length) {
-    throw usage_failure("--keep: columns " + shown(kept.back()) + " reach beyond the record, which ends at column " +
-                        std::to_string(length));
+    throw usage_failure(
+        message("--keep: columns {0} reach beyond the record, which ends at column {1}", shown(kept.back()), length));
   }
   std::vector<Piece> pieces = pieces_of(length, kept);
   if (to_length == length) return {pieces, true, to_length};
   const auto text = std::find_if(pieces.rbegin(), pieces.rend(), [](const Piece& piece) { return !piece.kept; });
   if (text == pieces.rend()) {
-    throw usage_failure("--to-length: all columns are kept, so the record can become neither longer nor shorter");
+    throw usage_failure(
+        message("--to-length: all columns are kept, so the record can become neither longer nor shorter"));
   }
   if (to_length < length && length - to_length >= text->width) {
-    throw usage_failure("--to-length: columns " + shown({text->begin + 1, text->begin + text->width}) +
-                        ", the last text of the record, would have no room in " + std::to_string(to_length) + " bytes");
+    throw usage_failure(
+        message("--to-length: columns {0}, the last text of the record, would have no room in {1} bytes",
+                shown({text->begin + 1, text->begin + text->width}), to_length));
   }
   text->to_width = text->width + to_length - length;
   return {pieces, true, to_length};
@@ -95,8 +97,8 @@ RecordLayout fixed_layout(std::size_t length, std::size_t to_length, const std::
 
 RecordLayout variable_layout(std::size_t limit, const std::vector<Columns>& kept) {
   if (!kept.empty() && kept.back().last > limit) {
-    throw usage_failure("--keep: columns " + shown(kept.back()) + " reach beyond the longest output record of " +
-                        std::to_string(limit) + " bytes");
+    throw usage_failure(
+        message("--keep: columns {0} reach beyond the longest output record of {1} bytes", shown(kept.back()), limit));
   }
   return {pieces_of(kEndless, kept), false, limit};
 }

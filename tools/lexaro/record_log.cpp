@@ -3,9 +3,8 @@
 
 namespace lx::tool {
 
-std::string shown_place(const RecordPlace& place) {
-  return "in record " + std::to_string(place.record) + ", column " + std::to_string(place.column) + ", byte " +
-         std::to_string(place.offset);
+Message shown_place(const RecordPlace& place) {
+  return message("in record {0}, column {1}, byte {2}", place.record, place.column, place.offset);
 }
 
 void RecordFaults::add(const RecordPlace& place, uint64_t length) {
@@ -32,18 +31,18 @@ void RecordLog::add(const LXConversionProblem& problem, const RecordPlace& place
   if (problems_.add(in_file)) places_.emplace(place.offset, place);
 }
 
-std::string RecordLog::summary(bool discarded) const {
-  std::string text = problems_.summary(
-      counts, discarded, [this](const LXConversionProblem& problem) { return shown_place(place(problem)); });
+Message RecordLog::summary(bool discarded) const {
+  Message text = problems_.summary(counts, discarded,
+                                   [this](const LXConversionProblem& problem) { return shown_place(place(problem)); });
   const auto tell = [&](const RecordFaults& faults, const char* one, const char* many) {
     if (faults.count() == 0) return;
     if (!text.empty()) text += ", ";
-    text += std::to_string(faults.count()) + " " + (faults.count() == 1 ? one : many) +
-            (faults.count() == 1 ? " (" : " (first ") + shown_place(faults.first().front().place) + ")";
+    const Message where = shown_place(faults.first().front().place);
+    text += faults.count() == 1 ? message(one, where) : message(many, faults.count(), where);
   };
-  tell(truncated, "record truncated because its text does not fit",
-       "records truncated because their text does not fit");
-  tell(line_ends, "record with a line end inside", "records with a line end inside");
+  tell(truncated, "1 record truncated because its text does not fit ({0})",
+       "{0} records truncated because their text does not fit (first {1})");
+  tell(line_ends, "1 record with a line end inside ({0})", "{0} records with a line end inside (first {1})");
   return text;
 }
 

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "tools/lexaro/problem_log.hpp"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -20,7 +21,7 @@ struct RecordPlace {
 };
 
 // "in record 3, column 7, byte 166".
-std::string shown_place(const RecordPlace& place);
+Message shown_place(const RecordPlace& place);
 
 // Records with one sort of fault: all are counted, the first are kept.
 class RecordFaults {
@@ -48,7 +49,7 @@ class RecordLog {
   const ProblemLog& problems() const { return problems_; }
   // Where a problem stands that problems() keeps.
   RecordPlace place(const LXConversionProblem& problem) const { return places_.at(problem.offset); }
-  std::string summary(bool discarded) const;
+  Message summary(bool discarded) const;
   bool exact() const;
 
   LXConversionCounts counts{};
@@ -56,7 +57,7 @@ class RecordLog {
   RecordFaults truncated;     // text that did not fit was cut off at the place
   RecordFaults wrong_length;  // shorter or longer than the records should be
   RecordFaults line_ends;     // the text of a record holds a line end, which splits its line
-  std::string damage;         // why the records could not be told apart any further
+  Message damage;             // why the records could not be told apart any further
 
  private:
   ProblemLog problems_;

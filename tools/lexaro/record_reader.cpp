@@ -31,8 +31,7 @@ class VariableReader final : public RecordReader {
     if (length == 0) return false;
     const std::string_view whole = window_.ensure(length);
     if (whole.size() < length) {
-      return damaged("its descriptor word tells " + std::to_string(length) + " bytes, and the file ends after " +
-                     std::to_string(whole.size()));
+      return damaged(message("its descriptor word tells {0} bytes, and the file ends after {1}", length, whole.size()));
     }
     record.offset = window_.offset() + kDescriptorSize;
     record.data = whole.substr(kDescriptorSize, length - kDescriptorSize);
@@ -42,8 +41,8 @@ class VariableReader final : public RecordReader {
   }
 
  private:
-  bool damaged(const std::string& why) {
-    damage_ = "record " + std::to_string(records_ + 1) + " at byte " + std::to_string(window_.offset()) + ": " + why;
+  bool damaged(const Message& why) {
+    damage_ = message("record {0} at byte {1}: {2}", records_ + 1, window_.offset(), why);
     return false;
   }
   std::string shown(std::string_view word) const {
@@ -59,12 +58,12 @@ class VariableReader final : public RecordReader {
   bool begin_block() {
     const std::string_view word = window_.ensure(kDescriptorSize);
     if (word.empty()) return false;
-    if (word.size() < kDescriptorSize) return damaged("the file ends inside a block descriptor word");
+    if (word.size() < kDescriptorSize) return damaged(message("the file ends inside a block descriptor word"));
     std::size_t length = two_bytes(word, 0);
     const bool large = (length & 0x8000) != 0;  // 31 bits of length
     if (large) length = (length & 0x7FFF) << 16 | two_bytes(word, 2);
     if (length < 2 * kDescriptorSize || (!large && two_bytes(word, 2) != 0)) {
-      return damaged(shown(word) + " is no block descriptor word");
+      return damaged(message("{0} is no block descriptor word", shown(word)));
     }
     window_.consume(kDescriptorSize);
     block_left_ = length - kDescriptorSize;
@@ -74,22 +73,21 @@ class VariableReader final : public RecordReader {
   // What the record takes with its descriptor word; 0 when that is damaged.
   std::size_t described_length(std::string_view word) {
     if (word.size() < kDescriptorSize || (blocked_ && block_left_ < kDescriptorSize)) {
-      damaged(word.size() < kDescriptorSize ? "the file ends inside a record descriptor word"
-                                            : "its block ends inside the record descriptor word");
+      damaged(word.size() < kDescriptorSize ? message("the file ends inside a record descriptor word")
+                                            : message("its block ends inside the record descriptor word"));
       return 0;
     }
     const std::size_t length = two_bytes(word, 0);
     if (length < kDescriptorSize || length > kLongestDescribed || byte_at(word, 2) > 3 || byte_at(word, 3) != 0) {
-      damaged(shown(word) + " is no record descriptor word");
+      damaged(message("{0} is no record descriptor word", shown(word)));
       return 0;
     }
     if (byte_at(word, 2) != 0) {
-      damaged("it is a segment of a spanned record (" + shown(word) + "); spanned records are not converted");
+      damaged(message("it is a segment of a spanned record ({0}); spanned records are not converted", shown(word)));
       return 0;
     }
     if (blocked_ && length > block_left_) {
-      damaged("its descriptor word tells " + std::to_string(length) + " bytes, and its block ends after " +
-              std::to_string(block_left_));
+      damaged(message("its descriptor word tells {0} bytes, and its block ends after {1}", length, block_left_));
       return 0;
     }
     return length;
@@ -120,8 +118,7 @@ class LineReader final : public RecordReader {
     const bool closed = end != std::string_view::npos;
     if (!closed) end = text.size();
     if (end > kLongestRecord) {
-      damage_ = "line " + std::to_string(records_ + 1) + " at byte " + std::to_string(window_.offset()) +
-                ": longer than " + std::to_string(kLongestRecord) + " bytes";
+      damage_ = message("line {0} at byte {1}: longer than {2} bytes", records_ + 1, window_.offset(), kLongestRecord);
       return false;
     }
     record.offset = window_.offset();

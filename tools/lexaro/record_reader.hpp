@@ -10,6 +10,7 @@
 
 #include "tools/lexaro/input_file.hpp"
 #include "tools/lexaro/progress.hpp"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -71,7 +72,7 @@ class RecordReader {
 
   uint64_t records() const { return records_; }  // passed so far
   uint64_t offset() const { return window_.offset(); }
-  const std::string& damage() const { return damage_; }  // empty: none
+  const Message& damage() const { return damage_; }  // empty: none
 
  protected:
   // Fills in all but the number.
@@ -79,7 +80,7 @@ class RecordReader {
 
   InputWindow window_;
   uint64_t records_ = 0;
-  std::string damage_;
+  Message damage_;
 };
 
 class FixedReader final : public RecordReader {

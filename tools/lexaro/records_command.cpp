@@ -66,42 +66,45 @@ void check_lengths(RecordsOptions& options) {
   const uint64_t longest = is_fixed(options) ? kLongestRecord : longest_data(format_of(options));
   const auto check = [&](const char* option, const std::optional<uint64_t>& length) {
     if (length && (*length == 0 || *length > longest)) {
-      throw usage_failure(std::string(option) + ": records of format " + options.format + " have 1 to " +
-                          std::to_string(longest) + " bytes, not " + std::to_string(*length));
+      throw usage_failure(
+          message("{0}: records of format {1} have 1 to {2} bytes, not {3}", option, options.format, longest, *length));
     }
   };
   check("--length", options.length);
   check("--to-length", options.to_length);
   if (is_fixed(options) && !options.length && !(options.plan && options.line_in)) {
-    throw usage_failure("tell the length of the records with --length");
+    throw usage_failure(message("tell the length of the records with --length"));
   }
 }
 
 void check_lines(const RecordsOptions& options) {
   if (options.line_in && options.line_out) {
-    throw usage_failure("--line-in and --line-out leave no records: \"lexaro convert\" converts lines");
+    throw usage_failure(message("--line-in and --line-out leave no records: \"lexaro convert\" converts lines"));
   }
   if (options.line_in && !is_fixed(options)) {
-    throw usage_failure("--line-in makes fixed records: it cannot go with --format " + options.format);
+    throw usage_failure(message("--line-in makes fixed records: it cannot go with --format {0}", options.format));
   }
   if ((options.line_in || options.line_out) && options.to_length) {
-    throw usage_failure(options.line_in ? "--line-in: --length already tells the length of the records written"
-                                        : "--line-out: lines have no length of their own, leave --to-length out");
+    throw usage_failure(options.line_in
+                            ? message("--line-in: --length already tells the length of the records written")
+                            : message("--line-out: lines have no length of their own, leave --to-length out"));
   }
   if ((options.line_in || options.line_out) && !options.keep.empty()) {
-    throw usage_failure("--keep: kept bytes may look like line ends, so they cannot stand in lines");
+    throw usage_failure(message("--keep: kept bytes may look like line ends, so they cannot stand in lines"));
   }
-  if (!options.line_out && options.keep_blanks) throw usage_failure("--keep-blanks goes with --line-out only");
-  if (!options.line_out && !options.line_ends.empty()) throw usage_failure("--nl goes with --line-out only");
+  if (!options.line_out && options.keep_blanks)
+    throw usage_failure(message("{0} goes with --line-out only", "--keep-blanks"));
+  if (!options.line_out && !options.line_ends.empty())
+    throw usage_failure(message("{0} goes with --line-out only", "--nl"));
 }
 
 void check_plan(const RecordsOptions& options) {
   if (!options.plan) return;
   if (*options.plan == 0 || *options.plan > kMostParts) {
-    throw usage_failure("--plan: a file is divided into 1 to " + std::to_string(kMostParts) + " parts");
+    throw usage_failure(message("--plan: a file is divided into 1 to {0} parts", kMostParts));
   }
   if (options.output != "-" || !options.report.empty() || !options.range.empty()) {
-    throw usage_failure("--plan converts nothing: leave -o, --report and --range to the runs that it plans");
+    throw usage_failure(message("--plan converts nothing: leave -o, --report and --range to the runs that it plans"));
   }
 }
 
@@ -112,7 +115,7 @@ void settle_options(RecordsOptions& options) {
   check_lengths(options);
   check_plan(options);
   if ((options.plan || !options.range.empty()) && options.files.size() > 1) {
-    throw usage_failure(std::string(options.plan ? "--plan" : "--range") + " is about one file, not several");
+    throw usage_failure(message("{0} is about one file, not several", options.plan ? "--plan" : "--range"));
   }
 }
 
@@ -124,8 +127,9 @@ std::optional<RecordRange> parse_range(const std::string& text) {
   const bool divided = first.ec == std::errc() && first.ptr != end && *first.ptr == ':';
   const auto count = divided ? std::from_chars(first.ptr + 1, end, range.count) : first;
   if (!divided || count.ec != std::errc() || count.ptr != end || range.first == 0) {
-    throw usage_failure("--range: \"" + display_name(text) +
-                        "\" is no FIRST:COUNT, the number of the first record, from 1, and how many");
+    throw usage_failure(
+        message("--range: \"{0}\" is no FIRST:COUNT, the number of the first record, from 1, and how many",
+                display_name(text)));
   }
   return range;
 }
@@ -143,7 +147,7 @@ std::pair<std::string, std::string> line_ends_of(const RecordsOptions& options, 
   const std::string name = !options.line_ends.empty() ? options.line_ends : to.info.ascii_family != 0 ? "lf" : "nel";
   const auto in_page = [&](const char* utf8) {
     const std::optional<std::string> text = to.encode(utf8);
-    if (!text) throw usage_failure("--nl " + name + ": the code page " + to.page.name + " has no such line end");
+    if (!text) throw usage_failure(message("--nl {0}: the code page {1} has no such line end", name, to.page.name));
     return *text;
   };
   if (name == "crlf") return {in_page("\r\n"), in_page("\n")};
@@ -168,15 +172,15 @@ RecordSettings make_settings(const RecordsOptions& options, const RecordPage& fr
 }
 
 // Damage is told even to those who want silence: a part of the file was not converted.
-void tell_result(const RecordResult& result, const RecordsOptions& options) {
+void tell_result(const std::string& file, const RecordResult& result, const RecordsOptions& options) {
   if (!options.silent) {
-    const std::string summary = result.log.summary(options.discard);
-    for (const std::string& text : {summary, result.size_fault, result.note}) {
-      if (!text.empty()) complain(result.name + ": " + text);
+    const Message summary = result.log.summary(options.discard);
+    for (const Message& text : {summary, result.size_fault, result.note}) {
+      if (!text.empty()) complain(display_name(file) + ": " + text);
     }
   }
   if (!result.log.damage.empty()) {
-    complain(result.name + ": " + result.log.damage + "; the rest of the file is not converted");
+    complain(message("{0}: {1}; the rest of the file is not converted", display_name(file), result.log.damage));
   }
 }
 
@@ -187,7 +191,7 @@ void convert_files(const RecordsOptions& options, const RecordSettings& settings
     InputFile input = open_input(file, output);
     RecordResult result = convert_records(input, output, settings, progress);
     progress.clear();
-    tell_result(result, options);
+    tell_result(file, result, options);
     if (!result.log.exact()) report.status = ExitStatus::kDataProblem;
     if (!options.report.empty()) report.files.push_back(std::move(result));
   }
@@ -205,7 +209,7 @@ ExitStatus run_plan(const RecordsOptions& options, const RecordSettings& setting
   }
   print(text);
   if (plan.damage.empty()) return ExitStatus::kExact;
-  complain(input.name() + ": " + plan.damage + "; the last part ends there");
+  complain(message("{0}: {1}; the last part ends there", input.name(), plan.damage));
   return ExitStatus::kDataProblem;
 }
 

@@ -45,32 +45,37 @@ class RecordsRun {
   uint64_t left_;
 };
 
-std::string describe_sizes(const RecordSettings& settings, const RecordFaults& faults, uint64_t file_size) {
-  if (faults.count() == 0) return "";
+Message byte_count(uint64_t bytes) { return bytes == 1 ? message("1 byte") : message("{0} bytes", bytes); }
+
+Message describe_sizes(const RecordSettings& settings, const RecordFaults& faults, uint64_t file_size) {
+  if (faults.count() == 0) return {};
   const RecordFaults::Fault& first = faults.first().front();
-  const std::string number = std::to_string(first.place.record);
-  const std::string bytes = std::to_string(first.length) + (first.length == 1 ? " byte" : " bytes");
-  const std::string length = std::to_string(settings.longest);
+  const Message bytes = byte_count(first.length);
   if (settings.input.format == RecordFormat::kFixed) {
-    return std::to_string(file_size) + " bytes are no multiple of the record length " + length + ": record " + number +
-           ", the last one, has only " + bytes;
+    return message("{0} bytes are no multiple of the record length {1}: record {2}, the last one, has only {3}",
+                   file_size, settings.longest, first.place.record, bytes);
   }
-  return std::to_string(faults.count()) + (faults.count() == 1 ? " record is" : " records are") + " longer than " +
-         length + " bytes (" + (faults.count() == 1 ? "" : "first ") + "record " + number + " at byte " +
-         std::to_string(first.place.offset) + ": " + bytes + ")";
+  if (faults.count() == 1) {
+    return message("1 record is longer than {0} bytes (record {1} at byte {2}: {3})", settings.longest,
+                   first.place.record, first.place.offset, bytes);
+  }
+  return message("{0} records are longer than {1} bytes (first record {2} at byte {3}: {4})", faults.count(),
+                 settings.longest, first.place.record, first.place.offset, bytes);
 }
 
-std::string describe_missing(const RecordRange& range, uint64_t records_in_file, uint64_t done) {
-  return "the file has " + std::to_string(records_in_file) + (records_in_file == 1 ? " record" : " records") +
-         ": --range " + std::to_string(range.first) + ":" + std::to_string(range.count) + " took " +
-         (done == 0 ? "none" : std::to_string(done)) + " of them";
+Message describe_missing(const RecordRange& range, uint64_t records_in_file, uint64_t done) {
+  const Message records = records_in_file == 1 ? message("1 record") : message("{0} records", records_in_file);
+  if (done == 0) {
+    return message("the file has {0}: --range {1}:{2} took none of them", records, range.first, range.count);
+  }
+  return message("the file has {0}: --range {1}:{2} took {3} of them", records, range.first, range.count, done);
 }
 
 }  // namespace
 
 RecordResult convert_records(InputFile& input, OutputFile& output, const RecordSettings& settings, Progress& progress) {
   RecordResult result;
-  result.name = input.name();
+  result.name = plain_name(input.path());
   const RecordRange range = settings.range.value_or(RecordRange{});
   const std::unique_ptr<RecordReader> reader = open_records(input, progress, settings.input);
   RecordWriter writer(output, settings.output, settings.line_end);

@@ -11,6 +11,7 @@
 #include "tools/lexaro/record_log.hpp"
 #include "tools/lexaro/record_reader.hpp"
 #include "tools/lexaro/record_translator.hpp"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -31,8 +32,8 @@ struct RecordSettings {
 struct RecordResult {
   std::string name;
   RecordLog log;
-  std::string size_fault;  // what is wrong with the length of records
-  std::string note;        // no fault: the file ends before the range does
+  Message size_fault;  // what is wrong with the length of records
+  Message note;        // no fault: the file ends before the range does
 };
 
 RecordResult convert_records(InputFile& input, OutputFile& output, const RecordSettings& settings, Progress& progress);

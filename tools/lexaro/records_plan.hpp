@@ -7,12 +7,13 @@
 #include <vector>
 
 #include "tools/lexaro/records_job.hpp"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
 struct RecordPlan {
   std::vector<RecordRange> parts;  // of nearly equal numbers of records, none empty unless the file is
-  std::string damage;              // met by whoever converts the last part
+  Message damage;                  // met by whoever converts the last part
 };
 
 // Blocks of records are not divided, so that the converted parts put together are the converted whole.

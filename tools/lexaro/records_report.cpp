@@ -47,8 +47,8 @@ Json file_json(const RecordResult& file) {
   json["first_wrong_lengths"] = lengths_json(log.wrong_length);
   json["first_line_ends"] = faults_json(log.line_ends);
   add_histograms(json, log.problems());
-  if (!log.damage.empty()) json["damage"] = log.damage;
-  if (!file.note.empty()) json["note"] = file.note;
+  if (!log.damage.empty()) json["damage"] = log.damage.english;
+  if (!file.note.empty()) json["note"] = file.note.english;
   return json;
 }
 

@@ -21,17 +21,17 @@ std::string take_suffix(std::string& name) {
 
 void apply_suffixes(RunOptions& options) {
   if (const std::string suffix = take_suffix(options.from); !suffix.empty()) {
-    throw usage_failure("-f: the suffix //" + display_name(suffix) + " has no meaning for the source code page");
+    throw usage_failure(message("-f: the suffix //{0} has no meaning for the source code page", display_name(suffix)));
   }
   const std::string suffix = take_suffix(options.to);
   if (suffix == "IGNORE") {
     options.discard = true;
   } else if (suffix == "TRANSLIT") {
     throw usage_failure(
-        "-t: //TRANSLIT is not offered: characters are never replaced by look-alikes; "
-        "leave it out for substitution characters, or use -c to leave them out");
+        message("-t: //TRANSLIT is not offered: characters are never replaced by look-alikes; "
+                "leave it out for substitution characters, or use -c to leave them out"));
   } else if (!suffix.empty()) {
-    throw usage_failure("-t: unknown suffix //" + display_name(suffix));
+    throw usage_failure(message("-t: unknown suffix //{0}", display_name(suffix)));
   }
 }
 
@@ -54,13 +54,13 @@ void add_run_options(CLI::App& app, RunOptions& options) {
 }
 
 void settle_run_options(RunOptions& options) {
-  if (options.from.empty() && options.to.empty()) throw usage_failure("name a code page with -f, -t or both");
+  if (options.from.empty() && options.to.empty()) throw usage_failure(message("name a code page with -f, -t or both"));
   if (options.from.empty()) options.from = "UTF-8";
   if (options.to.empty()) options.to = "UTF-8";
   apply_suffixes(options);
   if (options.files.empty()) options.files.emplace_back("-");
   if (options.report == "-" && options.output == "-") {
-    throw usage_failure("--report - needs -o FILE: standard output already takes the converted text");
+    throw usage_failure(message("--report - needs -o FILE: standard output already takes the converted text"));
   }
 }
 
@@ -73,22 +73,23 @@ Progress::When progress_mode(const RunOptions& options) {
 InputFile open_input(const std::string& file, const OutputFile& output) {
   InputFile input(file);
   if (output.writes_into(input.status())) {
-    throw Failure(ExitStatus::kInputOutput, input.name() + ": is both input and output; use -o to replace it safely");
+    throw Failure(ExitStatus::kInputOutput,
+                  message("{0}: is both input and output; use -o to replace it safely", input.name()));
   }
   return input;
 }
 
 void check_report_file(const RunOptions& options, const OutputFile& report, const OutputFile& output) {
   if (report.target().empty()) return;
-  if (report.target() == output.target()) throw usage_failure("--report and -o name the same file");
+  if (report.target() == output.target()) throw usage_failure(message("--report and -o name the same file"));
   struct stat target {};
   if (::stat(report.target().c_str(), &target) != 0) return;
   struct stat other {};
   for (const std::string& file : options.files) {
     const int failed = file == "-" ? ::fstat(STDIN_FILENO, &other) : ::stat(file.c_str(), &other);
-    if (failed == 0 && same_file(target, other)) throw usage_failure("--report names an input file");
+    if (failed == 0 && same_file(target, other)) throw usage_failure(message("--report names an input file"));
   }
-  if (output.writes_into(target)) throw usage_failure("--report names the output file");
+  if (output.writes_into(target)) throw usage_failure(message("--report names the output file"));
 }
 
 }  // namespace lx::tool

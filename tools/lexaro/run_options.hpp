@@ -3,6 +3,7 @@
 #pragma once
 
 #include <CLI/CLI.hpp>
+#include <exception>
 #include <memory>
 #include <string>
 #include <vector>
@@ -44,19 +45,19 @@ ExitStatus run_reported(const RunOptions& options, Report& report, Work work) {
     report_file = std::make_unique<OutputFile>(options.report);
     check_report_file(options, *report_file, output);
   }
-  bool quiet = false;
+  std::exception_ptr failed;
   try {
     work(output);
   } catch (const Failure& failure) {
     report.status = failure.status();
     report.error = failure.what();
-    quiet = failure.quiet();
+    failed = std::current_exception();
   }
   if (report_file) {
     report_file->write(report.json());
     report_file->commit();
   }
-  if (!report.error.empty()) throw Failure(report.status, report.error, quiet);
+  if (failed) std::rethrow_exception(failed);
   return report.status;
 }
 

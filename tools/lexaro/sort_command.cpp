@@ -68,7 +68,7 @@ SortOrder open_order(const SortOptions& options) {
   order.locale = options.locale ? open_locale(*options.locale) : open_user_locale();
   if (LXSetLocaleNumInfo(order.locale.get(), LX_ITEM_CODEPAGE_ID, order.page.id) == 0) {
     throw Failure(ExitStatus::kCodePage,
-                  "code page " + order.page.name + ": " + describe_status(LXGetError(order.locale.get())));
+                  message("code page {0}: {1}", order.page.name, describe_status(LXGetError(order.locale.get()))));
   }
   if (options.ignore_case) order.options = LX_CMP_NOCASE;
   if (options.ignore_width) order.options = LX_CMP_NOWIDTH;
@@ -88,10 +88,10 @@ void read_lines(InputFile input, Work& work, Take take) {
   }
   if (first_with_unknown == 0) return;
   work.status = ExitStatus::kDataProblem;
-  complain(input.name() + ": " + std::to_string(work.keys.unknown() - unknown_before) +
-           " characters that the order does not know, malformed or beyond the Basic Multilingual Plane; the first in "
-           "line " +
-           std::to_string(first_with_unknown));
+  complain(
+      message("{0}: {1} characters that the order does not know, malformed or beyond the Basic Multilingual Plane; "
+              "the first in line {2}",
+              input.name(), work.keys.unknown() - unknown_before, first_with_unknown));
 }
 
 int compare_keys(std::string_view a, std::string_view b) { return a.compare(b); }
@@ -231,13 +231,13 @@ void sort_files(Work& work, const CodePage& utf8) {
 
 // ---- Checking ----
 
-std::string shown_line(std::string_view line, const CodePage& page, const CodePage& utf8) {
+Message shown_line(std::string_view line, const CodePage& page, const CodePage& utf8) {
   constexpr std::size_t kMostBytes = 400;
   std::string text;
   Conversion conversion(page, utf8, 0, [&](std::string_view bytes) { text += bytes; });
   conversion.convert(line.substr(0, kMostBytes));
   if (line.size() <= kMostBytes) conversion.finish();
-  return display_name(text) + (line.size() <= kMostBytes ? "" : "...");
+  return quoted_text(plain_name(text)) + (line.size() <= kMostBytes ? "" : "...");
 }
 
 // Reads until a line should have come before the one before it.
@@ -252,9 +252,10 @@ void check_files(Work& work, const CodePage& utf8) {
       first = false;
       in_order = options.unique ? step > 0 : step >= 0;
       if (!in_order) {
-        complain(display_name(file) + ": line " + std::to_string(number) +
-                 (step == 0 ? " is equal to the line before it: " : " is out of order: ") +
-                 shown_line(line.text, work.order.page, utf8));
+        const Message shown = shown_line(line.text, work.order.page, utf8);
+        complain(step == 0
+                     ? message("{0}: line {1} is equal to the line before it: {2}", display_name(file), number, shown)
+                     : message("{0}: line {1} is out of order: {2}", display_name(file), number, shown));
       }
       last_key = key;
       return in_order;

@@ -29,7 +29,7 @@ std::size_t KeyMaker::transform(std::string_view line) {
     if (needed < 0) {
       const uint32_t status = LXGetError(order_.locale.get());
       if (status == LX_E_MEMORY) throw std::bad_alloc();
-      throw Failure(ExitStatus::kCodePage, "no key can be made: " + describe_status(status));
+      throw Failure(ExitStatus::kCodePage, message("no key can be made: {0}", describe_status(status)));
     }
     if (needed <= room) return static_cast<std::size_t>(needed);
     key_.resize(static_cast<std::size_t>(needed));

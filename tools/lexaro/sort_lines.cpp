@@ -12,7 +12,7 @@ namespace lx::tool {
 LineEnds::LineEnds(const CodePage& page) {
   LXCodePageInfo info{};
   if (LXGetCodePageInfo(LXGetLocaleObject(page.locale.get(), LX_CODEPAGE), &info) != LX_OK) {
-    throw Failure(ExitStatus::kCodePage, "code page " + page.name + ": it cannot be used");
+    throw Failure(ExitStatus::kCodePage, message("code page {0}: it cannot be used", page.name));
   }
   line_feed_ = static_cast<char>(info.line_bytes[0]);
   carriage_return_ = static_cast<char>(info.line_bytes[1]);
@@ -32,9 +32,8 @@ bool LineReader::fill() {
     begin_ = 0;
   }
   if (end_ > kLongestLine) {
-    throw Failure(ExitStatus::kInputOutput, input_.name() + ": line " + std::to_string(number_ + 1) +
-                                                " is longer than the " + std::to_string(kLongestLine >> 20) +
-                                                " MiB that can be sorted");
+    throw Failure(ExitStatus::kInputOutput, message("{0}: line {1} is longer than the {2} MiB that can be sorted",
+                                                    input_.name(), number_ + 1, kLongestLine >> 20));
   }
   if (end_ == buffer_.size()) buffer_.resize(buffer_.size() * 2);
   const std::size_t count = input_.read(std::span(buffer_).subspan(end_));

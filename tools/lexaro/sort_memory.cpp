@@ -49,8 +49,8 @@ void MemoryBudget::take(uint64_t bytes) {
 
 void MemoryBudget::fail() {
   throw Failure(ExitStatus::kInputOutput,
-                "not enough memory: sorting takes some five times the size of the text. Sort it in parts, and merge "
-                "those by the keys that --keys prints");
+                message("not enough memory: sorting takes some five times the size of the text. Sort it in parts, and "
+                        "merge those by the keys that --keys prints"));
 }
 
 const char* ByteStore::keep(std::string_view bytes) {

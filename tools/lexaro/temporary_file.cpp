@@ -66,7 +66,9 @@ TemporaryFile::TemporaryFile(std::string target) : target_(std::move(target)) {
   path_ = (slash == std::string::npos ? std::string() : target_.substr(0, slash + 1)) + ".lexaro-XXXXXX";
   const SignalsHeld held;
   descriptor_ = FileDescriptor(::mkostemp(path_.data(), O_CLOEXEC));
-  if (!descriptor_) throw system_failure(display_name(target_) + ": cannot create a temporary file beside it", errno);
+  const int error_number = errno;
+  if (!descriptor_)
+    throw system_failure(message("{0}: cannot create a temporary file beside it", display_name(target_)), error_number);
   slot_ = claim_slot(path_);
 }
 

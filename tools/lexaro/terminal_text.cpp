@@ -123,13 +123,16 @@ std::vector<LXUChar> terminal_ucs2(std::string_view text) {
   return units;
 }
 
-std::string terminal_text(std::string_view utf8) {
+Terminal::Terminal() : page_(terminal_page()) {}
+
+std::string Terminal::encode(std::string_view utf8) const {
   std::vector<LXUChar> text = ucs2_of(utf8);
   std::replace_if(
       text.begin(), text.end(), [](LXUChar unit) { return unit != '\n' && is_control(unit); }, LXUChar{'?'});
-  const LXObjEntry* page = terminal_page();
-  return page ? in_code_page(text, page) : utf8_of(text);
+  return page_ ? in_code_page(text, page_) : utf8_of(text);
 }
+
+std::string terminal_text(std::string_view utf8) { return Terminal().encode(utf8); }
 
 void print_text(std::string_view utf8) { print(terminal_text(utf8)); }
 

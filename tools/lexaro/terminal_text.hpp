@@ -21,7 +21,17 @@ std::vector<LXUChar> terminal_ucs2(std::string_view text);
 // Columns of a terminal: East Asian wide characters take two, combining ones none.
 std::size_t display_width(std::string_view utf8);
 
-// Text in the encoding of the user's terminal: what that lacks, and control characters from data, become "?".
+// The encoding of the user's terminal.
+class Terminal {
+ public:
+  Terminal();
+  // What the terminal lacks, and control characters from data, become "?".
+  std::string encode(std::string_view utf8) const;
+
+ private:
+  const LXObjEntry* page_;  // null: UTF-8
+};
+
 std::string terminal_text(std::string_view utf8);
 // Writes it to standard output, once in the program's life.
 void print_text(std::string_view utf8);

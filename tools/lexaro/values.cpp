@@ -22,8 +22,8 @@ void for_each_value(const std::vector<std::string>& arguments, const std::string
   for (std::size_t i = 0; i < arguments.size(); ++i) {
     const std::string& argument = arguments[i];
     const std::size_t mark = argument.starts_with(kValueMark) ? 1 : 0;
-    const std::string place = arguments.size() == 1 ? "" : "value " + std::to_string(i + 1) + ": ";
-    take({terminal_ucs2(std::string_view(argument).substr(mark)), place});
+    const char* place = arguments.size() == 1 ? nullptr : "value {0}: ";
+    take({terminal_ucs2(std::string_view(argument).substr(mark)), place, i + 1});
   }
   if (!arguments.empty()) return;
 
@@ -37,24 +37,24 @@ void for_each_value(const std::vector<std::string>& arguments, const std::string
     Conversion conversion(page, utf8, 0, [&](std::string_view bytes) { text += bytes; });
     conversion.convert(line.text);
     conversion.finish();
-    take({ucs2_of(text), "line " + std::to_string(reader.number()) + ": "});
+    take({ucs2_of(text), "line {0}: ", reader.number()});
   }
 }
 
-void complain_about(const Value& value, const std::string& why, std::optional<std::size_t> position) {
+void complain_about(const Value& value, const Message& why, std::optional<std::size_t> position) {
   std::vector<LXUChar> text = value.text;
   std::replace_if(
       text.begin(), text.end(), [](LXUChar unit) { return unit < 0x20 || (unit >= 0x7F && unit < 0xA0); },
       LXUChar{'?'});
-  const std::string shown = utf8_of(text);
-  std::string message = value.place + why;
+  const Message shown = quoted_text(utf8_of(text));
+  Message complaint = (value.place ? message(value.place, value.number) : Message()) + why;
   if (position) {
     const std::vector<LXUChar> before(text.begin(), text.begin() + static_cast<std::ptrdiff_t>(*position));
-    message += "\n  " + shown + "\n  " + std::string(display_width(utf8_of(before)), ' ') + "^";
+    complaint += "\n  " + shown + "\n  " + std::string(display_width(utf8_of(before)), ' ') + "^";
   } else {
-    message += ": \"" + shown + "\"";
+    complaint += ": \"" + shown + "\"";
   }
-  complain(message);
+  complain(complaint);
 }
 
 }  // namespace lx::tool

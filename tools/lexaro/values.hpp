@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "lexaro/lexaro.h"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -18,7 +19,8 @@ bool is_negative_value(const std::string& argument);
 
 struct Value {
   std::vector<LXUChar> text;
-  std::string place;  // "standard input: line 3: ", empty for a single argument
+  const char* place;  // "line {0}: " with the number; null: it needs none
+  uint64_t number;
 };
 
 // Arguments come in the encoding of the terminal, lines in the code page.
@@ -27,6 +29,6 @@ void for_each_value(const std::vector<std::string>& arguments, const std::string
 
 // A value that could not be used: told at once, with a mark below the character that does not fit. The command goes on
 // with the next one, and ends with ExitStatus::kDataProblem.
-void complain_about(const Value& value, const std::string& why, std::optional<std::size_t> position = {});
+void complain_about(const Value& value, const Message& why, std::optional<std::size_t> position = {});
 
 }  // namespace lx::tool

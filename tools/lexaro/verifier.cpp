@@ -12,8 +12,8 @@ namespace {
 // (shift bytes around nothing) must not fill the memory: this much of it has not come back for good.
 constexpr std::size_t kWindowLimit = 4 * kBufferSize;
 
-std::string shown_byte(const std::optional<uint8_t>& byte) {
-  return byte ? "X'" + hexadecimal(&*byte, 1) + "'" : std::string("the end");
+Message shown_byte(const std::optional<uint8_t>& byte) {
+  return byte ? Message("X'" + hexadecimal(&*byte, 1) + "'") : message("the end");
 }
 
 }  // namespace
@@ -59,9 +59,9 @@ void Verifier::compare(std::string_view returned) {
   if (equal < source.size()) difference_->source = static_cast<uint8_t>(source[equal]);
 }
 
-std::string Verifier::Difference::describe() const {
-  return "does not convert back: first difference at byte " + std::to_string(offset) + " (" + shown_byte(source) +
-         " comes back as " + (returned ? shown_byte(returned) : std::string("nothing")) + ")";
+Message Verifier::Difference::describe() const {
+  return message("does not convert back: first difference at byte {0} ({1} comes back as {2})", offset,
+                 shown_byte(source), returned ? shown_byte(returned) : message("nothing"));
 }
 
 }  // namespace lx::tool

@@ -8,6 +8,7 @@
 #include <string_view>
 
 #include "tools/lexaro/conversion.hpp"
+#include "tools/messages/message.hpp"
 
 namespace lx::tool {
 
@@ -18,7 +19,7 @@ class Verifier {
     uint64_t offset;
     std::optional<uint8_t> source;
     std::optional<uint8_t> returned;
-    std::string describe() const;
+    Message describe() const;
   };
 
   Verifier(const CodePage& from, const CodePage& to);

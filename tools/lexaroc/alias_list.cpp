@@ -34,7 +34,7 @@ std::vector<Alias> read_aliases(const SourceFile& source, Report& report) {
       alias.alias = cursor.word("an alias");
       if (alias.alias.size() > kLongestAlias) throw SourceError(alias.spot, "the alias is longer than 64 characters");
       if (!seen.insert(folded(alias.alias)).second)
-        throw SourceError(alias.spot, "\"" + alias.alias + "\" is given twice");
+        throw SourceError(alias.spot, tool::message("\"{0}\" is given twice", alias.alias));
       aliases.push_back(std::move(alias));
     }
   });

@@ -12,14 +12,14 @@ namespace {
 void merge(const fs::path& path, const CatalogText& text, Catalog& catalog, Report& report) try {
   Catalog old = unpack_catalog(read_file(path));
   if (!CatalogText(old.locale).same_page(text)) {
-    report.error(path.string(), "the catalog's locale " + old.locale + " has another code page");
+    report.error(path.string(), tool::message("the catalog's locale {0} has another code page", old.locale));
     return;
   }
   for (auto& [set, messages] : old.sets) {
     for (auto& [number, bytes] : messages) catalog.sets[set][number] = bytes;
   }
 } catch (const StructureError& error) {
-  report.error(path.string(), error.what());
+  report.error(path.string(), error.text);
 }
 
 uint32_t byte_order_of(const std::string& name) {
@@ -40,7 +40,7 @@ void compile_catalog(const CatalogRun& run, Report& report) {
   tool::LibrarySession session(run.locale_directory);
   CatalogText text(run.locale);
   Catalog catalog{text.locale_name(), byte_order_of(run.byte_order), {}};
-  if (catalog.locale.size() > kLongestCatalogLocale) throw std::runtime_error("the locale name is too long");
+  if (catalog.locale.size() > kLongestCatalogLocale) throw Fault("the locale name is too long");
   for (const fs::path& path : run.merged) merge(path, text, catalog, report);
   std::string source = source_in_utf8(run, report);
   if (!report.clean()) return;

@@ -77,7 +77,7 @@ class CatalogReader {
     uint32_t offset = header.first_set;
     for (uint32_t i = 0, before = 0; i < header.sets; ++i) {
       auto set = read<CatalogSet>(offset);
-      if (i != 0 && set.number <= before) fail(set, "the set is out of order");
+      if (i != 0 && set.number <= before) fail(set, tool::message("the set is out of order"));
       before = set.number;
       read_set(set);
       offset = set.next;
@@ -86,8 +86,8 @@ class CatalogReader {
   }
 
  private:
-  [[noreturn]] static void fail(const CatalogSet& set, const std::string& what) {
-    throw StructureError("set " + std::to_string(set.number) + ": " + what);
+  [[noreturn]] static void fail(const CatalogSet& set, const tool::Message& what) {
+    throw StructureError(tool::message("set {0}: {1}", set.number, what));
   }
   static uint32_t byte_order_of(const CatalogHeader& header) {
     uint32_t foreign = kBigEndianCatalog + kLittleEndianCatalog - kNativeCatalog;
@@ -107,16 +107,17 @@ class CatalogReader {
   void read_set(const CatalogSet& set) {
     auto size = static_cast<uint32_t>(bytes_.size());
     if (!lies_inside(size, set.index_offset, set.messages, sizeof(CatalogMessage))) {
-      fail(set, "the index reaches beyond the file");
+      fail(set, tool::message("the index reaches beyond the file"));
     }
-    if (!lies_inside(size, set.text_offset, set.text_size, 1)) fail(set, "the texts reach beyond the file");
+    if (!lies_inside(size, set.text_offset, set.text_size, 1))
+      fail(set, tool::message("the texts reach beyond the file"));
     CatalogMessages& messages = catalog_.sets[set.number];
     for (uint32_t i = 0, before = 0; i < set.messages; ++i) {
       auto message = read<CatalogMessage>(set.index_offset + i * sizeof(CatalogMessage));
-      std::string name = "message " + std::to_string(message.number);
-      if (message.number <= before) fail(set, name + " is out of order");
-      if (message.number > INT32_MAX) fail(set, name + " has too large a number");
-      if (!lies_inside(set.text_size, message.offset, message.length, 1)) fail(set, name + " is outside the texts");
+      auto bad = [&](const char* what) { fail(set, tool::message(what, message.number)); };
+      if (message.number <= before) bad("message {0} is out of order");
+      if (message.number > INT32_MAX) bad("message {0} has too large a number");
+      if (!lies_inside(set.text_size, message.offset, message.length, 1)) bad("message {0} is outside the texts");
       before = message.number;
       messages.emplace(message.number, bytes_.substr(set.text_offset + message.offset, message.length));
     }
@@ -136,8 +137,7 @@ bool is_catalog(std::string_view bytes) {
 
 std::string pack_catalog(const Catalog& catalog) {
   Measures measures(catalog);
-  if (measures.end > kLargestCatalog)
-    throw PackError("the catalog would have " + std::to_string(measures.end) + " bytes");
+  if (measures.end > kLargestCatalog) throw PackError(tool::message("the catalog would have {0} bytes", measures.end));
   auto number = [](size_t value) { return static_cast<uint32_t>(value); };
   CatalogHeader header{
       kCatalogMagic, kCatalogVersion, catalog.byte_order, number(catalog.sets.size()), number(sizeof header), {}};

@@ -227,7 +227,8 @@ std::string write_catalog_header(const std::vector<CatalogName>& names, const st
   std::string out = "#pragma once\n\n";
   std::set<std::string> known;
   for (const CatalogName& name : names) {
-    if (!known.insert(name.name).second) report.error(file, name.spot, "the name " + name.name + " is given twice");
+    if (!known.insert(name.name).second)
+      report.error(file, name.spot, tool::message("the name {0} is given twice", name.name));
     out += "#define " + name.name + " " + std::to_string(name.number) + "\n";
   }
   return out;

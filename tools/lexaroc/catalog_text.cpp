@@ -13,7 +13,7 @@ namespace {
 tool::LocalePtr open_locale(const std::string& name) {
   uint32_t rc = LX_OK;
   tool::LocalePtr locale(LXGetLocale(name.c_str(), 0, &rc));
-  if (!locale) throw std::runtime_error(name + ": " + tool::describe_status(rc));
+  if (!locale) throw Fault(name + ": " + tool::describe_status(rc));
   return locale;
 }
 
@@ -24,7 +24,7 @@ struct Conversion {
 
   Conversion(LXLocale* to, LXLocale* from, uint32_t options, std::string_view text) {
     tool::ConversionPtr handle(LXOpenConversion(to, from, 0));
-    if (!handle) throw std::runtime_error("out of memory");
+    if (!handle) throw Fault("out of memory");
     auto note = [](void* context, const LXConversionProblem* found) {
       auto& first = static_cast<Conversion*>(context)->problem;
       if (!first) first = *found;
@@ -80,7 +80,7 @@ std::u32string decode_utf8(std::string_view bytes, bool& valid) {
 
 CatalogText::CatalogText(const std::string& locale_name)
     : locale_(open_locale(locale_name)), utf8_(open_locale("English_UnitedStates.UTF-8@BINARY")) {
-  if (LXGetCodePageInfo(page(), &info_) != LX_OK) throw std::runtime_error(locale_name + ": no code page");
+  if (LXGetCodePageInfo(page(), &info_) != LX_OK) throw Fault(tool::message("{0}: no code page", locale_name));
 }
 
 std::string CatalogText::locale_name() const {
@@ -110,8 +110,8 @@ std::string CatalogText::encode(const MessageParts& parts) const {
     }
     Conversion conversion(locale_.get(), utf8_.get(), 0, utf8);
     if (conversion.problem) {
-      throw SourceError(spots[conversion.problem->offset],
-                        unicode_name(conversion.problem->unicode) + " is not in the catalog's code page");
+      throw SourceError(spots[conversion.problem->offset], tool::message("{0} is not in the catalog's code page",
+                                                                         unicode_name(conversion.problem->unicode)));
     }
     bytes += conversion.out;
   }

@@ -75,7 +75,7 @@ void check_compiled(const fs::path& path, Report& report) {
       report.error(path.string(), "the file name tells no object type and number");
     }
   } catch (const StructureError& error) {
-    report.error(path.string(), error.what());
+    report.error(path.string(), error.text);
   }
 }
 
@@ -85,7 +85,7 @@ void check_data_directory(const fs::path& directory, Report& report) {
   try {
     entries = check_control_file(read_file(control));
   } catch (const StructureError& error) {
-    report.error(control.string(), error.what());
+    report.error(control.string(), error.text);
   }
   for (const DirectoryEntry& entry : entries) {
     fs::path path = directory / (object_stem(entry.type, entry.id) + kCompiledExtension);

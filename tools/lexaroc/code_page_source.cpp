@@ -27,7 +27,7 @@ class CodePageReader {
   void check_header();
   void check_shape();
   void end_rows();
-  void require(bool condition, Spot spot, const std::string& message) {
+  void require(bool condition, Spot spot, const tool::Message& message) {
     if (!condition) report_.error(source_.name(), spot, message);
   }
 
@@ -55,7 +55,7 @@ bool CodePageReader::read_header(Cursor& cursor) {
     return false;
   }
   if (!page_.to_unicode.empty()) start.fail("\"" + key + "\" must stand before the characters");
-  if (!seen_.insert(key).second) start.fail("\"" + key + "\" is given twice");
+  if (!seen_.insert(key).second) start.fail(tool::message("\"{0}\" is given twice", key));
   if (key == "id") {
     cursor.expect(U' ');
     page_.id = static_cast<uint16_t>(cursor.decimal(65535));
@@ -131,7 +131,8 @@ void CodePageReader::read_row(Cursor& cursor) {
     Spot spot = cursor.spot();
     char32_t c = cursor.next();
     if (c != U'\\') {
-      if (c == U' ' || must_be_escaped(c)) throw SourceError(spot, unicode_name(c) + " must be written as an escape");
+      if (c == U' ' || must_be_escaped(c))
+        throw SourceError(spot, tool::message("{0} must be written as an escape", unicode_name(c)));
       put(spot, c);
     } else if (cursor.accept("u")) {
       put(spot, cursor.unicode_escape());

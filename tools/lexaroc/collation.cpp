@@ -28,7 +28,7 @@ uint16_t read_character(Cursor& cursor) {
     if (!cursor.accept("u")) throw SourceError(spot, "an unknown escape: only \\uXXXX is known");
     return cursor.unicode_escape();
   }
-  if (must_be_escaped(c)) throw SourceError(spot, unicode_name(c) + " must be written as an escape");
+  if (must_be_escaped(c)) throw SourceError(spot, tool::message("{0} must be written as an escape", unicode_name(c)));
   if (c > 0xFFFF) throw SourceError(spot, "only characters up to U+FFFF are possible");
   return static_cast<uint16_t>(c);
 }

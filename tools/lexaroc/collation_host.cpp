@@ -28,7 +28,7 @@ class HostOrder {
     for (const HostBlock& block : blocks_) {
       for (unsigned page : block.pages) {
         if (!in_block_.insert(page).second)
-          throw SourceError(block.spot, "page " + hex_text(page, 2) + " is given twice");
+          throw SourceError(block.spot, tool::message("page {0} is given twice", hex_text(page, 2)));
       }
     }
     for (unsigned c = 0; c < 0x10000; ++c) {

@@ -39,14 +39,15 @@ class RootReader {
     } else if (key == "x") {
       expansion(cursor);
     } else {
-      throw SourceError(start, "unknown keyword \"" + key + "\"");
+      throw SourceError(start, tool::message("unknown keyword \"{0}\"", key));
     }
   }
 
   void pages(Cursor& cursor, std::vector<unsigned>& list) {
     Spot start = cursor.spot();
     for (unsigned page : read_pages(cursor)) {
-      if (!pages_.insert(page).second) throw SourceError(start, "page " + hex_text(page, 2) + " is given twice");
+      if (!pages_.insert(page).second)
+        throw SourceError(start, tool::message("page {0} is given twice", hex_text(page, 2)));
       list.push_back(page);
     }
   }
@@ -62,8 +63,8 @@ class RootReader {
   uint16_t new_character(Cursor& cursor) {
     Spot spot = cursor.spot();
     uint16_t c = read_character(cursor);
-    if (!root_.is_tabulated(c)) throw SourceError(spot, unicode_name(c) + " is on no tabulated page");
-    if (!seen_.insert(c).second) throw SourceError(spot, unicode_name(c) + " is given twice");
+    if (!root_.is_tabulated(c)) throw SourceError(spot, tool::message("{0} is on no tabulated page", unicode_name(c)));
+    if (!seen_.insert(c).second) throw SourceError(spot, tool::message("{0} is given twice", unicode_name(c)));
     return c;
   }
 
@@ -124,7 +125,7 @@ class RootReader {
     auto found = root_.characters.find(c);
     if (found != root_.characters.end() && found->second.sets.size() == 1) return found->second.sets[0].primary;
     if (root_.is_tabulated(c))
-      throw SourceError(spot, unicode_name(c) + " has no primary weight of its own before here");
+      throw SourceError(spot, tool::message("{0} has no primary weight of its own before here", unicode_name(c)));
     return kByCodePoint + c;
   }
 
@@ -148,7 +149,7 @@ class RootReader {
     for (unsigned page = 0; page < 256; ++page) {
       if (pages_.count(page) != 0) continue;
       report_.error(source_.name(), source_.end(),
-                    "page " + hex_text(page, 2) + " is neither tabulated nor algorithmic");
+                    tool::message("page {0} is neither tabulated nor algorithmic", hex_text(page, 2)));
     }
     for (const auto& [character, element] : root_.characters) {
       const WeightSet& set = element.sets[0];

@@ -166,13 +166,15 @@ void Tailoring::assign(const std::u16string& characters, const Element& element)
   }
   if (characters.size() == 2) {
     auto [found, added] = collation_.pairs.emplace(CharacterPair(characters[0], characters[1]), element);
-    if (!added) throw SourceError(element.spot, element_name(characters) + " has a place already");
+    if (!added) throw SourceError(element.spot, tool::message("{0} has a place already", element_name(characters)));
     return;
   }
   uint16_t c = characters[0];
-  if (!collation_.is_tabulated(c)) throw SourceError(element.spot, unicode_name(c) + " is on no tabulated page");
+  if (!collation_.is_tabulated(c))
+    throw SourceError(element.spot, tool::message("{0} is on no tabulated page", unicode_name(c)));
   Element& place = collation_.characters[c];
-  if (place.spot.line != 0) throw SourceError(element.spot, element_name(characters) + " has a place already");
+  if (place.spot.line != 0)
+    throw SourceError(element.spot, tool::message("{0} has a place already", element_name(characters)));
   place = element;
   collation_.remove_special(c);
 }

@@ -38,7 +38,7 @@ class Compiler {
     try {
       files_.push_back({object_stem(type, object.id) + ".nls", make_object_file(pack(), format)});
     } catch (const PackError& error) {
-      report_.error(object.file, Spot{}, error.what());
+      report_.error(object.file, Spot{}, error.text);
     }
   }
 

@@ -31,7 +31,7 @@ std::u16string read_text(Cursor& cursor) {
         throw SourceError(spot, "an unknown escape: \\uXXXX, \\\\ and \\\" are known");
       }
     } else if (must_be_escaped(c)) {
-      throw SourceError(spot, unicode_name(c) + " must be written as an escape");
+      throw SourceError(spot, tool::message("{0} must be written as an escape", unicode_name(c)));
     } else if (c > 0xFFFF) {
       throw SourceError(spot, "only characters up to U+FFFF are possible");
     }
@@ -68,7 +68,8 @@ FieldFile::FieldFile(const SourceFile& source, const std::set<std::string>& repe
     cursor.expect(U'=');
     cursor.expect(U' ');
     auto& values = fields_[key];
-    if (!values.empty() && repeatable_.count(key) == 0) throw SourceError(start, "\"" + key + "\" is given twice");
+    if (!values.empty() && repeatable_.count(key) == 0)
+      throw SourceError(start, tool::message("\"{0}\" is given twice", key));
     spots_.emplace(key, cursor.spot());
     values.push_back({cursor.line(), cursor.spot().column - 1});
   });
@@ -78,7 +79,7 @@ void FieldFile::read(const std::string& key, const std::function<void(Cursor&)>&
   auto field = fields_.find(key);
   if (field == fields_.end()) {
     if (!optional && repeatable_.count(key) == 0) {
-      report_.error(source_.name(), source_.end(), "\"" + key + "\" is missing");
+      report_.error(source_.name(), source_.end(), tool::message("\"{0}\" is missing", key));
     }
     return;
   }
@@ -118,7 +119,7 @@ std::string FieldFile::name(const std::string& key) {
 void FieldFile::end() {
   for (const auto& [key, values] : fields_) {
     for (const Field& value : values) {
-      report_.error(source_.name(), {value.line.number, 1}, "unknown key \"" + key + "\"");
+      report_.error(source_.name(), {value.line.number, 1}, tool::message("unknown key \"{0}\"", key));
     }
   }
 }

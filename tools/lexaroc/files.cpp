@@ -16,7 +16,7 @@ namespace lx::compiler {
 namespace {
 
 [[noreturn]] void fail(const fs::path& path, const char* what, int error) {
-  throw IoError(path.string() + ": " + what + ": " + std::strerror(error));
+  throw IoError(path.string() + ": " + tool::message(what) + ": " + tool::system_error_text(error));
 }
 
 class Descriptor {
@@ -83,7 +83,8 @@ void write_file(const fs::path& path, std::string_view bytes) {
 void make_directory(const fs::path& path) {
   std::error_code error;
   fs::create_directories(path, error);
-  if (error) throw IoError(path.string() + ": cannot create: " + error.message());
+  if (error)
+    throw IoError(path.string() + ": " + tool::message("cannot create") + ": " + tool::message(error.message()));
 }
 
 std::vector<fs::path> list_files(const fs::path& directory, std::string_view extension) {
@@ -93,7 +94,7 @@ std::vector<fs::path> list_files(const fs::path& directory, std::string_view ext
     if (entry->path().extension() == extension && entry->is_regular_file()) files.push_back(entry->path());
   }
   if (error && error != std::errc::no_such_file_or_directory) {
-    throw IoError(directory.string() + ": cannot list: " + error.message());
+    throw IoError(directory.string() + ": " + tool::message("cannot list") + ": " + tool::message(error.message()));
   }
   std::sort(files.begin(), files.end());
   return files;

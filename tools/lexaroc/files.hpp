@@ -7,13 +7,15 @@
 #include <string_view>
 #include <vector>
 
+#include "tools/lexaroc/report.hpp"
+
 namespace lx::compiler {
 
 namespace fs = std::filesystem;
 
 // The system refused to read or write something: neither the sources nor the command line are to blame.
-class IoError : public std::runtime_error {
-  using std::runtime_error::runtime_error;
+class IoError : public Fault {
+  using Fault::Fault;
 };
 
 std::string read_file(const fs::path& path);

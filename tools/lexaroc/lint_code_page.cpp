@@ -23,7 +23,7 @@ class PageLint {
   }
 
  private:
-  void error(const std::string& message) { report_.error(page_.file, page_.spot, message); }
+  void error(const tool::Message& message) { report_.error(page_.file, page_.spot, message); }
 
   void expect(Code code, uint16_t unicode) {
     if (page_.unicode_of(code) != unicode || page_.exact_code(unicode) != code) {
@@ -94,9 +94,9 @@ void lint_round_trip(const CodePage& page, const UnicodeTables& unicode, Report&
       report.error(page.file, page.spot, "the compiled page does not read back as its source");
     }
   } catch (const PackError& error) {
-    report.error(page.file, page.spot, error.what());
+    report.error(page.file, page.spot, error.text);
   } catch (const StructureError& error) {
-    report.error(page.file, page.spot, std::string("the compiled page is broken: ") + error.what());
+    report.error(page.file, page.spot, tool::message("the compiled page is broken: {0}", error.text));
   }
 }
 

@@ -24,7 +24,7 @@ class SortLint {
   }
 
  private:
-  void error(const std::string& message) { report_.error(source_.file, source_.spot, message); }
+  void error(const tool::Message& message) { report_.error(source_.file, source_.spot, message); }
 
   void check_page(unsigned page) {
     const SortPageRule& rule = sort_.pages[page];
@@ -63,7 +63,7 @@ class SortLint {
     }
     bool found = std::any_of(sort_.expansions.begin(), sort_.expansions.end(),
                              [character](const SortExpansionRow& row) { return row.character == character; });
-    if (!found) error(unicode_name(character) + " expands to nothing");
+    if (!found) error(tool::message("{0} expands to nothing", unicode_name(character)));
   }
 
   void check_expansion(size_t i) {
@@ -94,8 +94,8 @@ void lint_sort(const Sort& sort, Report& report) {
   try {
     pack_sort(sort.weights);
     SortLint(sort, report).run();
-  } catch (const std::runtime_error& error) {
-    report.error(sort.file, sort.spot, error.what());
+  } catch (const Fault& error) {
+    report.error(sort.file, sort.spot, error.text);
   }
 }
 

@@ -12,6 +12,7 @@
 #include "compile.hpp"
 #include "dump.hpp"
 #include "object_file.hpp"
+#include "tools/lexaro/failure.hpp"
 
 namespace {
 
@@ -55,7 +56,7 @@ int run_dump(const fs::path& file, const fs::path& output, const std::optional<s
     write_file(output, source);
     return kDone;
   } catch (const StructureError& error) {
-    std::cerr << file.string() << ": " << error.what() << '\n';
+    std::cerr << file.string() << ": " << error.text.shown << '\n';
     return kBadData;
   }
 }
@@ -141,13 +142,19 @@ int main(int argc, char** argv) {
   try {
     return run(argc, argv);
   } catch (const IoError& error) {
-    std::cerr << "lexaroc: " << error.what() << '\n';
+    std::cerr << "lexaroc: " << error.text.shown << '\n';
     return kIoFailure;
   } catch (const fs::filesystem_error& error) {
     std::cerr << "lexaroc: " << error.what() << '\n';
     return kIoFailure;
+  } catch (const Fault& error) {
+    std::cerr << "lexaroc: " << error.text.shown << '\n';
+    return kBadData;
+  } catch (const lx::tool::Failure& error) {
+    std::cerr << "lexaroc: " << error.text().shown << '\n';
+    return kBadData;
   } catch (const std::exception& error) {
-    std::cerr << "lexaroc: " << error.what() << '\n';
+    std::cerr << "lexaroc: " << lx::tool::message(error.what()).shown << '\n';
     return kBadData;
   }
 }

@@ -14,7 +14,7 @@ std::string make_object_file(const Sections& sections, uint32_t format) {
   for (unsigned i = 0; i < kMaxSections; ++i) {
     const std::string& section = sections[i];
     if (section.size() > kLargestSection) {
-      throw PackError("section " + std::to_string(i + 1) + " would have " + std::to_string(section.size()) + " bytes");
+      throw PackError(tool::message("section {0} would have {1} bytes", i + 1, section.size()));
     }
     if (section.empty()) continue;
     header.section_count = static_cast<uint16_t>(i + 1);
@@ -47,7 +47,7 @@ ObjectFile split_object_file(std::string_view bytes) {
     uint32_t size = header.size_of(i);
     if (size == 0) continue;
     if (offset > bytes.size() || size > bytes.size() - offset) {
-      throw StructureError("section " + std::to_string(i + 1) + " reaches beyond the file");
+      throw StructureError(tool::message("section {0} reaches beyond the file", i + 1));
     }
     file.sections[i] = bytes.substr(offset, size);
   }

@@ -8,6 +8,7 @@
 #include <string_view>
 
 #include "objects/file_format.hpp"
+#include "tools/lexaroc/report.hpp"
 
 namespace lx::compiler {
 
@@ -23,8 +24,8 @@ std::string_view bytes_of(const T& record) {
 std::string make_object_file(const Sections& sections, uint32_t format);
 
 // A compiled file breaks its format.
-class StructureError : public std::runtime_error {
-  using std::runtime_error::runtime_error;
+class StructureError : public Fault {
+  using Fault::Fault;
 };
 
 struct ObjectFile {

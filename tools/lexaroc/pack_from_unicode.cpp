@@ -112,7 +112,7 @@ FromUnicodeSections pack_from_unicode(const CodePage& page) {
     FromUnicodeSections result = pack(pages);
     if (result.values.size() <= kLargestSection) return result;
     if (!split_pages(pages, result.values.size() - kLargestSection)) {
-      throw PackError("section 3 would have " + std::to_string(result.values.size()) + " bytes");
+      throw PackError(tool::message("section 3 would have {0} bytes", result.values.size()));
     }
   }
 }

@@ -8,11 +8,13 @@
 #include <string>
 #include <vector>
 
+#include "tools/lexaroc/report.hpp"
+
 namespace lx::compiler {
 
 // A page has more characters than its file format can hold.
-class PackError : public std::runtime_error {
-  using std::runtime_error::runtime_error;
+class PackError : public Fault {
+  using Fault::Fault;
 };
 
 inline constexpr size_t kLargestSection = 65535;

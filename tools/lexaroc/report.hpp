@@ -7,6 +7,8 @@
 #include <string>
 #include <vector>
 
+#include "tools/messages/message.hpp"
+
 namespace lx::compiler {
 
 // A place in a text. Lines and columns count from 1; a column is one character, not one byte.
@@ -15,19 +17,26 @@ struct Spot {
   unsigned column = 1;
 };
 
-// Ends the reading of one line or file; whoever knows the file name turns it into an entry of the report.
-class SourceError : public std::runtime_error {
+// What is wrong, for people. A text without parts may be given in English: it is translated here.
+class Fault : public std::runtime_error {
  public:
-  SourceError(Spot where, const std::string& message) : std::runtime_error(message), spot(where) {}
+  explicit Fault(const tool::Message& text);
+  const tool::Message text;
+};
+
+// Ends the reading of one line or file; whoever knows the file name turns it into an entry of the report.
+class SourceError : public Fault {
+ public:
+  SourceError(Spot where, const tool::Message& message) : Fault(message), spot(where) {}
   Spot spot;
 };
 
 class Report {
  public:
-  void error(const std::string& file, Spot spot, const std::string& message);
-  void error(const std::string& file, const SourceError& error) { this->error(file, error.spot, error.what()); }
+  void error(const std::string& file, Spot spot, const tool::Message& message);
+  void error(const std::string& file, const SourceError& error) { this->error(file, error.spot, error.text); }
   // For compiled files, which have no lines.
-  void error(const std::string& file, const std::string& message);
+  void error(const std::string& file, const tool::Message& message);
 
   bool clean() const { return messages_.empty(); }
   size_t count() const { return messages_.size(); }

@@ -39,7 +39,7 @@ class SortReader {
     } else if (key == "block") {
       block(start, cursor);
     } else {
-      if (!seen_.insert(key).second) start.fail("\"" + key + "\" is given twice");
+      if (!seen_.insert(key).second) start.fail(tool::message("\"{0}\" is given twice", key));
       header(start, key, cursor);
     }
   }
@@ -60,7 +60,7 @@ class SortReader {
       form(start, key, cursor);
       form_failed_ = false;
     } else {
-      start.fail("unknown keyword \"" + key + "\"");
+      start.fail(tool::message("unknown keyword \"{0}\"", key));
     }
   }
 

@@ -140,7 +140,7 @@ void SortWeightsReader::pages(Cursor& cursor) {
   bool by_base = rule.kind == SortPageKind::primary || rule.kind == SortPageKind::special;
   if (last > first && rule.base + 256 * (last - first) > 0xFFFF) throw SourceError(spot, "the weights run past FFFF");
   for (unsigned page = first; page <= last; ++page) {
-    if (stated_[page]) throw SourceError(spot, "page " + hex_text(page, 2) + " is given twice");
+    if (stated_[page]) throw SourceError(spot, tool::message("page {0} is given twice", hex_text(page, 2)));
     stated_[page] = true;
     sort_.pages[page] = rule;
     if (rule.kind == SortPageKind::table) sort_.tables[page];
@@ -152,8 +152,9 @@ void SortWeightsReader::character(Cursor& cursor) {
   Spot spot = cursor.spot();
   auto c = static_cast<uint16_t>(cursor.hex(4));
   auto table = sort_.tables.find(c >> 8);
-  if (table == sort_.tables.end()) throw SourceError(spot, unicode_name(c) + " is on no page with a table");
-  if (seen_[c]) throw SourceError(spot, unicode_name(c) + " is given twice");
+  if (table == sort_.tables.end())
+    throw SourceError(spot, tool::message("{0} is on no page with a table", unicode_name(c)));
+  if (seen_[c]) throw SourceError(spot, tool::message("{0} is given twice", unicode_name(c)));
   table->second[c & 0xFF] = read_entry(cursor, true);
   seen_[c] = true;
   ++seen_count_;
@@ -180,7 +181,7 @@ void SortWeightsReader::pair(Cursor& cursor) {
 
 SortObject SortWeightsReader::take(Spot end) {
   for (unsigned page = 0; page < 256; ++page) {
-    if (!stated_[page]) throw SourceError(end, "page " + hex_text(page, 2) + " is missing");
+    if (!stated_[page]) throw SourceError(end, tool::message("page {0} is missing", hex_text(page, 2)));
   }
   if (seen_count_ != sort_.tables.size() * 256) {
     throw SourceError(end, std::to_string(sort_.tables.size() * 256 - seen_count_) +

@@ -91,7 +91,7 @@ void Cursor::expect(char32_t wanted) {
   }
   std::string name;
   append_utf8(name, wanted);
-  fail(wanted == U' ' ? "expected a blank" : "expected \"" + name + "\"");
+  fail(wanted == U' ' ? tool::message("expected a blank") : tool::message("expected \"{0}\"", name));
 }
 
 bool Cursor::accept(std::string_view word) {
@@ -106,7 +106,8 @@ bool Cursor::accept(std::string_view word) {
 std::string Cursor::word(const char* what) {
   std::string result;
   while (!done() && peek() > U' ' && peek() < 0x7F) result.push_back(static_cast<char>(next()));
-  if (result.empty() || (!done() && peek() != U' ' && peek() != U'\t')) fail(std::string("expected ") + what);
+  if (result.empty() || (!done() && peek() != U' ' && peek() != U'\t'))
+    fail(tool::message("expected {0}", tool::message(what)));
   return result;
 }
 
@@ -124,7 +125,7 @@ unsigned Cursor::decimal(unsigned largest) {
   uint64_t value = 0;
   while (peek() >= U'0' && peek() <= U'9') {
     value = value * 10 + (next() - U'0');
-    if (value > largest) throw SourceError(start, "the number is larger than " + std::to_string(largest));
+    if (value > largest) throw SourceError(start, tool::message("the number is larger than {0}", largest));
   }
   return static_cast<unsigned>(value);
 }
@@ -133,7 +134,7 @@ uint32_t Cursor::hex(unsigned digits) {
   uint32_t value = 0;
   for (unsigned i = 0; i < digits; ++i) {
     int digit = hex_value(peek());
-    if (digit < 0) fail("expected " + std::to_string(digits) + " hexadecimal digits in upper case");
+    if (digit < 0) fail(tool::message("expected {0} hexadecimal digits in upper case", digits));
     value = value << 4 | static_cast<uint32_t>(digit);
     ++at_;
   }

@@ -26,7 +26,7 @@ class Cursor {
   char32_t peek() const { return done() ? U'\0' : line_->text[at_]; }
   char32_t next() { return line_->text[at_++]; }
   Spot spot() const { return {line_->number, static_cast<unsigned>(at_) + 1}; }
-  [[noreturn]] void fail(const std::string& message) const { throw SourceError(spot(), message); }
+  [[noreturn]] void fail(const tool::Message& message) const { throw SourceError(spot(), message); }
 
   // Takes the character, or fails.
   void expect(char32_t wanted);

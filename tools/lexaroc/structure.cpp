@@ -35,7 +35,7 @@ std::vector<DirectoryEntry> check_control_file(std::string_view bytes) {
     const DirectoryEntry& before = entries[i - 1];
     const DirectoryEntry& entry = entries[i];
     if (entry.type < before.type || (entry.type == before.type && entry.id <= before.id)) {
-      throw StructureError("record " + std::to_string(i + 1) + " is out of order");
+      throw StructureError(tool::message("record {0} is out of order", i + 1));
     }
   }
   return entries;

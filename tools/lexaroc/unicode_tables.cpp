@@ -51,7 +51,7 @@ class BlockReader {
     if (!cursor.accept("table ")) return false;
     if (next_ == end_) throw SourceError(start, "there is no further table");
     std::string expected = std::string(next_->name) + " " + hex_text(next_->first, 4) + " " + hex_text(next_->last, 4);
-    if (!cursor.accept(expected)) cursor.fail("expected \"" + expected + "\"");
+    if (!cursor.accept(expected)) cursor.fail(tool::message("expected \"{0}\"", expected));
     cursor.end();
     current_ = next_++;
     least_ = current_->first;
@@ -82,7 +82,7 @@ uint32_t read_bits(Cursor& cursor, const char* const (&names)[N]) {
     Spot start = cursor.spot();
     std::string word = cursor.word("a property");
     const char* const* name = std::find(std::begin(names), std::end(names), word);
-    if (name == std::end(names)) throw SourceError(start, "unknown property \"" + word + "\"");
+    if (name == std::end(names)) throw SourceError(start, tool::message("unknown property \"{0}\"", word));
     bits |= 1u << (name - std::begin(names));
     cursor.skip_blanks();
   }
@@ -213,7 +213,8 @@ void UnicodeTables::read_digits(const fs::path& path, Report& report) {
   });
   for (uint32_t c = 0; c < 65536; ++c) {
     if ((type_[c] & kDigit) != 0 && !listed[c]) {
-      report.error(source.name(), source.end(), unicode_name(c) + " has the type digit but is not listed");
+      report.error(source.name(), source.end(),
+                   tool::message("{0} has the type digit but is not listed", unicode_name(c)));
     }
   }
 }
