@@ -234,11 +234,11 @@ typedef int32_t (*LXEnumUFn)(void* context, uint8_t type, const LXUChar* name);
 #define LX_MAP_PLAIN 0x2000u /* with the two before: without the language's special pairs */
 #define LX_MAP_DIGITS 16u    /* digits of other scripts to ASCII */
 
-#define LX_CMP_NOCASE 0x80000040u
-#define LX_CMP_NOWIDTH 0x80000041u
-#define LX_CMP_TRIM 0x200000u
-#define LX_STR_LAST 0x80000020u /* the last occurrence */
-#define LX_COLL_TRIM 1u         /* ignore trailing blanks (LXStrcoll, LXStrcollEx) */
+#define LX_CMP_NOCASE 0x80000040u  /* without regard to case */
+#define LX_CMP_NOWIDTH 0x80000041u /* without regard to half and full width */
+#define LX_CMP_TRIM 0x200000u      /* ignore trailing blanks */
+#define LX_STR_LAST 0x80000020u    /* the last occurrence */
+#define LX_COLL_TRIM 1u            /* ignore trailing blanks (LXStrcoll, LXStrcollEx) */
 
 #define LX_NUM_TEXTOPT 0x1u    /* the territory's own texts instead of the locale's */
 #define LX_NUM_TERMINATE 0x8u  /* write and count a terminator */
@@ -530,9 +530,11 @@ LX_API uint32_t LXCloseConversion(LXConversion* handle) LX_NOEXCEPT; /* 0 or LX_
  */
 LX_API uint32_t LXConvertBuffer(LXConversion* handle, char** out, int32_t* out_room, const char** in, int32_t* in_left,
                                 uint32_t reserved) LX_NOEXCEPT;
-/* Most target bytes for one source byte of well-formed text, without changed line ends and the final shift byte. */
+/* Most target bytes for one source byte of well-formed text, without changed line ends and the final shift byte. A byte
+   of malformed text takes up to three in UTF-8. */
 LX_API int32_t LXConversionRatio(LXLocale* target_locale, LXLocale* source_locale, uint32_t reserved) LX_NOEXCEPT;
 
+/* From the source's code page into the target's; the status stands in the target locale. */
 LX_API int32_t LXConvertString(LXLocale* target_locale, char* out, int32_t out_size, LXLocale* source_locale,
                                const char* in, int32_t in_length, uint32_t flags) LX_NOEXCEPT;
 LX_API int32_t LXConvertStringW(LXLocale* target_locale, LXWChar* out, int32_t out_size, LXLocale* source_locale,
@@ -541,12 +543,14 @@ LX_API int32_t LXConvertStringEx(LXLocale* target_locale, char* out, uint32_t ta
                                  LXLocale* source_locale, const char* in, uint32_t source_shift_state,
                                  int32_t in_length, uint32_t flags) LX_NOEXCEPT;
 
-/* Bytes that `chars` characters occupy, and whole characters in `bytes` bytes; shift bytes are no characters. */
+/* Bytes that `chars` characters occupy, and whole characters in `bytes` bytes; shift bytes are no characters. The first
+   looks at the byte behind its last character, which may be a shift byte. */
 LX_API int32_t LXCpStrCharToByteLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                                     int32_t chars) LX_NOEXCEPT;
 LX_API int32_t LXCpStrByteToCharLen(const LXObjEntry* record, const char* string, uint32_t shift_state,
                                     int32_t bytes) LX_NOEXCEPT;
 
+/* Between the locale's code page and UCS-2. */
 LX_API int32_t LXStringToUnicode(LXLocale* locale, LXUChar* out, int32_t out_size, const char* in, int32_t in_length,
                                  uint32_t flags) LX_NOEXCEPT;
 LX_API int32_t LXStringToUnicodeW(LXLocale* locale, LXUChar* out, int32_t out_size, const LXWChar* in,
@@ -631,9 +635,9 @@ extern LX_API const uint16_t LXDigits[179][2];
 
 /* Entry of the code page's length table for the first byte; 0: it begins no character (walks then step by one). */
 LX_API int32_t LXByteLength(LXLocale* locale, const char* s) LX_NOEXCEPT;
+LX_API int32_t LXByteLengthEx(LXLocale* locale, const char* s, uint32_t state) LX_NOEXCEPT;
 /* Bytes of a packed character, 1 to 4. */
 LX_API int32_t LXByteLengthW(LXLocale* locale, LXWChar value) LX_NOEXCEPT;
-LX_API int32_t LXByteLengthEx(LXLocale* locale, const char* s, uint32_t state) LX_NOEXCEPT;
 /* The next character, and the one before `current` in the text that begins at `start`. */
 LX_API char* LXNextChar(LXLocale* locale, const char* s) LX_NOEXCEPT;
 LX_API char* LXNextCharEx(LXLocale* locale, const char* s, uint32_t state, uint32_t* new_state) LX_NOEXCEPT;
@@ -693,6 +697,7 @@ LX_API int32_t LXTruncateStringEx(LXLocale* locale, char* string, uint32_t state
 
 /* ---- Unicode character mapping ---- */
 
+/* The other case; the character itself where it has none. */
 LX_API LXUChar LXUnicodeToLower(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
 LX_API LXUChar LXUnicodeToUpper(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
 /* The full-width and the half-width form. */
@@ -701,7 +706,7 @@ LX_API LXUChar LXUnicodeToF2H(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
 /*
  * Maps a whole text: LX_MAP_, or 0 (copy), with LX_OPT_CHARS. Case mapping follows the special pairs of the language,
  * unless LX_MAP_PLAIN is set. A measured length includes the terminator. Returns the units (characters) written; what
- * does not fit is left out. With LX_OPT_CHARS no more than 512 bytes of output are made.
+ * does not fit is left out, without a status. With LX_OPT_CHARS no more than 512 bytes of output are made.
  */
 LX_API int32_t LXMapString(LXLocale* locale, char* out, int32_t out_size, const char* in, int32_t in_len,
                            uint32_t flags) LX_NOEXCEPT;
@@ -732,7 +737,8 @@ LX_API int32_t LXStrcmpU(LXLocale* locale, const LXUChar* ustr1, int32_t len1, c
                          uint32_t options) LX_NOEXCEPT;
 /* Bytes of whole characters in `len` bytes of shift-sensitive text. */
 LX_API int32_t AdjustLength(LXLocale* locale, const char* str, uint32_t state, int32_t len) LX_NOEXCEPT;
-/* Copies whole characters, without adding a terminator: units (characters) copied. */
+/* Copies whole characters, without adding a terminator: units (characters) copied. A copy that was cut may leave a
+   double-byte run open: see LXTruncateStringEx. */
 LX_API int32_t LXStrcpy(LXLocale* locale, char* dst, int32_t dst_size, const char* src, int32_t src_len,
                         uint32_t options) LX_NOEXCEPT;
 LX_API int32_t LXStrcpyEx(LXLocale* locale, char* dst, int32_t dst_size, const char* src, uint32_t state,
@@ -794,6 +800,7 @@ LX_API LXWChar* LXWcstok(LXLocale* locale, LXWChar* wstr, int32_t* len, const LX
                          LXWChar** next, uint32_t options) LX_NOEXCEPT;
 LX_API LXUChar* LXStrtokU(LXLocale* locale, LXUChar* ustr, int32_t* len, const LXUChar* delims, int32_t delims_len,
                           LXUChar** next, uint32_t options) LX_NOEXCEPT;
+/* Bytes of a packed character, as LXByteLengthW. */
 LX_API int32_t LXStrByteLength(LXLocale* locale, LXWChar value) LX_NOEXCEPT;
 /* Units before the terminator. */
 LX_API int32_t LXWcslen(LXLocale* locale, const LXWChar* wstr) LX_NOEXCEPT;
@@ -838,7 +845,8 @@ LX_API int32_t LXStrGetNextWeightU(LXLocale* locale, const LXUChar** text, int32
  * Compares by the locale's sort object: less than, equal to or greater than 0. options: 0, LX_CMP_NOCASE,
  * LX_CMP_NOWIDTH; trailing blanks are ignored with LX_COLL_TRIM (plain and Ex; LX_CMP_NOWIDTH includes it) or
  * LX_CMP_TRIM (W and U); LX_OPT_CHARS. In the plain and Ex forms, trimming cuts the second text to the length of the
- * trimmed first one. 0 with LX_E_ARGUMENT or LX_E_MEMORY on failure. Without a sort object as LXStrcmp.
+ * trimmed first one. 0 with LX_E_ARGUMENT or LX_E_MEMORY on failure, which LXGetError tells from equal. Without a sort
+ * object as LXStrcmp. In LXStrcollEx a state stands behind its length, in LXStrcmpEx before it.
  */
 LX_API int32_t LXStrcoll(LXLocale* locale, const char* str1, int32_t len1, const char* str2, int32_t len2,
                          uint32_t options) LX_NOEXCEPT;
@@ -851,7 +859,8 @@ LX_API int32_t LXStrcollU(LXLocale* locale, const LXUChar* ustr1, int32_t len1, 
 /*
  * A key whose bytes compare (memcmp, then length) as the texts do. options: 0, LX_CMP_NOCASE, LX_CMP_NOWIDTH,
  * LX_OPT_CHARS. Returns the length of the whole key, -1 with LX_E_ARGUMENT or LX_E_MEMORY; a key longer than key_size
- * was not written. The rest of a buffer that held the work area (16 bytes a character) is zeroed.
+ * was not written (but for an empty text: as much of its three zero bytes as fits; 0 without room). The rest of a
+ * buffer that held the work area (16 bytes a character) is zeroed.
  */
 LX_API int32_t LXStrxfrm(LXLocale* locale, void* key, int32_t key_size, const char* str, int32_t len,
                          uint32_t options) LX_NOEXCEPT;
@@ -896,7 +905,7 @@ LX_API int32_t LXLongToStringEx(LXLocale* locale, int32_t value, char* buffer, u
  * Reads an integer in base 2 to 36; 0 takes the base from a prefix "0x" or "0". Stops at the first character that does
  * not belong (*end, optional); 0 with *end there when there is no number. Out of range: the nearest value. flags:
  * LX_NUM_TEXTOPT, LX_NUM_FULLWIDTH, LX_NUM_MONETARY, LX_NUM_UNSIGNED (cast the result), LX_NUM_CHARLEN; others
- * LX_E_ARGUMENT. LX_E_BASE for another base.
+ * LX_E_ARGUMENT. LX_E_BASE for another base. *end_state (optional): the shift state at *end, `state` behind the text.
  */
 LX_API int32_t LXStringToLong(LXLocale* locale, const char* string, int32_t length, const char** end, int32_t base,
                               uint32_t flags) LX_NOEXCEPT;
@@ -932,8 +941,8 @@ LX_API double LXStringToDoubleEx(LXLocale* locale, const char* string, uint32_t 
                                  uint32_t* end_state, uint32_t flags) LX_NOEXCEPT;
 /*
  * An amount with the locale's currency symbol (LX_NUM_INTLSYM: the international one) and sign, of which three
- * characters count when it is negative. At most 512 bytes with LX_NUM_CHARLEN. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE,
- * LX_NUM_INTLSYM, LX_NUM_CHARLEN.
+ * characters count when it is negative. The decimal point always comes, also before no fraction digits. At most 512
+ * bytes with LX_NUM_CHARLEN. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE, LX_NUM_INTLSYM, LX_NUM_CHARLEN.
  */
 LX_API int32_t LXCurrencyToString(LXLocale* locale, double amount, char* buffer, int32_t length,
                                   uint32_t flags) LX_NOEXCEPT;
@@ -1118,8 +1127,8 @@ LX_API LXWChar LXReadCharW(LXStream* stream, LXLocale* locale, uint32_t reserved
 LX_API LXWChar LXReadChar(LXStream* stream, LXLocale* locale, uint32_t reserved) LX_NOEXCEPT;
 LX_API LXWChar LXReadCharEx(LXStream* stream, LXLocale* locale, uint32_t* state, uint32_t reserved) LX_NOEXCEPT;
 /*
- * A line: its units (LX_OPT_CHARS: characters; the size too), without its end. flags: LX_EOL_1 to LX_EOL_4 (none: lines
- * never end), LX_EOL_KEEP (the end stays), LX_OPT_TERMINATE (counted), LX_OPT_CHARS. Stops also before a character that
+ * A line: its units (LX_OPT_CHARS: characters; the size too), without its end. flags: LX_EOL_1 to LX_EOL_4 (none is
+ * LX_EOL_1), LX_EOL_KEEP (the end stays), LX_OPT_TERMINATE (counted), LX_OPT_CHARS. Stops also before a character that
  * the buffer lacks room for; line ends need room in any case, and those of two characters come whole if it is more than
  * one. -1: the stream has ended; -2: failure, with the status in the locale. A failure behind the first character
  * leaves its status too, but the result is what came before it.
@@ -1155,8 +1164,9 @@ LX_API int32_t LXWriteCharEx(LXStream* stream, LXLocale* locale, const char* s, 
 /*
  * Opens the first catalog found: `directory`, then the environment's LX_NLSPATH (27 bytes at most), then the name
  * itself, each a list of templates between semicolons: %N the name, %L language_TERRITORY, %l, %t, %%. What names a
- * directory is searched for the name. If there is none, the same with the default locale's language and territory.
- * flags: LX_CAT_LOAD reads all of it at once (and searches once); LX_CAT_ONEPASS searches once; 0. Null with
+ * directory is searched for the name. If there is none, the same with the default locale's language and territory,
+ * whose catalog then comes before any default text (LX_CAT_ONEPASS: not). %L, %l and %t are the abbreviations in
+ * capitals. flags: LX_CAT_LOAD reads all of it at once (and searches once); LX_CAT_ONEPASS searches once; 0. Null with
  * LX_E_ARGUMENT, LX_E_MEMORY, LX_E_CATALOG or the status of opening. The caller closes it.
  */
 LX_API LXCatalog* LXOpenCatalog(LXLocale* locale, const char* directory, const char* name, uint32_t flags) LX_NOEXCEPT;
@@ -1165,7 +1175,8 @@ LX_API LXCatalog* LXOpenCatalogW(LXLocale* locale, const LXWChar* directory, con
 LX_API LXCatalog* LXOpenCatalogU(LXLocale* locale, const LXUChar* directory, const LXUChar* name,
                                  uint32_t flags) LX_NOEXCEPT;
 /*
- * Writes a message, converted and terminated; if there is none, the default text (optional). Returns 0,
+ * Writes a message, converted and terminated, cut without a status where room ends; if there is none, the default text
+ * (optional; not for a null catalog). Returns 0,
  * LX_E_NOCATALOG, LX_E_ARGUMENT, LX_E_MESSAGE (without a default), or LX_E_CATALOG and LX_E_MEMORY (with one too).
  * flags: LX_OPT_TERMINATE (always so), LX_OPT_CHARS (out_size counts characters).
  */
@@ -1245,7 +1256,7 @@ typedef struct LXConversionProblem {
   uint64_t offset;  /* of the character's first byte, counted from the first byte given to the handle */
   uint32_t kind;    /* LX_PROBLEM_ */
   uint32_t unicode; /* the character, where there is one; else 0xFFFD */
-  uint8_t length;   /* of the source character */
+  uint8_t length;   /* of the source character; 0: the end of the text, where a run was left open */
   uint8_t bytes[5]; /* the source character */
 } LXConversionProblem;
 typedef void (*LXProblemFn)(void* context, const LXConversionProblem* problem);
