@@ -10,18 +10,8 @@ target_link_libraries(lexaro_core PRIVATE lexaro_options)
 # vectorizing of straight-line code; loops are not concerned.
 target_compile_options(lexaro_core PRIVATE -fno-exceptions -fno-rtti -fno-threadsafe-statics -fno-tree-slp-vectorize)
 
-add_library(lexaro SHARED)
-target_link_libraries(lexaro PRIVATE lexaro_core lexaro_options)
-set_target_properties(lexaro PROPERTIES
-  VERSION ${PROJECT_VERSION}
-  SOVERSION ${PROJECT_VERSION_MAJOR}
-  LINK_DEPENDS ${PROJECT_SOURCE_DIR}/cmake/exports.map)
-# It stays mapped once loaded: threads that end after a dlclose still give their storage back through it.
-target_link_options(lexaro PRIVATE -Wl,--version-script=${PROJECT_SOURCE_DIR}/cmake/exports.map -Wl,--as-needed
-  -Wl,-z,nodelete)
-if(NOT LEXARO_SANITIZE)
-  target_link_options(lexaro PRIVATE -Wl,-z,defs)
-endif()
+# Decimal numbers are read by rounding every step: with fused ones, machines that have them would read others.
+set_source_files_properties(format/parse_number.cpp PROPERTIES COMPILE_OPTIONS -ffp-contract=off)
 
 # The static library also serves the tests that look behind the interface.
 add_library(lexaro_static STATIC)
@@ -30,11 +20,31 @@ target_link_libraries(lexaro_static
   PUBLIC $<BUILD_INTERFACE:lexaro_options>)
 set_target_properties(lexaro_static PROPERTIES OUTPUT_NAME lexaro)
 
+if(LEXARO_SHARED)
+  add_library(lexaro SHARED)
+  target_link_libraries(lexaro PRIVATE lexaro_core lexaro_options)
+  set_target_properties(lexaro PROPERTIES
+    VERSION ${PROJECT_VERSION}
+    SOVERSION ${PROJECT_VERSION_MAJOR}
+    LINK_DEPENDS ${PROJECT_SOURCE_DIR}/cmake/exports.map)
+  # It stays mapped once loaded: threads that end after a dlclose still give their storage back through it.
+  target_link_options(lexaro PRIVATE -Wl,--version-script=${PROJECT_SOURCE_DIR}/cmake/exports.map -Wl,--as-needed
+    -Wl,-z,nodelete)
+  if(NOT LEXARO_SANITIZE)
+    target_link_options(lexaro PRIVATE -Wl,-z,defs)
+  endif()
+else()
+  add_library(lexaro ALIAS lexaro_static)
+endif()
+
 find_package(Threads REQUIRED)
-foreach(target lexaro lexaro_static)
+set(LEXARO_LIBRARIES lexaro_static)
+if(LEXARO_SHARED)
+  list(PREPEND LEXARO_LIBRARIES lexaro)
+endif()
+foreach(target ${LEXARO_LIBRARIES})
   target_include_directories(${target} PUBLIC
     $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>
     $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
   target_link_libraries(${target} PUBLIC Threads::Threads)
 endforeach()
-add_library(Lexaro::lexaro ALIAS lexaro)

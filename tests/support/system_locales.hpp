@@ -2,6 +2,7 @@
 // Locales of the operating system, made with its own tool in a directory that LOCPATH names as long as this lives.
 #pragma once
 
+#include <bit>
 #include <cstdlib>
 #include <filesystem>
 #include <string>
@@ -21,9 +22,10 @@ struct SystemLocale {
 class SystemLocales {
  public:
   explicit SystemLocales(const std::vector<SystemLocale>& locales) {
+    const std::string order = std::endian::native == std::endian::big ? " --big-endian" : "";
     std::string command = "cd " + std::string(directory_.path()) + " && { ";
     for (const SystemLocale& one : locales) {
-      command += std::string("localedef -i ") + one.source + " -f " + one.charset + " ./" + one.native + " & ";
+      command += "localedef" + order + " -i " + one.source + " -f " + one.charset + " ./" + one.native + " & ";
     }
     made_ = std::system((command + "wait; } >log 2>&1").c_str()) == 0;
     for (const SystemLocale& one : locales) {
