@@ -9,6 +9,7 @@
 #include "support/counting_allocator.hpp"
 #include "support/edge_buffer.hpp"
 #include "support/page_source.hpp"
+#include "support/stored_unit.hpp"
 
 namespace lx::test {
 namespace {
@@ -69,7 +70,7 @@ std::string stored(Form form, const PageSource& page, std::u16string_view text) 
   std::string raw;
   for (char16_t c : text) {
     const uint32_t unit = form == Form::ucs2 ? c : packed(page.encode(c));
-    raw += unit_size(form) == 1 ? page.encode(c) : std::string(reinterpret_cast<const char*>(&unit), unit_size(form));
+    raw += unit_size(form) == 1 ? page.encode(c) : stored_unit(unit, unit_size(form));
   }
   return raw;
 }

@@ -2,6 +2,7 @@
 #include "nls1/translation_model.hpp"
 
 #include <algorithm>
+#include <cstring>
 
 namespace lx::test {
 namespace {
@@ -116,7 +117,9 @@ Units units_in(const Form& form, std::string_view bytes) {
   if (form.is_bytes()) return units_of(bytes);
   Units units;
   for (size_t at = 0; at + 2 <= bytes.size(); at += 2) {
-    units.push_back(static_cast<uint8_t>(bytes[at]) | static_cast<uint32_t>(static_cast<uint8_t>(bytes[at + 1])) << 8);
+    uint16_t unit = 0;
+    std::memcpy(&unit, bytes.data() + at, sizeof unit);
+    units.push_back(unit);
   }
   return units;
 }

@@ -141,6 +141,7 @@ INSTANTIATE_TEST_SUITE_P(FromPages, Translation, testing::ValuesIn(kPages));
 
 TEST(TranslationCases, WorkAsWritten) {
   constexpr uint32_t kPad = NLS1_XLT_PAD, kBlanks = NLS1_XLT_BLANKS;
+  const std::string units = raw(form_of(1200), {'A', 'B', 'C'});
   const struct {
     uint16_t to, from;
     std::string in;
@@ -157,8 +158,8 @@ TEST(TranslationCases, WorkAsWritten) {
       {930, 57352, "A日", 2, 2, LX_OPT_CHARS, {2, "\xC1\x0E\x45\x62\x0F", 2, 0}},
       {367, 930, "\x0E\x0E\x0F\x0F\xC1\x0F\x0F", 7, 9, 0, {1, "A", 7, 0}},
       {57352, 930, "\x0E\x41\x0E\x45\x66\x0F", 6, 3, 0, {3, "\xEF\xBF\xBD", 3, 40}},  // no enter byte
-      {367, 1200, "A\0B\0C\0"s, 6, 5, 0, {2, "AB", 4, 40}},  // one byte each uses half of the room
-      {1200, 1200, "A\0B\0C\0"s, 6, 2, LX_OPT_TERMINATE | kPad, {6, "A\0B\0C\0"s, 6, 0}},
+      {367, 1200, units, 6, 5, 0, {2, "AB", 4, 40}},  // one byte each uses half of the room
+      {1200, 1200, units, 6, 2, LX_OPT_TERMINATE | kPad, {6, units, 6, 0}},
   };
   for (const auto& one : cases) {
     SCOPED_TRACE(std::to_string(one.from) + " to " + std::to_string(one.to) + ": " + hex(one.in));

@@ -4,6 +4,7 @@
 
 #include "support/counting_allocator.hpp"
 #include "support/edge_buffer.hpp"
+#include "support/stored_unit.hpp"
 #include "support/text_model.hpp"
 
 namespace lx::test {
@@ -271,13 +272,15 @@ TEST_F(Streams, WrongUse) {
 TEST_F(Streams, MemoryRunsOut) {
   use(forms_.back(), {});
   memory_.arm(0, false);
-  open({std::string("a\0b\0c\0\n", 8)});
+  std::string bytes;
+  for (char16_t unit : {u'a', u'b', u'c', u'\n'}) bytes += stored_unit(unit, 2);
+  open({bytes});
   expect(stream_ != nullptr, 0, LX_E_MEMORY);
   open(Script(script_));
   for (auto [at, result] : {std::pair(0, -2), {2, 2}, {-1, 1}}) {  // at the first unit, the third, none
     memory_.arm(at, false);
-    alignas(2) char text[10] = {};
-    expect(line(text, 5, LX_EOL_1), result, at < 0 ? LX_OK : LX_E_MEMORY);
+    LXUChar text[5] = {};
+    expect(line(reinterpret_cast<char*>(text), 5, LX_EOL_1), result, at < 0 ? LX_OK : LX_E_MEMORY);
     EXPECT_EQ(text[0], at == 0 ? 0 : at < 0 ? 'c' : 'a');
   }
   memory_.free_fails = true;

@@ -3,6 +3,8 @@
 
 #include <algorithm>
 
+#include "support/stored_unit.hpp"
+
 namespace lx::test {
 namespace {
 
@@ -134,7 +136,7 @@ std::string encoded(const PageSource& page, std::u16string_view text) {
 
 std::string raw(const Form& form, const Units& units) {
   std::string bytes;
-  for (uint32_t unit : units) bytes.append(reinterpret_cast<const char*>(&unit), form.unit_size());  // little-endian
+  for (uint32_t unit : units) bytes += stored_unit(unit, form.unit_size());
   return bytes;
 }
 
