@@ -1,25 +1,17 @@
 // SPDX-License-Identifier: Apache-2.0
 // The input is an alias file.
-#include <lexaro/lexaro.h>
-
-#include <cstring>
 
 #include "fuzz_support.hpp"
 
 namespace lx::fuzz {
 namespace {
 
-class Library {
+class Aliases : public Target {
  public:
-  Library() : aliases_((test::write_small_directory(directory_), directory_), "alias.txt") {
-    LXInit(directory_.path(), nullptr, nullptr, nullptr, 0);
-  }
-  ~Library() { LXTerm(); }
-  Library(const Library&) = delete;
-  Library& operator=(const Library&) = delete;
+  Aliases() : aliases_((test::write_small_directory(directory_), directory_), "alias.txt") { start(directory_.path()); }
 
-  void run(const uint8_t* data, size_t size) {
-    aliases_.write(data, size);
+  void run(InputBytes input) override {
+    aliases_.write(input.rest());
     LXObjMgr* manager = LXGetObjManager();
     LXDestroyAliasList(manager);
     demand(LXBuildAliasList(manager) <= 1, "LXBuildAliasList");
@@ -49,10 +41,7 @@ class Library {
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static lx::fuzz::Library library;
-  library.run(data, size);
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<Aliases>(); }
+
+}  // namespace lx::fuzz

@@ -1,42 +1,23 @@
 // SPDX-License-Identifier: Apache-2.0
 // A message catalog, loaded and on disk, and all that its readers look at. The first bytes choose the caller's page and
 // the room of the messages; the rest is the file.
-#include <lexaro/lexaro.h>
-
-#include <iterator>
-#include <memory>
-#include <vector>
 
 #include "fuzz_support.hpp"
 
 namespace lx::fuzz {
 namespace {
 
-// The pages of the small directory of the tests.
-constexpr const char* kPages[] = {"US-ASCII", "Small", "Mixed", "OldSingle"};
-
-class Library {
+class Catalogs : public Target {
  public:
-  Library() {
+  Catalogs() {
     test::write_small_directory(directory_);
-    LXInit(directory_.path(), nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
-    for (size_t i = 0; i < std::size(kPages); ++i) {
-      std::string name = "English_UnitedStates." + std::string(kPages[i]) + "@BINARY";
-      locales_[i] = LXGetLocale(name.c_str(), 0, nullptr);
-      demand(locales_[i] != nullptr, "the test's own data");
-    }
+    start(directory_.path(), "English_UnitedStates.", {"US-ASCII", "Small", "Mixed", "OldSingle"}, "@BINARY");
   }
-  ~Library() {
-    for (LXLocale* locale : locales_) LXReleaseLocale(locale, 0);
-    LXTerm();
-  }
-  Library(const Library&) = delete;
-  Library& operator=(const Library&) = delete;
 
-  void run(InputBytes input) {
-    LXLocale* locale = locales_[input.byte() % std::size(kPages)];
+  void run(InputBytes input) override {
+    LXLocale* locale = locales_[input.byte() % locales_.size()];
     int32_t room = input.byte() % 64 + 1;
-    file_.write(input.data(), input.size());
+    file_.write(input.rest());
     for (bool on_disk : {false, true}) read_all(locale, on_disk, room);
   }
 
@@ -79,14 +60,10 @@ class Library {
 
   test::DataDirectory directory_;
   InputFile file_{directory_, "catalog"};
-  LXLocale* locales_[std::size(kPages)];
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static lx::fuzz::Library library;
-  library.run({data, size});
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<Catalogs>(); }
+
+}  // namespace lx::fuzz

@@ -1,25 +1,19 @@
 // SPDX-License-Identifier: Apache-2.0
 // The input is a control file: objects are looked up in what is made of it, and loaded.
-#include <lexaro/lexaro.h>
-
-#include <cstring>
 
 #include "fuzz_support.hpp"
 
 namespace lx::fuzz {
 namespace {
 
-class Library {
+class ControlFiles : public Target {
  public:
-  Library() : control_((test::write_small_directory(directory_), directory_), "control.nls") {
-    LXInit("/does/not/exist", nullptr, nullptr, nullptr, 0);
+  ControlFiles() : control_((test::write_small_directory(directory_), directory_), "control.nls") {
+    start("/does/not/exist");
   }
-  ~Library() { LXTerm(); }
-  Library(const Library&) = delete;
-  Library& operator=(const Library&) = delete;
 
-  void run(const uint8_t* data, size_t size) {
-    control_.write(data, size);
+  void run(InputBytes input) override {
+    control_.write(input.rest());
     uint32_t rc = 99;
     LXObjMgr* manager = LXInitObjManager(directory_.path(), LX_INIT_NO_DEFAULTS, &rc);
     demand(manager != nullptr, "LXInitObjManager");
@@ -53,10 +47,7 @@ class Library {
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static lx::fuzz::Library library;
-  library.run(data, size);
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<ControlFiles>(); }
+
+}  // namespace lx::fuzz

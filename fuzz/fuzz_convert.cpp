@@ -1,22 +1,18 @@
 // SPDX-License-Identifier: Apache-2.0
 // Two code pages, options and the sizes of pieces from the first bytes of the input, the rest is the text. However it
 // is cut, a text must come out the same, with the same problems; and other ways to convert it must agree.
-#include <lexaro/lexaro.h>
-
 #include <algorithm>
-#include <cstring>
 #include <iterator>
-#include <memory>
-#include <vector>
 
 #include "fuzz_support.hpp"
 
 namespace lx::fuzz {
 namespace {
 
-const char* const kPages[] = {"US-ASCII", "Latin1", "UTF-8",   "IBM037",   "IBM1047", "IBM930",  "IBM933",  "IBM935",
-                              "IBM937",   "IBM939", "IBM1364", "IBM1371",  "IBM1388", "IBM1390", "IBM1399", "MS932",
-                              "MS936",    "MS949",  "MS950",   "JapanEUC", "EUC-TW",  "EUC-KR",  "IBM424",  "MS874"};
+const std::vector<std::string> kPages = {"US-ASCII", "Latin1",   "UTF-8",   "IBM037", "IBM1047", "IBM930",
+                                         "IBM933",   "IBM935",   "IBM937",  "IBM939", "IBM1364", "IBM1371",
+                                         "IBM1388",  "IBM1390",  "IBM1399", "MS932",  "MS936",   "MS949",
+                                         "MS950",    "JapanEUC", "EUC-TW",  "EUC-KR", "IBM424",  "MS874"};
 constexpr size_t kLongestText = 4096;
 
 bool same(const LXConversionProblem& a, const LXConversionProblem& b) {
@@ -141,24 +137,11 @@ void check_strings(const Pair& pair, std::string_view text, const Outcome& whole
   }
 }
 
-class Library {
+class Conversions : public Target {
  public:
-  Library() {
-    LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
-    for (const char* page : kPages) {
-      uint32_t rc = 99;
-      locales_.push_back(LXGetLocale(("English_UnitedStates." + std::string(page) + "@BINARY").c_str(), 0, &rc));
-      demand(rc == LX_OK, page);
-    }
-  }
-  ~Library() {
-    for (LXLocale* locale : locales_) LXReleaseLocale(locale, 0);
-    LXTerm();
-  }
-  Library(const Library&) = delete;
-  Library& operator=(const Library&) = delete;
+  Conversions() { start(LEXARO_DATA, "English_UnitedStates.", kPages, "@BINARY"); }
 
-  void run(InputBytes input) {
+  void run(InputBytes input) override {
     LXLocale* source = locales_[input.byte() % locales_.size()];
     LXLocale* target = locales_[input.byte() % locales_.size()];
     Pair pair = {target, source, input.byte() & (LX_CONV_LINES_CRLF | LX_CONV_STRICT | LX_CONV_DISCARD)};
@@ -180,14 +163,10 @@ class Library {
   }
 
  private:
-  std::vector<LXLocale*> locales_;
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static lx::fuzz::Library library;
-  library.run({data, size});
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<Conversions>(); }
+
+}  // namespace lx::fuzz

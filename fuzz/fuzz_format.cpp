@@ -2,61 +2,45 @@
 // A locale, a kind of text, what to do and options from the first bytes of the input. The rest is a text that holds a
 // number, or a value, a time, a format and a text that holds a time. Texts and rooms end where their blocks of memory
 // end; results must stay inside and agree with each other.
-#include <lexaro/lexaro.h>
-
 #include <algorithm>
 #include <cmath>
-#include <cstring>
-#include <memory>
-#include <vector>
 
 #include "fuzz_support.hpp"
+#include "support/text_calls.hpp"
 
 namespace lx::fuzz {
 namespace {
 
+using test::Family;
+using test::Form;
+using test::State;
+using test::StateAt;
+
+constexpr Family<LXStringToLong, LXStringToLongEx, LXStringToLongW, LXStringToLongU> kStringToLong;
+constexpr Family<LXStringToDouble, LXStringToDoubleEx, LXStringToDoubleW, LXStringToDoubleU> kStringToDouble;
+constexpr Family<LXLongToString, LXLongToStringEx, LXLongToStringW, LXLongToStringU> kLongToString;
+constexpr Family<LXDoubleToString, LXDoubleToStringEx, LXDoubleToStringW, LXDoubleToStringU> kDoubleToString;
+constexpr Family<LXCurrencyToString, LXCurrencyToStringEx, LXCurrencyToStringW, LXCurrencyToStringU> kCurrencyToString;
+constexpr Family<LXTimeToString, LXTimeToStringEx, LXTimeToStringW, LXTimeToStringU> kTimeToString;
+constexpr Family<LXStringToTime, LXStringToTimeEx, LXStringToTimeW, LXStringToTimeU> kStringToTime;
+
 constexpr size_t kLongestText = 200;
-const char* const kLocales[] = {"English_UnitedStates.US-ASCII@BINARY",
-                                "German_Germany.UTF-8@BINARY",
-                                "Swedish_Sweden.Latin1@BINARY",
-                                "Japanese_Japan.MS932@BINARY",
-                                "English_UnitedStates.IBM037@BINARY",
-                                "Japanese_Japan.IBM930@BINARY",
-                                "German_German-Switzerland.IBM1364@BINARY"};
+const std::vector<std::string> kLocales = {"English_UnitedStates.US-ASCII@BINARY",
+                                           "German_Germany.UTF-8@BINARY",
+                                           "Swedish_Sweden.Latin1@BINARY",
+                                           "Japanese_Japan.MS932@BINARY",
+                                           "English_UnitedStates.IBM037@BINARY",
+                                           "Japanese_Japan.IBM930@BINARY",
+                                           "German_German-Switzerland.IBM1364@BINARY"};
 
-// A text in a block of its own size.
-template <class U>
-struct Text {
-  std::unique_ptr<U[]> block;
-  int32_t length;
-
-  explicit Text(std::string_view bytes) : length(static_cast<int32_t>(bytes.size() / sizeof(U))) {
-    block.reset(new U[static_cast<size_t>(length)]);
-    if (length != 0) std::memcpy(block.get(), bytes.data(), static_cast<size_t>(length) * sizeof(U));
-  }
-  const U* at() const { return block.get(); }
-  const U* end() const { return block.get() + length; }
-};
-
-class Library {
+class Formats : public Target {
  public:
-  Library() {
-    LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
-    for (const char* name : kLocales) {
-      uint32_t rc = 99;
-      locales_.push_back(LXGetLocale(name, 0, &rc));
-      demand(rc == LX_OK, name);
-      LXSetLocaleTextInfo(locales_.back(), LX_ITEM_POSITIVE_SIGN, "+1", -1, 0);
-    }
+  Formats() {
+    start(LEXARO_DATA, "", kLocales);
+    for (LXLocale* locale : locales_) LXSetLocaleTextInfo(locale, LX_ITEM_POSITIVE_SIGN, "+1", -1, 0);
   }
-  ~Library() {
-    for (LXLocale* locale : locales_) LXReleaseLocale(locale, 0);
-    LXTerm();
-  }
-  Library(const Library&) = delete;
-  Library& operator=(const Library&) = delete;
 
-  void run(InputBytes input) {
+  void run(InputBytes input) override {
     l_ = locales_[input.byte() % locales_.size()];
     const uint8_t kind = input.byte();
     state_ = kind >> 7;
@@ -67,24 +51,12 @@ class Library {
     std::string_view text = input.rest().substr(0, kLongestText);
     const bool write = (kind & 0x10) != 0;
     if ((kind & 0x30) != 0) flags_ = flags & (write ? 0xC9u : 0x09u);
-    switch (kind % 4) {
-      case 0:
-        if (write) return values<char>(text, LXLongToString, LXDoubleToString, LXCurrencyToString);
-        if ((kind & 0x20) != 0) return times<char, false>(text, LXTimeToString, LXStringToTime);
-        return read<char, false>(text, LXStringToLong, LXStringToDouble);
-      case 1:
-        if (write) return states(text);
-        if ((kind & 0x20) != 0) return times<char, true>(text, LXTimeToStringEx, LXStringToTimeEx);
-        return read<char, true>(text, LXStringToLongEx, LXStringToDoubleEx);
-      case 2:
-        if (write) return values<LXWChar>(text, LXLongToStringW, LXDoubleToStringW, LXCurrencyToStringW);
-        if ((kind & 0x20) != 0) return times<LXWChar, false>(text, LXTimeToStringW, LXStringToTimeW);
-        return read<LXWChar, false>(text, LXStringToLongW, LXStringToDoubleW);
-      default:
-        if (write) return values<LXUChar>(text, LXLongToStringU, LXDoubleToStringU, LXCurrencyToStringU);
-        if ((kind & 0x20) != 0) return times<LXUChar, false>(text, LXTimeToStringU, LXStringToTimeU);
-        return read<LXUChar, false>(text, LXStringToLongU, LXStringToDoubleU);
-    }
+    const Form form = {static_cast<Form::Kind>(kind % 4), nullptr};
+    test::with_calls(form, [&](auto calls) {
+      if (write) return values(calls, text);
+      if ((kind & 0x20) != 0) return times(calls, text);
+      read(calls, text);
+    });
   }
 
  private:
@@ -95,27 +67,25 @@ class Library {
     uint32_t state = state_;
     const auto value = read(text.at(), text.length, &end, &state);
     const bool failed = LXGetError(l_) != LX_OK;
-    demand(end >= text.at() && end <= text.end() && state <= 1, "end outside");
+    demand(end >= text.at() && end <= text.at() + text.length && state <= 1, "end outside");
     demand(!std::isnan(value) && (!failed || (value == 0 && end == text.at())), "value");
     const auto units = static_cast<size_t>(end - text.at());
-    Text<U> used({reinterpret_cast<const char*>(text.at()), units * sizeof(U)});
+    Text<U> used(std::string_view(reinterpret_cast<const char*>(text.at()), units * sizeof(U)));
     const bool overflow = may_overflow && (value == INT32_MAX || value == INT32_MIN || value == -1);
     demand(overflow || read(used.at(), used.length, &end, &state) == value, "the used part has another value");
-    demand(overflow || failed || end == used.end(), "the used part is not used");
+    demand(overflow || failed || end == used.at() + used.length, "the used part is not used");
   }
 
-  // The Ex functions go on from a state.
-  template <class U, bool kStates, class Integer, class Decimal>
-  void read(std::string_view bytes, Integer integer, Decimal decimal) {
+  template <class Calls, class U = typename Calls::Unit>
+  void read(Calls call, std::string_view bytes) {
     const Text<U> text(bytes);
-    auto call = [&](auto function, const U* at, int32_t length, const U** end, uint32_t* state, auto... rest) {
-      if constexpr (kStates)
-        return double(function(l_, at, state_, length, end, state, rest...));
-      else
-        return double(function(l_, at, length, end, rest...));
+    auto with = [&](auto function, auto... options) {
+      return [=, this](const U* at, int32_t length, const U** end, uint32_t* state) {
+        return call(function, l_, at, State{state_}, length, end, StateAt{state}, options..., flags_);
+      };
     };
-    twice(text, true, [&](auto... about) { return call(integer, about..., base_, flags_); });
-    twice(text, false, [&](auto... about) { return call(decimal, about..., flags_); });
+    twice(text, true, with(kStringToLong, base_));
+    twice(text, false, with(kStringToDouble));
   }
 
   // A value or a whole record from the beginning of the bytes; zeros behind their end.
@@ -137,26 +107,21 @@ class Library {
     demand(count >= 0 || LXGetError(l_) == LX_E_ARGUMENT, "failure without a reason");
   }
 
-  template <class U, class Integer, class Decimal, class Currency>
-  void values(std::string_view bytes, Integer integer, Decimal decimal, Currency currency) {
+  template <class Calls, class U = typename Calls::Unit>
+  void values(Calls call, std::string_view bytes) {
     const auto room = take<uint8_t>(bytes);
     const auto number = take<int32_t>(bytes);
     const auto value = take<double>(bytes);
-    write_into<U>(room, [&](U* out, int32_t size) { return integer(l_, number, out, size, flags_); });
-    write_into<U>(room, [&](U* out, int32_t size) { return decimal(l_, value, out, size, flags_); });
-    write_into<U>(room, [&](U* out, int32_t size) { return currency(l_, value, out, size, flags_); });
-  }
-  void states(std::string_view bytes) {
-    auto with_state = [this](auto function) {
-      return [this, function](LXLocale* l, auto value, char* out, int32_t size, uint32_t flags) {
-        return function(l, value, out, state_, size, flags);
-      };
+    auto with = [&](auto function, auto written) {
+      return [=, this](U* out, int32_t size) { return call(function, l_, written, out, State{state_}, size, flags_); };
     };
-    values<char>(bytes, with_state(LXLongToStringEx), with_state(LXDoubleToStringEx), with_state(LXCurrencyToStringEx));
+    write_into<U>(room, with(kLongToString, number));
+    write_into<U>(room, with(kDoubleToString, value));
+    write_into<U>(room, with(kCurrencyToString, value));
   }
 
-  template <class U, bool kStates, class ToString, class ToTime>
-  void times(std::string_view bytes, ToString to_string, ToTime to_time) {
+  template <class Calls, class U = typename Calls::Unit>
+  void times(Calls call, std::string_view bytes) {
     const auto room = take<uint8_t>(bytes);
     const auto format_bytes = take<uint8_t>(bytes);
     LXTime time{};
@@ -167,18 +132,14 @@ class Library {
     const Text<U> format(bytes.substr(0, format_bytes));
     const Text<U> text(bytes.substr(std::min<size_t>(format_bytes, bytes.size())));
     write_into<U>(room, [&](U* out, int32_t size) {
-      if constexpr (kStates) return to_string(l_, &time, out, state_, size, format.at(), 0, format.length, flags_);
-      if constexpr (!kStates) return to_string(l_, &time, out, size, format.at(), format.length, flags_);
+      return call(kTimeToString, l_, &time, out, State{state_}, size, format.at(), State{0}, format.length, flags_);
     });
-    int32_t used = 0;
-    if constexpr (kStates)
-      used = to_time(l_, &time, text.at(), state_, text.length, format.at(), 0, format.length, flags_);
-    if constexpr (!kStates) used = to_time(l_, &time, text.at(), text.length, format.at(), format.length, flags_);
+    const int32_t used = call(kStringToTime, l_, &time, text.at(), State{state_}, text.length, format.at(), State{0},
+                              format.length, flags_);
     demand(used >= -1 && used <= text.length, "more than the text");
     demand(used >= 0 || LXGetError(l_) != LX_OK, "failure without a reason");
   }
 
-  std::vector<LXLocale*> locales_;
   LXLocale* l_ = nullptr;
   uint32_t state_ = 0;
   int32_t base_ = 0;
@@ -186,10 +147,7 @@ class Library {
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static lx::fuzz::Library library;
-  library.run({data, size});
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<Formats>(); }
+
+}  // namespace lx::fuzz

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 // The first byte of the input chooses what kind of object the rest is; what loads is used. Sections of the object are
 // whatever the file says.
-#include <lexaro/lexaro.h>
-
 #include <iterator>
 
 #include "fuzz_support.hpp"
@@ -26,9 +24,9 @@ const Kind kKinds[] = {
     {LX_SORT, kId, "English_UnitedStates.US-ASCII@Subject"},
 };
 
-class Library {
+class Objects : public Target {
  public:
-  Library() {
+  Objects() {
     test::write_small_directory(directory_);
     directory_.write_control({{LX_LANGUAGE, 1, "English"},
                               {LX_LANGUAGE, kId, "Subject"},
@@ -40,19 +38,12 @@ class Library {
                               {LX_CODEPAGE, LX_CP_UTF8, "Utf8"},
                               {LX_CODEPAGE, kId, "Subject"},
                               {LX_SORT, kId, "Subject"}});
-    LXInit(directory_.path(), nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
-    other_ = LXGetLocale("English_UnitedStates.Small@BINARY", 0, nullptr);
-    demand(other_ != nullptr, "the test's own data");
+    start(directory_.path(), "", {"English_UnitedStates.Small@BINARY"});
   }
-  ~Library() {
-    LXReleaseLocale(other_, 0);
-    LXTerm();
-  }
-  Library(const Library&) = delete;
-  Library& operator=(const Library&) = delete;
 
-  void run(const Kind& kind, const uint8_t* data, size_t size) {
-    InputFile(directory_, directory_.object_name(kind.type, kind.id)).write(data, size);
+  void run(InputBytes input) override {
+    const Kind& kind = kKinds[input.byte() % std::size(kKinds)];
+    InputFile(directory_, directory_.object_name(kind.type, kind.id)).write(input.rest());
     uint32_t rc = 99;
     LXObjEntry* entry = LXGetObjFromID(LXGetObjManager(), kind.type, kind.id, 1, &rc);
     if (LXLoadObj(LXGetObjManager(), entry, &rc) == nullptr) {
@@ -71,21 +62,16 @@ class Library {
     if (kind.type == LX_LANGUAGE) demand(test::exercise_language(entry));
     if (kind.type == LX_CODEPAGE) {
       demand(test::exercise_page(entry));
-      demand(test::exercise_conversions(locale, other_));
+      demand(test::exercise_conversions(locale, locales_[0]));
     }
     LXReleaseLocale(locale, 0);
   }
 
   test::DataDirectory directory_;
-  LXLocale* other_;
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static lx::fuzz::Library library;
-  if (size == 0) return 0;
-  library.run(lx::fuzz::kKinds[*data % std::size(lx::fuzz::kKinds)], data + 1, size - 1);
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<Objects>(); }
+
+}  // namespace lx::fuzz

@@ -1,10 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 // A code page and a direction, and then calls on a stream with what its routine moves and answers, byte after byte.
-#include <lexaro/lexaro.h>
-
 #include <algorithm>
-#include <memory>
-#include <vector>
 
 #include "fuzz_support.hpp"
 
@@ -25,16 +21,12 @@ int32_t transfer(void* context, void* buffer, int32_t count) {
   return answer > 90 ? count + 1 : std::min<int32_t>(answer, count);
 }
 
-class Library {
+class Streams : public Target {
  public:
-  Library() {
-    LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
-    for (const char* page : {"UTF-8", "MS932", "IBM930", "IBM1388", "EUC-TW", "Latin1"}) {
-      locales_.push_back(LXGetLocale((std::string("English_UnitedStates.") + page + "@BINARY").c_str(), 0, nullptr));
-      demand(locales_.back() != nullptr, page);
-    }
+  Streams() {
+    start(LEXARO_DATA, "English_UnitedStates.", {"UTF-8", "MS932", "IBM930", "IBM1388", "EUC-TW", "Latin1"}, "@BINARY");
   }
-  void run(InputBytes input) {
+  void run(InputBytes input) override {
     l_ = locales_[input.byte() % locales_.size()];
     const bool writes = input.byte() % 2 != 0;
     stream_ = LXOpenStream(l_, transfer, &input, writes ? LX_STREAM_WRITE : LX_STREAM_READ);
@@ -84,16 +76,12 @@ class Library {
     demand(result != -2 || LXGetError(l_) != LX_OK, "a failure without a status");
   }
 
-  std::vector<LXLocale*> locales_;
   LXLocale* l_ = nullptr;
   LXStream* stream_ = nullptr;
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static auto* library = new lx::fuzz::Library;  // as long as the process lives
-  library->run({data, size});
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<Streams>(); }
+
+}  // namespace lx::fuzz

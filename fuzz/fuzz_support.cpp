@@ -24,9 +24,30 @@ InputFile::InputFile(const test::DataDirectory& directory, std::string_view name
 
 InputFile::~InputFile() { close(descriptor_); }
 
-void InputFile::write(const uint8_t* data, size_t size) const {
-  bool written = ftruncate(descriptor_, 0) == 0 && pwrite(descriptor_, data, size, 0) == static_cast<ssize_t>(size);
+void InputFile::write(std::string_view bytes) const {
+  const bool written = ftruncate(descriptor_, 0) == 0 &&
+                       pwrite(descriptor_, bytes.data(), bytes.size(), 0) == static_cast<ssize_t>(bytes.size());
   demand(written, "the input file cannot be written");
 }
 
+void Target::start(const char* directory, const std::string& before, const std::vector<std::string>& names,
+                   const std::string& after) {
+  LXInit(directory, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
+  for (const std::string& name : names) {
+    locales_.push_back(LXGetLocale((before + name + after).c_str(), 0, nullptr));
+    demand(locales_.back() != nullptr, name.c_str());
+  }
+}
+
+Target::~Target() {
+  for (LXLocale* locale : locales_) LXReleaseLocale(locale, 0);
+  LXTerm();
+}
+
 }  // namespace lx::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  static const std::unique_ptr<lx::fuzz::Target> target = lx::fuzz::make_target();
+  target->run({data, size});
+  return 0;
+}

@@ -1,11 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
-// What the fuzz targets share: a data directory one of whose files is the input.
+// What the fuzz targets share: the library and its locales, a file that is the input, texts that end where their
+// memory does.
 #pragma once
 
-#include <cstddef>
-#include <cstdint>
+#include <lexaro/lexaro.h>
+
+#include <cstring>
+#include <memory>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "support/object_builder.hpp"
 
@@ -22,7 +26,7 @@ class InputFile {
   ~InputFile();
   InputFile(const InputFile&) = delete;
   InputFile& operator=(const InputFile&) = delete;
-  void write(const uint8_t* data, size_t size) const;
+  void write(std::string_view bytes) const;
 
  private:
   int descriptor_;
@@ -38,12 +42,45 @@ class InputBytes {
     return *data_++;
   }
   std::string_view rest() const { return {reinterpret_cast<const char*>(data_), size_}; }
-  const uint8_t* data() const { return data_; }
   size_t size() const { return size_; }
 
  private:
   const uint8_t* data_;
   size_t size_;
+};
+
+// What one program tries its inputs on, with the library as long as it lives.
+class Target {
+ public:
+  virtual ~Target();
+  Target(const Target&) = delete;
+  Target& operator=(const Target&) = delete;
+  virtual void run(InputBytes input) = 0;
+
+ protected:
+  Target() = default;
+  // Starts the library, and makes locales of names between those two.
+  void start(const char* directory, const std::string& before = "", const std::vector<std::string>& names = {},
+             const std::string& after = "");
+
+  std::vector<LXLocale*> locales_;
+};
+std::unique_ptr<Target> make_target();
+
+// A text in a block of its own size.
+template <class U>
+struct Text {
+  explicit Text(std::string_view bytes, bool terminated = false)
+      : units(bytes.size() / sizeof(U)), length(static_cast<int32_t>(units)), block(new U[units + terminated]) {
+    if (units != 0) std::memcpy(block.get(), bytes.data(), units * sizeof(U));
+    if (terminated) block[units] = 0;
+  }
+  U* at() const { return block.get(); }
+
+  size_t units;    // without terminator
+  int32_t length;  // as calls are told it
+  uint32_t shift_state = 0;
+  std::unique_ptr<U[]> block;
 };
 
 }  // namespace lx::fuzz

@@ -1,12 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // A code page, a kind of text, a function on characters or strings, its options and lengths from the first bytes of the
 // input; the rest are its texts. Each text ends where its block of memory ends; results must stay inside.
-#include <lexaro/lexaro.h>
-
 #include <algorithm>
-#include <cstring>
-#include <memory>
-#include <vector>
 
 #include "fuzz_support.hpp"
 #include "support/text_calls.hpp"
@@ -18,8 +13,8 @@ using test::Form;
 using test::State;
 using test::StateAt;
 
-const char* const kPages[] = {"US-ASCII", "Latin1", "UTF-8",  "MS932",   "MS936",   "JapanEUC",
-                              "EUC-TW",   "IBM037", "IBM930", "IBM1364", "IBM1388", "EUC-KR"};
+const std::vector<std::string> kPages = {"US-ASCII", "Latin1", "UTF-8",  "MS932",   "MS936",   "JapanEUC",
+                                         "EUC-TW",   "IBM037", "IBM930", "IBM1364", "IBM1388", "EUC-KR"};
 constexpr size_t kLongestText = 400;
 const uint32_t kOptions[] = {0,
                              LX_OPT_CHARS,
@@ -47,43 +42,13 @@ const uint32_t kOptions[] = {0,
                              1,
                              0xFFFFFFFF};
 
-// A text in a block of its own size.
-template <class U>
-struct Text {
-  std::unique_ptr<U[]> block;
-  size_t units;  // without terminator
-  int32_t length;
-  uint32_t shift_state = 0;
-
-  Text(std::string_view bytes, bool terminated) : units(bytes.size() / sizeof(U)) {
-    block.reset(new U[units + terminated]);
-    if (units != 0) std::memcpy(block.get(), bytes.data(), units * sizeof(U));
-    if (terminated) block[units] = 0;
-  }
-  U* at() const { return block.get(); }
-  State state() const { return {shift_state}; }
-  size_t allocated() const { return units + (length < 0); }
-};
-
-class Library {
+class Texts : public Target {
  public:
-  Library() {
-    LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS);
-    const char* language = "German_Germany.";  // which has special pairs of upper and lower case
-    for (const char* page : kPages) {
-      uint32_t rc = 99;
-      locales_.push_back(LXGetLocale((language + std::string(page) + "@BINARY").c_str(), 0, &rc));
-      demand(rc == LX_OK, page);
-    }
+  Texts() {
+    start(LEXARO_DATA, "German_Germany.", kPages, "@BINARY");  // German has special pairs of upper and lower case
   }
-  ~Library() {
-    for (LXLocale* locale : locales_) LXReleaseLocale(locale, 0);
-    LXTerm();
-  }
-  Library(const Library&) = delete;
-  Library& operator=(const Library&) = delete;
 
-  void run(InputBytes input) {
+  void run(InputBytes input) override {
     l_ = locales_[input.byte() % locales_.size()];
     uint8_t kind = input.byte() % 5;
     function_ = input.byte() % 12;
@@ -95,18 +60,9 @@ class Library {
     std::string_view all = input.rest().substr(0, kLongestText);
     std::string_view text = all.substr(0, all.size() - std::min<size_t>(all.size(), second % 64u));
     std::string_view other = all.substr(text.size());
-    switch (kind) {
-      case 0:
-        return strings<test::Calls<Form::plain>>(text, other, first, second);
-      case 1:
-        return strings<test::Calls<Form::shifted>>(text, other, first, second);
-      case 2:
-        return strings<test::Calls<Form::wide>>(text, other, first, second);
-      case 3:
-        return strings<test::Calls<Form::ucs2>>(text, other, first, second);
-      default:
-        return characters(text, first);
-    }
+    if (kind == 4) return characters(text, first);
+    const Form form = {static_cast<Form::Kind>(kind), nullptr};
+    test::with_calls(form, [&](auto calls) { strings<decltype(calls)>(text, other, first, second); });
   }
 
  private:
@@ -131,23 +87,28 @@ class Library {
     Text<U> text = given<Calls>(text_bytes, first);
     Text<U> other = given<Calls>(other_bytes, second);
     U* s = text.at();
-    auto limit = static_cast<int64_t>(text.allocated());
+    const size_t allocated = text.units + (text.length < 0);
+    auto limit = static_cast<int64_t>(allocated);
     auto size = static_cast<int32_t>(size_);
+    const State state = {text.shift_state};
     auto inside = [&](const U* at) { demand(at == nullptr || (at >= s && at <= s + limit), "position outside"); };
+    auto with_other = [&](auto function, auto... more) {
+      return Calls()(function, l_, s, state, text.length, other.at(), State{other.shift_state}, other.length, more...,
+                     options_);
+    };
     switch (function_) {
       case 0: {
         // Any number of shift bytes may stand between characters.
-        size_t room = (options_ & LX_OPT_CHARS) != 0 ? text.allocated() : size_;
+        size_t room = (options_ & LX_OPT_CHARS) != 0 ? allocated : size_;
         std::unique_ptr<U[]> out(new U[room]);
-        demand(Calls()(test::kStrcpy, l_, out.get(), size, s, text.state(), text.length, options_) <= size,
-               "result of cpy");
+        demand(Calls()(test::kStrcpy, l_, out.get(), size, s, state, text.length, options_) <= size, "result of cpy");
         return;
       }
       case 1: {
         Text<U> target(other_bytes, true);
         std::vector<U> joined(target.at(), target.at() + target.units + 1);
         joined.resize(target.units + text.units + 1);
-        int32_t result = Calls()(test::kStrcat, l_, joined.data(), s, text.state(), text.length, options_);
+        int32_t result = Calls()(test::kStrcat, l_, joined.data(), s, state, text.length, options_);
         demand(result <= static_cast<int64_t>(joined.size()), "result of cat");
         return;
       }
@@ -158,48 +119,40 @@ class Library {
           if constexpr (sizeof(U) == 1) return static_cast<const char*>(at);
           if constexpr (sizeof(U) != 1) return *at;
         };
-        inside(Calls()(test::kStrchr, l_, s, text.state(), text.length, character(), other.state(), StateAt{nullptr},
-                       options_));
+        inside(Calls()(test::kStrchr, l_, s, state, text.length, character(), State{other.shift_state},
+                       StateAt{nullptr}, options_));
         return;
       }
       case 3:
-        return inside(Calls()(test::kStrstr, l_, s, text.state(), text.length, other.at(), other.state(), other.length,
-                              StateAt{nullptr}, options_));
+        return inside(with_other(test::kStrstr, StateAt{nullptr}));
       case 4:
-        demand(Calls()(test::kStrspn, l_, s, text.state(), text.length, other.at(), other.state(), other.length,
-                       options_) <= limit,
-               "result of spn");
-        return;
+        return demand(with_other(test::kStrspn) <= limit, "result of spn");
       case 5:
-        demand(Calls()(test::kStrcspn, l_, s, text.state(), text.length, other.at(), other.state(), other.length,
-                       options_) <= limit,
-               "result of cspn");
-        return;
+        return demand(with_other(test::kStrcspn) <= limit, "result of cspn");
       case 6:
         return tokens<Calls>(text, other);
       case 7: {
         uint32_t type = 0;
         int32_t length = -1;
-        inside(Calls()(test::kGetEol, l_, s, text.state(), text.length, &type, &length, options_));
+        inside(Calls()(test::kGetEol, l_, s, state, text.length, &type, &length, options_));
         demand(length >= 0 && length <= 2, "length of a line end");
         return;
       }
       case 8: {
         U line[8];
-        U* end = Calls()(test::kPutEol, l_, line, text.state(), options_);
+        U* end = Calls()(test::kPutEol, l_, line, state, options_);
         demand(end == nullptr || end - line <= 6, "line end");
         return;
       }
       case 9:
-        Calls()(test::kStrcmp, l_, s, text.state(), text.length, other.at(), other.state(), other.length, options_);
-        demand(Calls()(test::kStrcmp, l_, s, text.state(), text.length, s, text.state(), text.length,
-                       options_ & ~LX_CMP_TRIM) == 0,
+        with_other(test::kStrcmp);
+        demand(Calls()(test::kStrcmp, l_, s, state, text.length, s, state, text.length, options_ & ~LX_CMP_TRIM) == 0,
                "a text differs from itself");
         return;
       default: {
-        size_t room = (options_ & LX_OPT_CHARS) != 0 ? std::max<size_t>(size_ * 6, text.allocated()) : size_;
+        size_t room = (options_ & LX_OPT_CHARS) != 0 ? std::max(size_ * 6, allocated) : size_;
         std::unique_ptr<U[]> out(new U[room]);
-        demand(Calls()(test::kMapString, l_, out.get(), size, s, text.state(), text.length, options_) <= size,
+        demand(Calls()(test::kMapString, l_, out.get(), size, s, state, text.length, options_) <= size,
                "result of map");
       }
     }
@@ -209,12 +162,12 @@ class Library {
   void tokens(Text<U>& text, const Text<U>& delimiters) {
     int32_t length = text.length;
     U* at = text.at();
-    const U* end = at + text.allocated();
+    const U* end = at + text.units + (text.length < 0);
     for (size_t rounds = 0; at != nullptr; ++rounds) {
       demand(rounds <= text.units, "no end of the tokens");
       U* next = at;
       U* token = Calls()(test::kStrtok, l_, at, StateAt{&text.shift_state}, &length, delimiters.at(),
-                         delimiters.state(), delimiters.length, &next, options_);
+                         State{delimiters.shift_state}, delimiters.length, &next, options_);
       if (LXGetError(l_) != LX_OK) return;
       demand(token == nullptr || (token >= at && token <= end), "token outside");
       demand(next == nullptr || (token != nullptr && next > token && next < end), "rest outside");
@@ -269,7 +222,6 @@ class Library {
     LXGetCharTypeW(l_, static_cast<LXWChar>(unit) << (choice % 3 * 8), LX_CTYPE_1);
   }
 
-  std::vector<LXLocale*> locales_;
   LXLocale* l_ = nullptr;
   unsigned function_ = 0;
   uint32_t options_ = 0;
@@ -277,10 +229,7 @@ class Library {
 };
 
 }  // namespace
-}  // namespace lx::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static lx::fuzz::Library library;
-  library.run({data, size});
-  return 0;
-}
+std::unique_ptr<Target> make_target() { return std::make_unique<Texts>(); }
+
+}  // namespace lx::fuzz

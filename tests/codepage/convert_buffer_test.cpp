@@ -23,21 +23,15 @@ constexpr const char16_t* kSentences[] = {
 
 class ConvertBuffer : public testing::Test {
  protected:
-  static void SetUpTestSuite() {
-    session = std::make_unique<Session>();
-    for (uint16_t id : kPages) locales[id] = locale_of(PageSource::of(id).name);
+  ConvertBuffer() {
+    for (uint16_t id : kPages) locales_[id] = locale_of(PageSource::of(id).name);
   }
-  static void TearDownTestSuite() {
-    locales.clear();
-    session.reset();
-  }
-  static LXLocale* locale(uint16_t id) { return locales.at(id).get(); }
+  LXLocale* locale(uint16_t id) const { return locales_.at(id).get(); }
 
-  static std::unique_ptr<Session> session;
-  static std::map<uint16_t, Locale> locales;
+ private:
+  Session session_;
+  std::map<uint16_t, Locale> locales_;
 };
-std::unique_ptr<Session> ConvertBuffer::session;
-std::map<uint16_t, Locale> ConvertBuffer::locales;
 
 // How much of the text and of room a call is given.
 struct Step {
@@ -125,7 +119,7 @@ std::string sentences(const PageSource& page) {
 }
 
 TEST_F(ConvertBuffer, EveryCutOfRealText) {
-  for_each_pair([](uint16_t target, uint16_t source) {
+  for_each_pair([&](uint16_t target, uint16_t source) {
     std::string text = sentences(PageSource::of(source));
     auto converted = [&](const std::vector<Step>& steps) {
       Trial trial(target, source, locale(target), locale(source));
@@ -147,24 +141,6 @@ TEST_F(ConvertBuffer, EveryCutOfRealText) {
   });
 }
 
-TEST_F(ConvertBuffer, RandomCutsOfRealText) {
-  std::mt19937 random(1);
-  for_each_pair([&](uint16_t target, uint16_t source) {
-    std::string text = sentences(PageSource::of(source));
-    std::string whole;
-    for (int round = 0; round < 20; ++round) {
-      std::vector<Step> steps = {{kAll, kAll}};
-      if (round != 0) steps.clear();
-      while (round != 0 && steps.size() < 300) steps.push_back({random() % 8, random() % 7});
-      if (round != 0) steps.push_back({kAll, kAll});
-      Trial trial(target, source, locale(target), locale(source));
-      if (!trial.all(text, steps)) return;
-      if (round == 0) whole = trial.output();
-      ASSERT_EQ(trial.output(), whole);
-    }
-  });
-}
-
 // Bytes that make trouble: lead bytes, shift bytes, continuation bytes, ASCII, zeros.
 std::string random_bytes(std::mt19937& random, size_t length) {
   static constexpr unsigned char kLikely[] = {0x0E, 0x0F, 0x0E, 0x0F, 0x41, 0x42, 0x81, 0x8E, 0x8F, 0xA2, 0xE3, 0x00};
@@ -176,11 +152,11 @@ std::string random_bytes(std::mt19937& random, size_t length) {
   return text;
 }
 
-TEST_F(ConvertBuffer, RandomCutsOfRandomText) {
+TEST_F(ConvertBuffer, RandomCuts) {
   std::mt19937 random(2);
   for_each_pair([&](uint16_t target, uint16_t source) {
     for (int round = 0; round < 40; ++round) {
-      std::string text = random_bytes(random, 60);
+      std::string text = round % 2 == 0 ? random_bytes(random, 60) : sentences(PageSource::of(source));
       std::vector<Step> steps;
       if (round % 4 != 0) {
         for (int i = 0; i < 80; ++i) steps.push_back({random() % 9, random() % 7});
@@ -250,32 +226,20 @@ TEST_F(ConvertBuffer, Statuses) {
   LXLocale* japanese = locale(932);
   LXLocale* mixed = locale(930);
   LXLocale* latin = locale(819);
-  expect_calls("nothing given", latin, latin, {{"", 0, 0, ""}, {"", 5, 0, ""}});
-  expect_calls("all consumed, room just enough", latin, latin, {{"abc", 3, 0, "abc"}, {"", 0, 0, ""}});
+  expect_calls("nothing given, all consumed, room just enough", latin, latin, {{"", 0, 0, ""}, {"abc", 3, 0, "abc"}});
   expect_calls("no room: one character is taken in", latin, latin,
                {{"abc", 0, 52, "", 2}, {"bc", 0, 52, "", 2}, {"bc", 9, 0, "abc"}});
-  expect_calls("half a character is held", utf8, japanese, {{"\x83", 9, 53, ""}, {"\x41z", 9, 0, "\xE3\x82\xA2z"}});
-  expect_calls("a third of one", japanese, utf8,
+  expect_calls("a third of a character is held", japanese, utf8,
                {{"\xE3", 9, 53, ""}, {"", 9, 53, ""}, {"\x82", 9, 53, ""}, {"\xA2", 9, 0, "\x83\x41"}});
-  expect_calls("a character is split over three calls", utf8, japanese,
-               {{"\x83\x41", 1, 52, "\xE3"}, {"", 1, 52, "\x82"}, {"", 0, 52, ""}, {"", 1, 0, "\xA2"}});
   expect_calls(
       "the rest is delivered before new text is looked at", utf8, japanese,
       {{"\x83\x41", 2, 52, "\xE3\x82"}, {"xyz", 0, 52, "", 3}, {"xyz", 1, 52, "\xA2", 2}, {"yz", 9, 0, "xyz"}});
-  expect_calls("a shift byte waits with its character", mixed, utf8,
-               {{"\xE3\x80\x80", 0, 52, ""}, {"", 0, 52, ""}, {"", 2, 52, "\x0E\x40"}, {"", 2, 0, "\x40"}});
-  expect_calls("a shift byte goes out without its character", mixed, utf8,
-               {{"\xE3\x80\x80", 1, 52, "\x0E"}, {"a", 2, 52, "\x40\x40"}, {"", 9, 0, "\x0F\x62"}});
-  expect_calls("the run stays open at the end", mixed, utf8, {{"\xE3\x80\x80", 9, 0, "\x0E\x40\x40"}});
+  expect_calls("a shift byte goes out without its character, and the run stays open", mixed, utf8,
+               {{"\xE3\x80\x80", 1, 52, "\x0E"}, {"", 2, 0, "\x40\x40"}, {"a", 9, 0, "\x0F\x62"}});
   expect_calls("shift bytes alone are consumed", utf8, mixed,
                {{"\x0E", 0, 0, ""}, {"\x40\x40\x0F", 9, 0, "\xE3\x80\x80"}});
-  expect_calls("the state outlives the call", utf8, mixed,
-               {{"\x0E\x40", 9, 53, ""}, {"\x40", 9, 0, "\xE3\x80\x80"}, {"\x0F\xC1", 9, 0, "A"}});
-  expect_calls("a second shift byte is text", utf8, mixed, {{"\x0E\x0E\x41", 9, 0, "\xEF\xBF\xBD"}});
-  expect_calls("... also in the next call", utf8, mixed, {{"\x0E", 9, 0, ""}, {"\x0E\x41", 9, 0, "\xEF\xBF\xBD"}});
-  expect_calls("a single byte that is no character", utf8, latin, {{"\x80", 9, 0, "\xC2\x80"}});
-  expect_calls("bytes that begin nothing pass one by one", utf8, utf8,
-               {{"\x80\xFF", 9, 0, "\xEF\xBF\xBD\xEF\xBF\xBD"}});
+  expect_calls("a second shift byte is text, also in the next call", utf8, mixed,
+               {{"\x0E\x0E\x41\x0F", 9, 0, "\xEF\xBF\xBD"}, {"\x0F\x0E", 9, 0, "\x0F"}});
 }
 
 TEST_F(ConvertBuffer, Arguments) {
@@ -298,7 +262,7 @@ TEST_F(ConvertBuffer, Arguments) {
 // --------------------------------------------------------------------------------------------------------------
 
 TEST_F(ConvertBuffer, Ratio) {
-  for_each_pair([](uint16_t target, uint16_t source) {
+  for_each_pair([&](uint16_t target, uint16_t source) {
     const PageSource& page = PageSource::of(target);
     int32_t expected = target == source ? 1 : page.max_length + (page.mixed() ? 1 : 0);
     EXPECT_EQ(LXStringToUnicode(locale(target), nullptr, 0, nullptr, 0, 1), -1);

@@ -2,19 +2,19 @@
 #include "compiler_run.hpp"
 
 #include <deque>
-#include <sstream>
+#include <regex>
 #include <vector>
 
 namespace {
 
-TEST_F(CompilerTest, OutputIsReproducible) {
+TEST_F(CompilerTest, OutputIsReproducibleAndClean) {
   compile(data_, work("one"));
   compile(data_, work("two"));
   compile(data_, work("two"));  // again, over what is there
   auto files = files_in(work("one"));
   EXPECT_EQ(files, files_in(work("two")));
-  EXPECT_EQ(files.count("control.nls"), 1u);
   EXPECT_EQ(files["alias.txt"], content(data_ / "alias.txt"));
+  for (const fs::path& tree : {data_, work("one")}) EXPECT_EQ(lexaroc("check " + quoted(tree)).output, "");
 }
 
 TEST_F(CompilerTest, DumpGivesTheSourcesBack) {
@@ -32,7 +32,7 @@ TEST_F(CompilerTest, DumpGivesTheSourcesBack) {
   EXPECT_TRUE(files_in(work("compiled")) == files_in(work("again")));
 }
 
-TEST_F(CompilerTest, OlderLayoutGoesRound) {
+TEST_F(CompilerTest, OlderLayoutGoesRoundOrIsRefused) {
   const std::string options = "--layout=1 --only 37,367,819,970";
   compile(data_, work("compiled"), options);
   auto files = files_in(work("compiled"));
@@ -44,23 +44,12 @@ TEST_F(CompilerTest, OlderLayoutGoesRound) {
               without_comments(content(data_ / "codepage/cp_00970.txt")));
   compile(work("dumped"), work("again"), options);
   EXPECT_TRUE(files == files_in(work("again")));
-}
 
-TEST_F(CompilerTest, PagesThatTheOlderLayoutCannotHoldAreRefused) {
   for (const char* id : {"930", "932", "954", "57352"}) {
-    Outcome outcome =
-        lexaroc(std::string("data --layout=1 --only ") + id + " " + quoted(data_) + " " + quoted(work("x")));
-    EXPECT_EQ(outcome.exit_code, 1) << id;
-    EXPECT_NE(outcome.output.find("version-1 layout"), std::string::npos) << outcome.output;
+    Outcome refused = lexaroc(std::string("data --layout=1 --only ") + id + " " + quoted(data_) + " x");
+    EXPECT_EQ(refused.exit_code, 1) << id;
+    EXPECT_NE(refused.output.find("version-1 layout"), std::string::npos) << refused.output;
   }
-}
-
-TEST_F(CompilerTest, ShippedDataIsClean) {
-  Outcome sources = lexaroc("check " + quoted(data_));
-  EXPECT_EQ(sources.exit_code, 0) << sources.output;
-  compile(data_, work("compiled"));
-  Outcome compiled = lexaroc("check " + quoted(work("compiled")));
-  EXPECT_EQ(compiled.exit_code, 0) << compiled.output;
 }
 
 TEST_F(CompilerTest, BuiltInSourcesAreUpToDate) {
@@ -81,23 +70,17 @@ constexpr const char* kEuc = "codepage/cp_00954.txt";
 const BrokenSource kBroken[] = {
     // What every source has in common
     {kGerman, "pm = ", "pm = A\x01", 0, 7, "a control character, or bytes that are not UTF-8"},
-    {kGerman, "pm = ", "pm = \xC3\xA4\xC3", 0, 7, "a control character, or bytes that are not UTF-8"},
     {kGerman, "pm = ", "pm = \xED\xA0\x80", 0, 6, "a control character, or bytes that are not UTF-8"},
-    {kGerman, "pm = ", "pm = \xC0\xAF", 0, 6, "a control character, or bytes that are not UTF-8"},
+    {kGerman, "pm = ", "pm = \xE0\x80\xAF", 0, 6, "a control character, or bytes that are not UTF-8"},
     {kGerman, "id = ", "\xEF\xBB\xBFid = 2", 0, 1, "expected a key"},
     // Fields
     {kGerman, "pm = ", "pm = a\nam = b", 1, 1, "\"am\" is given twice"},
     {kGerman, "pm = ", "pn = x", 0, 1, "unknown key \"pn\""},
     {kGerman, "pm = ", "# pm", kEnd, 1, "\"pm\" is missing"},
-    {kGerman, "pm = ", "pm", 0, 3, "expected a blank"},
     {kGerman, "pm = ", "pm = ", 0, 6, "text that is empty or begins with a blank needs quotes"},
-    {kGerman, "pm = ", "pm = x ", 0, 7, "text that ends in a blank needs quotes"},
-    {kGerman, "pm = ", "pm = \"x", 0, 8, "expected \"\"\""},
-    {kGerman, "pm = ", "pm = \"x\"y", 0, 9, "expected the end of the line"},
     {kGerman, "pm = ", "pm = x\\n", 0, 7, "an unknown escape"},
     {kGerman, "pm = ", "pm = \\u00e4", 0, 10, "expected 4 hexadecimal digits in upper case"},
     {kGerman, "pm = ", "pm = \\uD800", 0, 8, "a surrogate is no character"},
-    {kGerman, "pm = ", "pm = x\\u0000", 0, 7, "a text cannot contain U+0000"},
     {kGerman, "pm = ", "pm = x\xC2\xA0y", 0, 7, "U+00A0 must be written as an escape"},
     {kGerman, "pm = ", "pm = \xF0\x9F\x98\x80", 0, 6, "only characters up to U+FFFF are possible"},
     {kGerman, "name = ", "name = A_B", 0, 8, "a name cannot contain"},
@@ -106,41 +89,23 @@ const BrokenSource kBroken[] = {
     {kGerman, "default-territory = ", "default-territory = -1", 0, 21, "expected a number"},
     {kGerman, "special.upper = ", "special.upper = 00DF = 0053 0053 0053", 0, 33, "expected the end of the line"},
     {kGermany, "decimal = ", "decimal = \",,\"", 0, 11, "a separator is one character"},
-    {kGermany, "positive = ", "positive = precedes 2 space 0 sign 1", 0, 21, "the number is larger than 1"},
-    {kGermany, "positive = ", "positive = precedes 1 sign 1", 0, 23, "expected \"space N\""},
-    {kGermany, "item58 = ", "item58 = 2", 0, 10, "the number is larger than 1"},
     // Code pages
     {kAscii, "id ", "id 368", kElsewhere, 0, "the id is not that of the file name"},
-    {kAscii, "family ", "family greek", 0, 8, "the family is ascii or ebcdic"},
-    {kAscii, "kind ", "kind wide", 0, 6, "the kind is single, multibyte, mixed or utf8"},
-    {kAscii, "kind ", "# no kind", kEnd, 1, "\"kind\" is missing"},
     {kAscii, "kind ", "kind mixed", kEnd, 1, "a mixed page needs \"shift\""},
-    {kAscii, "kind ", "kind multibyte", kEnd, 1, "a page of this kind needs characters of several bytes"},
     {kAscii, "substitution ", "substitution 9A", kElsewhere, 0, "the substitution byte is no character"},
-    {kAscii, "line-ends ", "line-ends 0A 0D", 0, 16, "expected a blank"},
     {kAscii, "50 ", "40 A", 0, 4, "the bytes 40 are given twice"},
     {kAscii, "50 ", "50 \\{0050-005F}x", 1, 4, "the bytes 60 are given twice"},
-    {kAscii, "70 ", "FF ab", 0, 5, "the row runs past the byte FF"},
     {kAscii, "70 ", "FF \\-{2}", 0, 4, "the row runs past the byte FF"},
     {kAscii, "70 ", "70 \\uFFFD", 0, 4, "U+FFFD stands for bytes that are no character"},
-    {kAscii, "70 ", "70 a b", 0, 5, "U+0020 must be written as an escape"},
-    {kAscii, "70 ", "70 \xCC\x81", 0, 4, "U+0301 must be written as an escape"},
-    {kAscii, "70 ", "70 \\x41", 0, 4, "an unknown escape"},
-    {kAscii, "70 ", "70 \\{0041-0040}", 0, 4, "the range is empty or too wide"},
     {kAscii, "70 ", "70 \\{D7FF-E000}", 0, 4, "the range is empty or too wide"},
-    {kAscii, "70 ", "7 a", 0, 2, "expected 2 hexadecimal digits in upper case"},
     {kAscii, "70 ", "7A7A a", 0, 1, "too many bytes for a page of this kind"},
-    {kAscii, "70 ", "70", 0, 3, "expected a blank"},
     {kAscii, "70 ", "70 p\nkind single", 1, 1, "\"kind\" must stand before the characters"},
     {kAscii, "70 ", "70 p\nfrom U+00A0 71", 1, 13, "these bytes are no character of the page"},
     {kAscii, "70 ", "70 p\nfrom U+0070 41", 1, 6, "the character has bytes already"},
     {kAscii, "70 ", "70 p\nfrom U+00A0 1A", 1, 13, "characters without bytes become the substitution anyway"},
-    {kAscii, "70 ", "70 p\nprefer U+0070 41", 1, 15, "the bytes stand for another character"},
     {kAscii, "70 ", "70 p\nprefer U+0070 70", 1, 15, "these bytes are taken anyway"},
     {kAscii, "70 ", "70 p\nfrom U+00A0 41\n71 q", 2, 1, "characters must stand before"},
     {kMixed, "shift ", "shift 0E 0E", 0, 9, "the shift bytes must differ"},
-    {kMixed, "00 ", "0E \\u000E", 0, 4, "a shift byte is no character"},
-    {kMixed, "4040 ", "404040 \\u3000", 0, 1, "too many bytes for a page of this kind"},
     {kMixed, "4040 ", "4000 a", 0, 6, "a later byte of a character cannot be 00"},
     {kMixed, "4040 ", "0041 a", 0, 1, "the first byte of several cannot be 00"},
     {kEuc, "70 ", "A1 a", kElsewhere, 0, "the byte A1 begins characters of different length"},
@@ -148,10 +113,8 @@ const BrokenSource kBroken[] = {
     // Aliases and Unicode tables
     {"alias.txt", "US-ASCII", " early", 0, 1, "aliases without a code page"},
     {"alias.txt", "    us", "    us US", 0, 8, "\"US\" is given twice"},
-    {"alias.txt", "    us", "    \xC3\xA4", 0, 5, "expected an alias"},
     {"unicode/case.txt", "0102 0103", "0100 0101", 0, 1, "out of order, or outside its table"},
     {"unicode/case.txt", "table lower 2", "table lower 3 0380 03EE", 0, 7, "expected \"lower 2 0200 0275\""},
-    {"unicode/ctype.txt", "0009 ;", "0009 ; spice ; S ;", 0, 8, "unknown property \"spice\""},
     {"unicode/ctype.txt", "0009 ;", "0009 ; space ; S L ;", 0, 16, "expected one direction"},
     {"unicode/digits.txt", "0031 0031", "0032 0032", 1, 1, "out of order"},
 };
@@ -164,6 +127,10 @@ TEST_F(CompilerTest, BrokenSourcesAreNamedByPlace) {
   }
   EXPECT_FALSE(fs::exists(work("out")));
   compile(tree, work("out"));
+  const auto before = files_in(work("out"));
+  write(tree / kAscii, "nonsense\n");
+  EXPECT_EQ(lexaroc("data " + quoted(tree) + " " + quoted(work("out"))).exit_code, 1);
+  EXPECT_TRUE(files_in(work("out")) == before);
 }
 
 // Sources that compile but that users should not get.
@@ -173,21 +140,12 @@ const BrokenSource kBad[] = {
     {kGermany, "decimal = ", "decimal = \"\"", 0, 11, "a decimal separator is needed"},
     {kGermany, "thousands = ", "thousands = \",\"", 0, 13, "the same character as the decimal separator"},
     {kGermany, "grouping = ", "grouping = 3", 0, 12, "expected group sizes that end in 0"},
-    {kGermany, "mon-grouping = ", "mon-grouping = 3;0;0", 0, 16, "expected group sizes that end in 0"},
     {kGermany, "time = ", "time = %H:%N", 0, 8, "an unknown directive"},
-    {kGermany, "time = ", "time = %H:%", 0, 8, "an unknown directive"},
     {kGermany, "time = ", "time = %#H:%Z", 0, 8, "an unknown directive"},
     {kGermany, "time = ", "time = \"\"", 0, 8, "a format is needed"},
-    {kGermany, "short-date = ", "short-date = %#x", 0, 14, "%c, %x and %X stand for these formats"},
-    {kGermany, "long-date = ", "long-date = %A %X", 0, 13, "%c, %x and %X stand for these formats"},
     {kGermany, "list = ", "list = \"\\u0009\"", 0, 8, "a separator cannot be a control character"},
-    {kGermany, "list = ", "list = \"7\"", 0, 8, "a separator cannot be a digit"},
-    {kGermany, "mon-thousands = ", "mon-thousands = \",\"", 0, 17, "the same character as the decimal separator"},
-    {kGermany, "mon-grouping = ", "mon-grouping = 3;;0", 0, 16, "expected group sizes that end in 0"},
     {kGermany, "abbreviation = ", "abbreviation = De", 0, 16, "expected three capitals"},
     {kGermany, "currency-intl = ", "currency-intl = \"EUR \"", 0, 17, "expected three capitals"},
-    {kGermany, "currency = ", "currency = \"\"", 0, 12, "a text is needed"},
-    {kGermany, "negative-sign = ", "negative-sign = \"\"", 0, 17, "a sign is needed"},
     {kGermany, "negative-sign = ", "negative-sign = \"minus\"", 0, 17, "the sign is longer than 3 characters"},
     {kAscii, "40 ", "40 \\u2020ABCDEFGHIJKLMNO", kElsewhere, 0,
      "on every page of this family, 40 is U+0040, both ways"},
@@ -221,7 +179,6 @@ TEST_F(CompilerTest, CheckSeesTheWholeTree) {
       {"language/la_00033.txt", "default-codepage = ", "default-codepage = 4711", 0, 20, "there is no such codepage"},
       {"language/la_00033.txt", "default-sort = ", "default-sort = 99", 0, 16, "there is no such sort"},
       {"territory/te_00643.txt", "name = ", "name = Rossija", kElsewhere, 0, "no object has the name \"Russia\""},
-      {"territory/te_00250.txt", "time = ", "time = %#H:%M:%S", 0, 8, "\"#\" cannot be used"},
       {"territory/te_00233.txt", "long-date = ", "long-date = %#d. %B", 0, 13, "\"#\" cannot be used"},
       {"territory/te_00233.txt", "currency = ", "currency = \xE2\x82\xAC", 0, 12, "U+20AC does not exist in "},
       {"territory/te_00752.txt", "negative-sign = ", "negative-sign = \"\\u00AD\\u00AD\"", 0, 17,
@@ -237,23 +194,9 @@ TEST_F(CompilerTest, CheckSeesTheWholeTree) {
   for (const Fault& fault : faults) fault.expect_in(outcome);
 }
 
-TEST_F(CompilerTest, FailedRunLeavesTheOldFiles) {
-  fs::path tree = small_tree();
-  compile(tree, work("out"));
-  auto before = files_in(work("out"));
-  write(tree / kAscii, "nonsense\n");
-  EXPECT_EQ(lexaroc("data " + quoted(tree) + " " + quoted(work("out"))).exit_code, 1);
-  EXPECT_TRUE(files_in(work("out")) == before);
-}
-
-// The lines of a source that do not name objects by id.
+// Objects have other numbers among the built-in ones.
 std::string texts_in(const fs::path& source) {
-  std::istringstream lines(without_comments(content(source)));
-  std::string texts;
-  for (std::string line; std::getline(lines, line);) {
-    if (line.rfind("id = ", 0) != 0 && line.rfind("default-", 0) != 0) texts += line + "\n";
-  }
-  return texts;
+  return std::regex_replace(without_comments(content(source)), std::regex("(^|\n)(id|default-[a-z]+) = .*"), "");
 }
 
 TEST_F(CompilerTest, BuiltInObjectsSayWhatTheShippedOnesSay) {
@@ -262,14 +205,17 @@ TEST_F(CompilerTest, BuiltInObjectsSayWhatTheShippedOnesSay) {
 }
 
 TEST_F(CompilerTest, ExitCodesTellUsageFromTheSystem) {
-  EXPECT_EQ(lexaroc("").exit_code, 2);
-  EXPECT_EQ(lexaroc("data " + quoted(data_)).exit_code, 2);
-  EXPECT_EQ(lexaroc("data --layout=3 " + quoted(data_) + " x").exit_code, 2);
-  EXPECT_EQ(lexaroc("frobnicate").exit_code, 2);
-  EXPECT_EQ(lexaroc("--help").exit_code, 0);
-  EXPECT_EQ(lexaroc("data " + quoted(work("nowhere")) + " " + quoted(work("out"))).exit_code, 3);
-  EXPECT_EQ(lexaroc("check " + quoted(work("nowhere.txt"))).exit_code, 3);
-  EXPECT_EQ(lexaroc("dump " + quoted(work("cp_00037.nls"))).exit_code, 3);
+  const std::pair<std::string, int> cases[] = {
+      {"", 2},
+      {"data " + quoted(data_), 2},
+      {"data --layout=3 " + quoted(data_) + " x", 2},
+      {"frobnicate", 2},
+      {"--help", 0},
+      {"data " + quoted(work("nowhere")) + " " + quoted(work("out")), 3},
+      {"check " + quoted(work("nowhere.txt")), 3},
+      {"dump " + quoted(work("cp_00037.nls")), 3},
+  };
+  for (const auto& [arguments, status] : cases) EXPECT_EQ(lexaroc(arguments).exit_code, status) << arguments;
 }
 
 // Whatever stands in a compiled file, check and dump end with a message or accept it.

@@ -15,13 +15,20 @@ uint32_t init(const char* directory, uint32_t options = 0) {
   return LXInit(directory, nullptr, nullptr, nullptr, options);
 }
 
-TEST(Library, CountsItsUsers) {
-  ASSERT_EQ(init(LEXARO_DATA), LX_OK);
+class Library : public testing::Test {
+ protected:
+  Library() { write_small_directory(directory_); }
+  Variable location_{"LX_LOCALEDIR", nullptr};
+  DataDirectory directory_;
+  CountingAllocator allocator_;
+};
+
+TEST_F(Library, CountsItsUsers) {
+  ASSERT_EQ(init(directory_.path()), LX_OK);
   ASSERT_EQ(init("/does/not/exist"), LX_OK) << "later calls only count";
   ASSERT_EQ(LXSetLocale("English", 0), LX_OK);
   EXPECT_EQ(LXTerm(), LX_OK);
   EXPECT_NE(LXGetObjManager(), nullptr);
-  EXPECT_NE(lxglocale, nullptr);
   EXPECT_EQ(LXGetError(nullptr), LX_OK);
   EXPECT_EQ(LXTerm(), LX_OK);
   EXPECT_EQ(LXGetObjManager(), nullptr);
@@ -30,150 +37,77 @@ TEST(Library, CountsItsUsers) {
   EXPECT_EQ(LXTerm(), LX_OK) << "nothing is left to end";
 }
 
-TEST(Library, KeepsTheCallbacksOfTheFirstCall) {
-  DataDirectory directory;
-  write_small_directory(directory);
-  CountingAllocator first;
+TEST_F(Library, KeepsTheCallbacksOfTheFirstCall) {
   CountingAllocator second;
-  ASSERT_EQ(first.init(directory.path()), LX_OK);
-  ASSERT_EQ(second.init(directory.path()), LX_OK);
-  Locale locale(LXGetLocale("German", 0, nullptr));
-  ASSERT_NE(locale, nullptr);
-  locale.reset();
+  ASSERT_EQ(allocator_.init(directory_.path()), LX_OK);
+  ASSERT_EQ(second.init(directory_.path()), LX_OK);
+  Locale(LXGetLocale("German", 0, nullptr)).reset();
   EXPECT_EQ(LXTerm(), LX_OK);
   EXPECT_EQ(LXTerm(), LX_OK);
-  EXPECT_GT(first.calls, 10);
+  EXPECT_GT(allocator_.calls, 10);
   EXPECT_EQ(second.calls, 0);
-  EXPECT_EQ(first.live, 0);
+  EXPECT_EQ(allocator_.live, 0);
 
   // What is freed after the end goes back to the allocator that made it; the next start brings its own.
   EXPECT_EQ(lxalloc_cbk, &CountingAllocator::allocate);
-  ASSERT_EQ(init(directory.path()), LX_OK);
+  ASSERT_EQ(LXInit(directory_.path(), CountingAllocator::allocate, nullptr, &second, 0), LX_OK);
+  EXPECT_EQ(lxfree_cbk, &LXDefFree) << "an absent one is the default";
+  EXPECT_EQ(LXTerm(), LX_OK);
+  ASSERT_EQ(init(directory_.path()), LX_OK);
   EXPECT_EQ(lxalloc_cbk, &LXDefAlloc);
-  EXPECT_EQ(lxfree_cbk, &LXDefFree);
   EXPECT_EQ(LXTerm(), LX_OK);
 }
 
-TEST(Library, AnAbsentCallbackIsTheDefaultOne) {
-  CountingAllocator allocator;
-  ASSERT_EQ(LXInit(LEXARO_DATA, CountingAllocator::allocate, nullptr, &allocator, 0), LX_OK);
-  EXPECT_EQ(lxfree_cbk, &LXDefFree);
-  EXPECT_EQ(LXTerm(), LX_OK);
-  EXPECT_GT(allocator.live, 0);
-}
-
-TEST(Library, StartsCleanlyAgainAndAgain) {
-  DataDirectory directory;
-  write_small_directory(directory);
-  CountingAllocator allocator;
-  long before = open_descriptors();
+TEST_F(Library, StartsCleanlyAgainAndAgain) {
+  const long before = open_descriptors();
   for (int cycle = 0; cycle < 100; ++cycle) {
-    ASSERT_EQ(allocator.init(cycle % 3 == 2 ? "/does/not/exist" : directory.path()),
-              cycle % 3 == 2 ? LX_E_DEFAULTS : LX_OK);
+    const bool missing = cycle % 3 == 2;
+    ASSERT_EQ(allocator_.init(missing ? "/does/not/exist" : directory_.path()), missing ? LX_E_DEFAULTS : LX_OK);
     ASSERT_EQ(LXSetLocale("English.us-ascii", 0), LX_OK);
     LXGlobals* area = lxglobals;
-    ASSERT_EQ(LXTerm(), LX_OK);
+    allocator_.free_fails = cycle % 5 == 4;  // the first error of the end is told, and the end comes
+    ASSERT_EQ(LXTerm(), allocator_.free_fails ? 1u : LX_OK);
+    allocator_.free_fails = false;
     ASSERT_EQ(lxglobals, area) << "the value stays, though the area is gone";
-    ASSERT_EQ(allocator.live, 0);
+    ASSERT_EQ(allocator_.live, 0);
   }
   EXPECT_EQ(open_descriptors(), before);
 }
 
-struct Start {
-  const char* what;
-  int failing_allocation;
-  bool all_after;
-  uint32_t status;
-};
-
-TEST(Library, ReportsHowItStarted) {
-  DataDirectory directory;
-  write_small_directory(directory);
-  const Start starts[] = {
-      {"all is there", -1, false, LX_OK},
-      {"no global area", 0, false, LX_E_MEMORY},
-      {"no object manager", 1, false, LX_E_MANAGER},
-      {"no directory of objects", 3, false, LX_E_DEFAULTS},
-  };
-  for (const Start& start : starts) {
-    SCOPED_TRACE(start.what);
-    CountingAllocator allocator;
-    allocator.arm(start.failing_allocation, start.all_after);
-    EXPECT_EQ(allocator.init(directory.path()), start.status);
-    allocator.disarm();
-    bool running = start.status == LX_OK || start.status == LX_E_DEFAULTS;
+TEST_F(Library, ReportsHowItStarted) {
+  // The allocations are those of the global area, the object manager, and later the directory of objects.
+  for (auto [failing, status] : {std::pair(-1, LX_OK), {0, LX_E_MEMORY}, {1, LX_E_MANAGER}, {3, LX_E_DEFAULTS}}) {
+    SCOPED_TRACE(failing);
+    allocator_.arm(failing, false);
+    EXPECT_EQ(allocator_.init(directory_.path()), status);
+    allocator_.disarm();
+    const bool running = status == LX_OK || status == LX_E_DEFAULTS;
     EXPECT_EQ(LXGetObjManager() != nullptr, running);
     if (!running) {  // what is there of the library is used by the next attempt
       EXPECT_EQ(LXTerm(), LX_OK);
-      EXPECT_EQ(allocator.init(directory.path()), LX_OK);
+      EXPECT_EQ(allocator_.init(directory_.path()), LX_OK);
     }
     EXPECT_EQ(LXTerm(), LX_OK);
-    EXPECT_EQ(allocator.live, 0);
+    EXPECT_EQ(allocator_.live, 0);
   }
 }
 
-TEST(Library, StandsOnBuiltInObjectsWithoutData) {
-  Variable location("LX_LOCALEDIR", nullptr);
-  ASSERT_EQ(init("/does/not/exist"), LX_E_DEFAULTS);
-  uint32_t rc = 0;
-  for (auto [type, name] :
-       {std::pair(LX_LANGUAGE, "english"), {LX_TERRITORY, "UnitedStates"}, {LX_CODEPAGE, "us-ascii"}}) {
-    LXObjEntry* entry = LXGetObjFromName(LXGetObjManager(), static_cast<uint8_t>(type), name, -1, 0, &rc);
-    EXPECT_NE(entry, nullptr) << name;
-    EXPECT_EQ(rc, LX_OK) << name;
-    EXPECT_EQ(LXGetObjId(entry), 1) << name;
+// Without data it stands on built-in objects, or on nothing when told so.
+TEST_F(Library, StandsWithoutData) {
+  for (uint32_t options : {0u, LX_INIT_NO_DEFAULTS}) {
+    ASSERT_EQ(init("/does/not/exist", options), LX_E_DEFAULTS);
+    const uint32_t expected = options == 0 ? LX_OK : LX_E_NOTFOUND;
+    uint32_t rc = 99;
+    for (auto [type, name] :
+         {std::pair(LX_LANGUAGE, "english"), {LX_TERRITORY, "UnitedStates"}, {LX_CODEPAGE, "us-ascii"}}) {
+      LXObjEntry* entry = LXGetObjFromName(LXGetObjManager(), static_cast<uint8_t>(type), name, -1, 0, &rc);
+      EXPECT_EQ(rc, expected) << name;
+      EXPECT_EQ(LXGetObjId(entry), options == 0 ? 1 : 0) << name;
+    }
+    Locale(LXGetLocale("English", 0, &rc)).reset();
+    EXPECT_EQ(rc, options == 0 ? LX_OK : LX_E_LANGUAGE);
+    EXPECT_EQ(LXTerm(), LX_OK);
   }
-  EXPECT_EQ(LXGetObjFromName(LXGetObjManager(), LX_CODEPAGE, "Latin1", -1, 0, &rc), nullptr);
-  EXPECT_EQ(rc, LX_E_NOTFOUND);
-  EXPECT_EQ(LXTerm(), LX_OK);
-}
-
-TEST(Library, StandsOnNothingWhenToldSo) {
-  Variable location("LX_LOCALEDIR", nullptr);
-  ASSERT_EQ(init("/does/not/exist", LX_INIT_NO_DEFAULTS), LX_E_DEFAULTS);
-  uint32_t rc = 0;
-  EXPECT_EQ(LXGetObjFromName(LXGetObjManager(), LX_LANGUAGE, "English", -1, 0, &rc), nullptr);
-  EXPECT_EQ(rc, LX_E_NOTFOUND);
-  EXPECT_EQ(LXGetObjFromID(LXGetObjManager(), LX_CODEPAGE, 1, 0, &rc), nullptr);
-  EXPECT_EQ(rc, LX_E_NOTFOUND);
-  EXPECT_EQ(LXGetLocale("English", 0, &rc), nullptr);
-  EXPECT_EQ(rc, LX_E_LANGUAGE);
-  EXPECT_EQ(LXTerm(), LX_OK);
-}
-
-TEST(Library, ReportsTheFirstErrorOfItsEnd) {
-  CountingAllocator allocator;
-  ASSERT_EQ(allocator.init(LEXARO_DATA), LX_OK);
-  ASSERT_EQ(LXSetLocale("English", 0), LX_OK);
-  allocator.free_fails = true;
-  EXPECT_EQ(LXTerm(), 1u);
-  EXPECT_EQ(allocator.live, 0);
-  EXPECT_EQ(init(LEXARO_DATA), LX_OK);
-  EXPECT_EQ(LXTerm(), LX_OK);
-}
-
-TEST(Library, LeavesTheStatusInTheLocale) {
-  Session session;
-  Locale locale = locale_of("Latin1");
-  EXPECT_EQ(LXGetError(locale.get()), LX_OK);
-  char out[8];
-  EXPECT_EQ(LXConvertString(locale.get(), out, 8, locale.get(), "a", 1, 0x1), -1);
-  EXPECT_EQ(LXGetError(locale.get()), LX_E_ARGUMENT);
-  EXPECT_EQ(LXGetError(nullptr), LX_E_ARGUMENT) << "no default locale";
-  ASSERT_EQ(LXSetLocale("English", 0), LX_OK);
-  EXPECT_EQ(LXGetError(nullptr), LX_OK);
-  EXPECT_EQ(LXConvertString(nullptr, out, 8, nullptr, "a", 1, 0x1), -1);
-  EXPECT_EQ(LXGetError(nullptr), LX_E_ARGUMENT);
-  EXPECT_EQ(LXConvertString(nullptr, out, 8, nullptr, "a", 1, 0), 1);
-  EXPECT_EQ(LXGetError(nullptr), LX_OK);
-}
-
-TEST(Library, DefaultCallbacksAreTheSystemAllocator) {
-  void* block = LXDefAlloc(nullptr, 100);
-  ASSERT_NE(block, nullptr);
-  std::memset(block, 1, 100);
-  EXPECT_EQ(LXDefFree(nullptr, block), 1);
-  EXPECT_EQ(LXDefFree(nullptr, nullptr), 1);
 }
 
 }  // namespace

@@ -17,6 +17,20 @@ namespace {
 
 using Lines = std::vector<std::string>;
 
+template <typename Body>
+void race(int count, Body body) {
+  std::atomic<int> waiting{count};
+  std::vector<std::thread> threads;
+  for (int i = 0; i < count; ++i) {
+    threads.emplace_back([&, i] {
+      --waiting;
+      while (waiting.load() > 0) std::this_thread::yield();
+      body(i);
+    });
+  }
+  for (auto& thread : threads) thread.join();
+}
+
 // The trace settings are read once in a process, so each of these tests traces in a process of its own.
 class Trace : public testing::Test {
  protected:
@@ -85,16 +99,12 @@ TEST_F(Trace, KeepsTheLinesOfThreadsApart) {
   constexpr int kThreads = 4;
   constexpr int kLines = 200;
   const Lines lines = traced("fff", [this] {
-    std::vector<std::thread> threads;
-    for (int i = 0; i < kThreads; ++i) {
-      threads.emplace_back([this, i] {
-        for (int n = 0; n < kLines; ++n) {
-          TRC1_Sync(&unit_);
-          TRC1_Printf(&unit_, i, "%s", std::string(200, static_cast<char>('a' + i)).c_str());
-        }
-      });
-    }
-    for (auto& thread : threads) thread.join();
+    race(kThreads, [this](int i) {
+      for (int n = 0; n < kLines; ++n) {
+        TRC1_Sync(&unit_);
+        TRC1_Printf(&unit_, i, "%s", std::string(200, static_cast<char>('a' + i)).c_str());
+      }
+    });
   });
   ASSERT_EQ(lines.size(), static_cast<size_t>(kThreads * kLines));
   for (const std::string& line : lines) {
@@ -105,14 +115,12 @@ TEST_F(Trace, KeepsTheLinesOfThreadsApart) {
 
 TEST_F(Trace, IsOffWithoutLevels) {
   for (const char* flags : {"0", "", "none"}) {
-    EXPECT_EQ(traced(flags,
-                     [this] {
-                       EXPECT_EQ(unit_.flags, 0u);
-                       TRC1_Printf(&unit_, 1, "nobody reads this");
-                       TRC1_Dump(&unit_, 2, "nor this", "x", 1);
-                     }),
-              Lines{})
-        << flags;
+    auto silent = [this] {
+      EXPECT_EQ(unit_.flags, 0u);
+      TRC1_Printf(&unit_, 1, "nobody reads this");
+      TRC1_Dump(&unit_, 2, "nor this", "x", 1);
+    };
+    EXPECT_EQ(traced(flags, silent), Lines{}) << flags;
   }
 }
 
@@ -120,29 +128,18 @@ TEST(Lock, ExcludesAndReportsMisuse) {
   HSV1_Lock lock;
   ASSERT_EQ(HSV1_InitializeLock(&lock), 0);
   int count = 0;
-  std::vector<std::thread> threads;
-  for (int i = 0; i < 4; ++i) {
-    threads.emplace_back([&] {
-      for (int n = 0; n < 1000; ++n) {
-        HSV1_GetLock(&lock);
-        ++count;
-        HSV1_ReleaseLock(&lock);
-      }
-    });
-  }
-  for (auto& thread : threads) thread.join();
+  race(4, [&](int) {
+    for (int n = 0; n < 1000; ++n) {
+      HSV1_GetLock(&lock);
+      ++count;
+      HSV1_ReleaseLock(&lock);
+    }
+  });
   EXPECT_EQ(count, 4000);
   EXPECT_EQ(HSV1_GetLock(&lock), 0);
   EXPECT_NE(HSV1_GetLock(&lock), 0) << "taking it twice fails instead of waiting for ever";
   EXPECT_EQ(HSV1_ReleaseLock(&lock), 0);
   EXPECT_EQ(HSV1_DestroyLock(&lock), 0);
-}
-
-TEST(Environment, IsThatOfTheProcess) {
-  setenv("LEXARO_HOST_TEST", "value", 1);
-  EXPECT_STREQ(HSV1_GetEnv("LEXARO_HOST_TEST", 0), "value");
-  unsetenv("LEXARO_HOST_TEST");
-  EXPECT_EQ(HSV1_GetEnv("LEXARO_HOST_TEST", 0), nullptr);
 }
 
 // A block that its init fills and its term counts.
@@ -166,20 +163,6 @@ void* term_block(void* memory) {
   EXPECT_EQ(static_cast<Block*>(memory)->made, 1u);
   ++g_terms;
   return memory;
-}
-
-template <typename Body>
-void race(int count, Body body) {
-  std::atomic<int> waiting{count};
-  std::vector<std::thread> threads;
-  for (int i = 0; i < count; ++i) {
-    threads.emplace_back([&, i] {
-      --waiting;
-      while (waiting.load() > 0) std::this_thread::yield();
-      body(i);
-    });
-  }
-  for (auto& thread : threads) thread.join();
 }
 
 TEST(Storage, GivesAProcessOneBlock) {
@@ -231,11 +214,10 @@ TEST(Storage, MayBeResolvedWhileItStartsAndEnds) {
 }
 
 TEST(Storage, SaysWhenThereIsNoMemory) {
-  static HSV1_Descriptor descriptors[] = {{SIZE_MAX, init_block, nullptr, nullptr},
-                                          {SIZE_MAX - 8, init_block, nullptr, nullptr}};
-  for (HSV1_Descriptor& descriptor : descriptors) {
-    EXPECT_EQ(HSV1_ResolveThread(&descriptor, "test"), nullptr);
-  }
+  static HSV1_Descriptor all = {SIZE_MAX, init_block, nullptr, nullptr},
+                         nearly_all = {SIZE_MAX - 8, init_block, nullptr, nullptr};
+  EXPECT_EQ(HSV1_ResolveThread(&all, "test"), nullptr);
+  EXPECT_EQ(HSV1_ResolveThread(&nearly_all, "test"), nullptr);
 }
 
 }  // namespace

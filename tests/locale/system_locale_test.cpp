@@ -81,7 +81,6 @@ class SystemValues : public testing::Test {
   static inline SystemLocales* system_;
   Variable lx_lang_{"LX_LANG", nullptr};
   Variable lc_all_{"LC_ALL", nullptr};
-  Variable lang_{"LANG", nullptr};
   Session session_;
 };
 
@@ -107,22 +106,6 @@ TEST_F(SystemValues, GiveTheirValues) {
   }
 }
 
-// Categories of different locales have a name that maps to none here.
-TEST_F(SystemValues, MixedOnesAreLeftAlone) {
-  std::setlocale(LC_ALL, "C");
-  std::setlocale(LC_MONETARY, "ru");
-  const std::string before = std::setlocale(LC_ALL, nullptr);
-  Locale converted(LXConvertNativeLocale("de_CH", LX_GET_SUBSTITUTE, nullptr));
-  EXPECT_EQ(std::setlocale(LC_ALL, nullptr), before);
-  lc_all_.set(nullptr);
-  lang_.set("de_CH");
-  Variable numeric("LC_NUMERIC", "ru");
-  uint32_t rc = 99;
-  EXPECT_EQ(LXGetLocale("", LX_GET_USER, &rc), nullptr);
-  EXPECT_EQ(rc, LX_E_LANGUAGE);
-  EXPECT_EQ(std::setlocale(LC_ALL, nullptr), before);
-}
-
 // What cannot be restored is not touched.
 TEST_F(SystemValues, NameTooLongToBeSaved) {
   const std::string name(100, 'x');
@@ -136,8 +119,6 @@ TEST_F(SystemValues, NameTooLongToBeSaved) {
   EXPECT_TRUE(trace.has("Unable to save current locale to restore. len " + std::to_string(before.size()) + " > 1024 '" +
                         before + "'"));
   EXPECT_EQ(LocaleModel("Japanese", "Japan", "JapanEUC").difference(converted.get()), "");
-  char buffer[132];
-  EXPECT_EQ(LXGetUserLocale(buffer, sizeof buffer), 0);
   Locale of_user(LXGetLocale("German", LX_GET_USER, nullptr));
   binary(of_user);
   EXPECT_EQ(LocaleModel("English", "UnitedStates", "Latin1").difference(of_user.get()), "");
@@ -158,7 +139,6 @@ TEST_F(SystemValues, OnOtherPages) {
       EXPECT_EQ(model.difference(locale.get()), "") << "unknown names change nothing";
     }
   }
-  LXMapNativeInfo("de_CH", nullptr, 0);  // no default locale: nothing to do
 }
 
 // Texts are set as by the caller; separators and numbers are not, and go with the territory.
@@ -173,20 +153,6 @@ TEST_F(SystemValues, ChangeOfTheTerritory) {
   model.set_territory("German-Switzerland");
   EXPECT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_TERRITORY_ID, 756), 1);
   EXPECT_EQ(model.difference(locale.get()), "");
-}
-
-// The name C says "not available" to nearly everything.
-TEST(SystemValuesOf, TheNameC) {
-  Variable lx_lang("LX_LANG", nullptr);
-  Variable all("LC_ALL", "C");
-  Session session;
-  LocaleModel model("English", "UnitedStates", "US-ASCII");
-  take_system_values(model, "C", true);
-  Locale of_user(LXGetLocale("", LX_GET_USER, nullptr));
-  EXPECT_EQ(model.difference(of_user.get()), "");
-  EXPECT_EQ(model.numbers.size() + model.texts.size(), 1u) << "the decimal point";
-  Locale converted(LXConvertNativeLocale("POSIX", LX_NATIVE_INFO, nullptr));
-  EXPECT_EQ(model.difference(converted.get()), "");
 }
 
 }  // namespace

@@ -42,16 +42,7 @@ TEST(ControlFile, TypesMayBeMissing) {
   const ObjectRecord la{LX_LANGUAGE, 1, "L"}, la2{LX_LANGUAGE, 9, "L2"}, te{LX_TERRITORY, 2, "T"},
       cp{LX_CODEPAGE, 3, "C"}, cp2{LX_CODEPAGE, 4, "C2"}, so{LX_SORT, 5, "S"};
   const Case cases[] = {
-      {{la, la2, te, cp, cp2, so}, "2 1 2 1"},
-      {{cp, cp2}, "0 0 2 0"},
-      {{so}, "0 0 0 1"},
-      {{la}, "1 0 0 0"},
-      {{te}, "0 1 0 0"},
-      {{la, so}, "1 0 0 1"},
-      {{la, cp}, "1 0 1 0"},
-      {{te, so}, "0 1 0 1"},
-      {{}, "0 0 0 0"},
-  };
+      {{la, la2, te, cp, cp2, so}, "2 1 2 1"}, {{cp, cp2}, "0 0 2 0"}, {{te, so}, "0 1 0 1"}, {{}, "0 0 0 0"}};
   for (const Case& one : cases) {
     DataDirectory directory;
     directory.write_control(one.records);
@@ -61,9 +52,13 @@ TEST(ControlFile, TypesMayBeMissing) {
   }
 }
 
-TEST(ControlFile, IdsOutOfOrderAreHarmless) {
+TEST(ControlFile, OddRecordsAreHarmless) {
   DataDirectory directory;
-  directory.write_control({{LX_CODEPAGE, 9, "Nine"}, {LX_CODEPAGE, 3, "Three"}, {LX_CODEPAGE, 9, "Nine2"}});
+  directory.write_control({{LX_TERRITORY, 1, std::string(34, 'n'), 0xFF},  // foreign flags and a name without an end
+                           {LX_CODEPAGE, 9, "Nine"},
+                           {LX_CODEPAGE, 3, "Three"},
+                           {LX_CODEPAGE, 9, "Nine2"}});
+  directory.write_object(LX_TERRITORY, 1, territory_file());
   Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
   EXPECT_EQ(managed.rc, LX_OK);
   uint32_t rc = 0;
@@ -71,14 +66,6 @@ TEST(ControlFile, IdsOutOfOrderAreHarmless) {
     EXPECT_NE(LXGetObjFromName(managed.manager, LX_CODEPAGE, name, -1, 1, &rc), nullptr) << name;
   }
   contents_of(managed.manager);
-}
-
-TEST(ControlFile, ForeignFlagsAndEndlessNamesAreTamed) {
-  DataDirectory directory;
-  directory.write_control({{LX_TERRITORY, 1, std::string(34, 'n'), 0xFF}});
-  directory.write_object(LX_TERRITORY, 1, territory_file());
-  Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
-  uint32_t rc = 0;
   LXObjEntry* entry = LXGetObjFromName(managed.manager, LX_TERRITORY, std::string(33, 'N').c_str(), -1, 0, &rc);
   ASSERT_NE(entry, nullptr);
   EXPECT_EQ(rc, LX_OK);
@@ -92,22 +79,18 @@ TEST(ControlFile, BadOnesAreRefused) {
     Bytes (*spoil)(Bytes);
     uint32_t rc;
   };
-  const Case cases[] = {
-      {"good", [](Bytes b) { return b; }, LX_OK},
-      {"empty", [](Bytes) { return Bytes(); }, LX_E_FILE},
-      {"half a header", [](Bytes b) { return b.resize(75), b; }, LX_E_FILE},
-      {"magic", [](Bytes b) { return b[3] ^= 1, b; }, LX_E_HEADER},
-      {"no section", [](Bytes b) { return b[9] = 0, b; }, LX_E_HEADER},
-      {"many sections", [](Bytes b) { return b[8] = 9, b; }, LX_OK},
-      {"any format word", [](Bytes b) { return b[4] = 0x77, b; }, LX_OK},
-      {"directory too long", [](Bytes b) { return b[10] = 0xFF, b; }, LX_E_FILE},
-      {"directory one byte longer", [](Bytes b) { return b[11]++, b.push_back(0), b; }, LX_OK},
-      {"directory elsewhere", [](Bytes b) { return b[15]++, b; }, LX_E_FILE},
-      {"directory far away", [](Bytes b) { return b[12] = 0xFF, b; }, LX_E_FILE},
-      {"cut", [](Bytes b) { return b.pop_back(), b; }, LX_E_FILE},
-      {"unknown type", [](Bytes b) { return b[76 + 38 * 8 + 2] = 4, b; }, LX_E_HEADER},
-      {"types out of order", [](Bytes b) { return b[76 + 2] = LX_CODEPAGE, b; }, LX_E_HEADER},
-  };
+  const Case cases[] = {{"good", [](Bytes b) { return b; }, LX_OK},
+                        {"empty", [](Bytes) { return Bytes(); }, LX_E_FILE},
+                        {"magic", [](Bytes b) { return b[3] ^= 1, b; }, LX_E_HEADER},
+                        {"no section", [](Bytes b) { return b[9] = 0, b; }, LX_E_HEADER},
+                        {"many sections", [](Bytes b) { return b[8] = 9, b; }, LX_OK},
+                        {"directory too long", [](Bytes b) { return b[10] = 0xFF, b; }, LX_E_FILE},
+                        {"directory one byte longer", [](Bytes b) { return b[11]++, b.push_back(0), b; }, LX_OK},
+                        {"directory elsewhere", [](Bytes b) { return b[15]++, b; }, LX_E_FILE},
+                        {"directory far away", [](Bytes b) { return b[12] = 0xFF, b; }, LX_E_FILE},
+                        {"cut", [](Bytes b) { return b.pop_back(), b; }, LX_E_FILE},
+                        {"unknown type", [](Bytes b) { return b[76 + 38 * 8 + 2] = 4, b; }, LX_E_HEADER},
+                        {"types out of order", [](Bytes b) { return b[76 + 2] = LX_CODEPAGE, b; }, LX_E_HEADER}};
   long before = open_descriptors();
   for (const Case& one : cases) {
     SCOPED_TRACE(one.what);
@@ -126,84 +109,57 @@ TEST(ControlFile, BadOnesAreRefused) {
   EXPECT_EQ(open_descriptors(), before);
 }
 
-class SearchTest : public testing::Test {
- protected:
-  SearchTest() {
-    given_.write_control({{LX_LANGUAGE, 1, "Given"}});
-    variable_.write_control({{LX_LANGUAGE, 1, "Variable"}});
-  }
-  // Who won, and with which code.
-  std::string found(const char* directory, const char* location) {
-    Variable variable("LX_LOCALEDIR", location);
-    uint32_t status = LXInit(directory, nullptr, nullptr, nullptr, 0);
-    uint32_t rc = 0;
-    std::string name = LXGetObjName(LXGetObjFromID(LXGetObjManager(), LX_LANGUAGE, 1, 1, &rc));
-    LXTerm();
-    return name + " " + std::to_string(status);
-  }
-  DataDirectory given_, variable_, empty_;
-};
-
-TEST_F(SearchTest, GivenThenVariableThenDefault) {
+// Where it is looked for: in the directory given, that of the variable, the default one. A file that is bad or a name
+// that is too long ends the search.
+TEST(ControlFile, IsSearchedFor) {
   if (access("/Vantrel/locale/control.nls", F_OK) == 0) GTEST_SKIP() << "this system has a default directory";
-  EXPECT_EQ(found(given_.path(), variable_.path()), "Given 0");
-  EXPECT_EQ(found(nullptr, variable_.path()), "Variable 0");
-  EXPECT_EQ(found(empty_.path(), variable_.path()), "Variable 0");
-  EXPECT_EQ(found(empty_.path(), empty_.path()), "English 10");
-  EXPECT_EQ(found(empty_.path(), nullptr), "English 10");
-  EXPECT_EQ(found(nullptr, ""), "English 10");
-}
-
-TEST_F(SearchTest, FileThatIsFoundButBadEndsIt) {
-  empty_.write("control.nls", Bytes(100));
-  EXPECT_EQ(found(empty_.path(), variable_.path()), "English 10");
-}
-
-TEST_F(SearchTest, NamesThatAreTooLongEndIt) {
-  const std::string long_name(243, 'x');  // with "/control.nls" one byte too many
-  const std::string longer_name(300, 'x');
-  for (const std::string& name : {long_name, longer_name, std::string(255, 'x'), std::string(100000, 'x')}) {
-    EXPECT_EQ(found(name.c_str(), variable_.path()), "English 10");
-    EXPECT_EQ(found(nullptr, name.c_str()), "English 10");
+  DataDirectory given, variable, empty, bad, folder;
+  given.write_control({{LX_LANGUAGE, 1, "Given"}});
+  variable.write_control({{LX_LANGUAGE, 1, "Variable"}});
+  bad.write("control.nls", Bytes(100));
+  ASSERT_EQ(mkdir(folder.file("control.nls").c_str(), 0755), 0);
+  const std::string fits(242, 'x'), too_long = fits + "x", longest(100000, 'x');
+  struct Case {
+    const char *directory, *location, *found;
+    uint32_t rc;
+  };
+  const Case cases[] = {{given.path(), variable.path(), "Given", LX_OK},
+                        {nullptr, variable.path(), "Variable", LX_OK},
+                        {empty.path(), variable.path(), "Variable", LX_OK},
+                        {empty.path(), empty.path(), "English", LX_E_NOFILE},
+                        {empty.path(), nullptr, "English", LX_E_NOFILE},
+                        {nullptr, "", "English", LX_E_NOFILE},
+                        {bad.path(), variable.path(), "English", LX_E_HEADER},
+                        {folder.path(), nullptr, "English", LX_E_FILE},
+                        {too_long.c_str(), variable.path(), "English", LX_E_FILE},
+                        {longest.c_str(), variable.path(), "English", LX_E_FILE},
+                        {nullptr, too_long.c_str(), "English", LX_E_FILE},
+                        {nullptr, longest.c_str(), "English", LX_E_FILE},
+                        {fits.c_str(), too_long.c_str(), "English", LX_E_FILE},
+                        {fits.c_str(), nullptr, "English", LX_E_NOFILE}};
+  for (const Case& one : cases) {
+    Variable location("LX_LOCALEDIR", one.location);
+    Managed managed(one.directory);
+    EXPECT_EQ(managed.rc, one.rc);
+    uint32_t rc = 0;
+    EXPECT_STREQ(LXGetObjName(LXGetObjFromID(managed.manager, LX_LANGUAGE, 1, 1, &rc)), one.found);
+    Session session(one.directory);
+    EXPECT_EQ(session.status, one.rc == LX_OK ? LX_OK : LX_E_DEFAULTS);
   }
-  uint32_t rc = 0;
-  Variable variable("LX_LOCALEDIR", longer_name.c_str());
-  LXTermObjManager(LXInitObjManager(nullptr, 0, &rc));
-  EXPECT_EQ(rc, LX_E_FILE);
-  LXTermObjManager(LXInitObjManager(long_name.c_str(), 0, &rc));
-  EXPECT_EQ(rc, LX_E_FILE);
-  LXTermObjManager(LXInitObjManager(long_name.substr(1).c_str(), 0, &rc));
-  EXPECT_EQ(rc, LX_E_FILE) << "this one fits, but the variable that is tried next does not";
-  variable.set(nullptr);
-  LXTermObjManager(LXInitObjManager(long_name.substr(1).c_str(), 0, &rc));
-  EXPECT_EQ(rc, LX_E_NOFILE);
 }
 
 // The longest directory that can hold a control file also serves its objects.
 TEST(ControlFile, LongestDirectory) {
   DataDirectory base;
-  std::string path = base.path();
-  while (path.size() < 240) {
-    size_t rest = 242 - path.size() - 1;
-    path += "/" + std::string(rest > 100 ? 50 : rest, 'd');
-    ASSERT_EQ(mkdir(path.c_str(), 0755), 0);
-  }
-  ASSERT_EQ(path.size(), 242u);
-  std::string below = path.substr(std::string(base.path()).size() + 1);
-  base.write(below + "/control.nls", control_file({{LX_TERRITORY, 1, "T"}}));
-  base.write(below + "/te_00001.nls", territory_file());
-  Managed managed(path.c_str(), LX_INIT_NO_DEFAULTS);
+  const std::string name(242 - base.file("").size(), 'd');
+  ASSERT_EQ(mkdir(base.file(name).c_str(), 0755), 0);
+  base.write(name + "/control.nls", control_file({{LX_TERRITORY, 1, "T"}}));
+  base.write(name + "/te_00001.nls", territory_file());
+  Managed managed(base.file(name).c_str(), LX_INIT_NO_DEFAULTS);
   EXPECT_EQ(managed.rc, LX_OK);
   uint32_t rc = 0;
   EXPECT_NE(LXGetObjFromID(managed.manager, LX_TERRITORY, 1, 0, &rc), nullptr);
   EXPECT_EQ(rc, LX_OK);
-}
-
-TEST(ControlFile, DirectoryInItsPlace) {
-  DataDirectory directory;
-  ASSERT_EQ(mkdir(directory.file("control.nls").c_str(), 0755), 0);
-  Managed managed(directory.path(), LX_INIT_NO_DEFAULTS);
-  EXPECT_EQ(managed.rc, LX_E_FILE);
 }
 
 }  // namespace

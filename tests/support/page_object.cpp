@@ -20,13 +20,8 @@ PageObject::PageObject(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   std::string file{std::istreambuf_iterator<char>(in), {}};
   if (file.size() < 76) throw std::runtime_error("cannot read " + path);
-  version_ = number(file, 4, 4) >> 28;
-  for (size_t i = 0; i < 4; ++i) {
-    size_t size = i == 0 ? number(file, 10, 2) : number(file, 8 + 8 * i, 2);
-    size_t offset = number(file, 12 + 8 * i, 4);
-    sections_[i] = file.substr(offset, size);
-  }
-  if (version_ == 1 || max_length() == 1) return;
+  section_ = file.substr(number(file, 12, 4), number(file, 10, 2));
+  if (byte(5) == 1) return;  // no multibyte characters
   // A one-byte half-width form wins over the pairs, an earlier pair over a later one.
   size_t table = u16(4366);
   for (uint32_t half = 0; table != 0 && half < 256; ++half) {

@@ -14,12 +14,6 @@ class PageObject {
  public:
   explicit PageObject(const std::string& file);
 
-  const std::string& section(unsigned number) const { return sections_[number - 1]; }
-  unsigned version() const { return version_; }
-  uint8_t max_length() const { return byte(5); }
-  uint8_t length(uint8_t first) const { return byte(10u + first); }
-  uint16_t flags() const { return u16(4364); }
-
   // Flags and case delta of a multibyte character.
   std::pair<uint32_t, int32_t> type(std::string_view bytes) const;
   // The other width; 0: none.
@@ -27,12 +21,11 @@ class PageObject {
   uint32_t half_width(uint32_t full) const;
 
  private:
-  uint8_t byte(size_t at) const { return static_cast<uint8_t>(sections_[0].at(at)); }
+  uint8_t byte(size_t at) const { return static_cast<uint8_t>(section_.at(at)); }
   uint16_t u16(size_t at) const { return static_cast<uint16_t>(byte(at) << 8 | byte(at + 1)); }
   uint32_t u32(size_t at) const { return static_cast<uint32_t>(u16(at)) << 16 | u16(at + 2); }
 
-  std::string sections_[4];
-  unsigned version_ = 0;
+  std::string section_;  // the first
   std::map<uint32_t, uint32_t> full_;
   std::map<uint32_t, uint32_t> half_;
 };

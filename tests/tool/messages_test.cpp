@@ -30,8 +30,7 @@ Texts catalog(const std::string& language) {
   const ToolResult result = run_tool({"catalog", LEXARO_MESSAGES "/lexaro." + language + ".cat"}, input);
   EXPECT_EQ(result.status, 0) << result.errors;
   Texts texts;
-  std::istringstream lines(result.output);
-  for (std::string line; std::getline(lines, line);) {
+  for (const std::string& line : lines_of(result.output)) {
     const std::size_t blank = line.find(' ', line.find(' ') + 1);
     texts[line.substr(0, blank)] = unescaped(line.substr(blank + 1));
   }
@@ -98,22 +97,20 @@ TEST_F(Messages, SpeakTheUsersLanguage) {
   const std::string broken = fs::path(write("lexaro", "no catalog")).parent_path();
   const std::string english = "there is no command \"x\"";
   const struct {
-    std::map<std::string, std::string> environment;
+    Environment environment;
     Arguments arguments;
     std::string text;
   } cases[] = {
-      {{{"LANG", "de_DE.UTF-8"}}, {"help", "x"}, "Es gibt keinen Befehl „x“"},
-      {{{"LANG", "ja_JP.UTF-8"}}, {"help", "x"}, "コマンド「x」はありません"},
-      {{{"LANG", "ja_JP.eucJP"}}, {"help", "x"}, bytes("A5B3A5DEA5F3A5C9A1D6") + "x"},
-      {{{"LANG", "ja_JP.UTF-8"}, {"LC_ALL", "C"}}, {"help", "x"}, english},
-      {{{"LANG", "ja_JP.UTF-8"}, {"LX_LANG", "German"}}, {"help", "x"}, "keinen Befehl"},
-      {{{"LANG", "sv_SE.UTF-8"}}, {"help", "x"}, english},
-      {{{"LANG", "de_DE.UTF-8"}, {"LX_NLSPATH", broken}}, {"help", "x"}, "keinen Befehl"},
-      {{{"LANG", "de_DE.UTF-8"}}, {"convert", "-f", "37", "none"}, "Datei oder Verzeichnis nicht gefunden"},
-      {{{"LANG", "de_DE.UTF-8"}}, {"help"}, "Aufruf: lexaro [OPTIONEN] BEFEHL"},
-      {{{"LANG", "ja_JP.eucJP"}}, {"sort", "--help"}, bytes("B9D4A4F2A5EDA5B1A1BCA5EBA4CE")},
-      {{{"LC_ALL", "C"}}, {"sort", "--help"}, "Sort lines in the order of a locale"},
-      {{}, {"parse", "integer", "--base", "16", "FFFFFFFF"}, "the value does not fit into 32 bits"},
+      {{{"LANG", "de_DE.UTF-8"}}, "help x", "Es gibt keinen Befehl „x“"},
+      {{{"LANG", "ja_JP.UTF-8"}}, "help x", "コマンド「x」はありません"},
+      {{{"LANG", "ja_JP.eucJP"}}, "help x", bytes("A5B3A5DEA5F3A5C9A1D6") + "x"},
+      {{{"LANG", "ja_JP.UTF-8"}, {"LC_ALL", "C"}}, "help x", english},
+      {{{"LANG", "ja_JP.UTF-8"}, {"LX_LANG", "German"}}, "help x", "keinen Befehl"},
+      {{{"LANG", "de_DE.UTF-8"}, {"LX_NLSPATH", broken}}, "help x", "keinen Befehl"},
+      {{{"LANG", "de_DE.UTF-8"}}, "convert -f 37 none", "Datei oder Verzeichnis nicht gefunden"},
+      {{{"LANG", "de_DE.UTF-8"}}, "help", "Aufruf: lexaro [OPTIONEN] BEFEHL"},
+      {{{"LANG", "ja_JP.eucJP"}}, "sort --help", bytes("B9D4A4F2A5EDA5B1A1BCA5EBA4CE")},
+      {{}, "parse integer --base 16 FFFFFFFF", "the value does not fit into 32 bits"},
   };
   for (const auto& one : cases) {
     ToolInput input;
@@ -132,8 +129,8 @@ TEST_F(Messages, AreReplacedByTheUsersOwn) {
   ASSERT_EQ(run_tool({"catalog", source, "-o", path("lexaro"), "--locale", "German.UTF-8"}, input).status, 0);
   input.program = LEXARO_TOOL;
   input.environment = {{"LANG", "de_DE.UTF-8"}, {"LX_NLSPATH", fs::path(source).parent_path()}};
-  EXPECT_EQ(run_tool({"help", "x"}, input).errors, "lexaro: Nö: x\n");
-  EXPECT_NE(run_tool({"sort", "--frob"}, input).errors.find("Versuchen Sie"), std::string::npos);
+  EXPECT_EQ(run_tool("help x", input).errors, "lexaro: Nö: x\n");
+  EXPECT_NE(run_tool("sort --frob", input).errors.find("Versuchen Sie"), std::string::npos);
 }
 
 }  // namespace

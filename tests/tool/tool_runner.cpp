@@ -23,29 +23,6 @@ namespace {
 
 namespace fs = std::filesystem;
 
-struct Pipe {
-  Pipe() {
-    int ends[2] = {-1, -1};
-    if (::pipe2(ends, O_CLOEXEC) != 0) std::abort();
-    reader = ends[0];
-    writer = ends[1];
-  }
-  Pipe(const Pipe&) = delete;
-  Pipe& operator=(const Pipe&) = delete;
-  ~Pipe() {
-    close_reader();
-    close_writer();
-  }
-  void close_reader() { drop(reader); }
-  void close_writer() { drop(writer); }
-  static void drop(int& fd) {
-    if (fd >= 0) ::close(fd);
-    fd = -1;
-  }
-  int reader;
-  int writer;
-};
-
 [[noreturn]] void execute(const Arguments& arguments, const ToolInput& input) {
   constexpr uid_t kNobody = 65534;
   if (input.unprivileged && ::geteuid() == 0 && (::setgid(kNobody) != 0 || ::setuid(kNobody) != 0)) ::_exit(126);
@@ -67,11 +44,6 @@ struct Pipe {
   envp.push_back(nullptr);
   ::execve(argv[0], argv.data(), envp.data());
   ::_exit(127);
-}
-
-int open_output(const ToolInput& input, int pipe_writer) {
-  if (!input.output_path) return pipe_writer;
-  return ::open(input.output_path->c_str(), O_WRONLY | O_CREAT | input.output_flags, 0644);
 }
 
 void feed(int fd, const ToolInput& input) {
@@ -107,46 +79,53 @@ void collect(int fd, std::string* text, uint64_t& size) {
 
 ToolResult run_tool(const Arguments& arguments, const ToolInput& input) {
   std::signal(SIGPIPE, SIG_IGN);
-  Pipe in;
-  Pipe out;
-  Pipe errors;
-  const int output = open_output(input, out.writer);
-  if (input.output_pipe_closed) out.close_reader();
+  int in[2], out[2], errors[2];
+  for (int* ends : {in, out, errors}) {
+    if (::pipe2(ends, O_CLOEXEC) != 0) std::abort();
+  }
+  if (input.output_pipe_closed) ::close(std::exchange(out[0], -1));
   const pid_t pid = ::fork();
   if (pid == 0) {
-    ::dup2(in.reader, STDIN_FILENO);
-    ::dup2(errors.writer, STDERR_FILENO);
-    if (input.output_closed) {
-      ::close(STDOUT_FILENO);
-    } else {
-      ::dup2(output, STDOUT_FILENO);
-    }
+    const char* path = input.output_path ? input.output_path->c_str() : nullptr;
+    ::dup2(in[0], STDIN_FILENO);
+    ::dup2(errors[1], STDERR_FILENO);
+    ::dup2(path ? ::open(path, O_WRONLY | O_CREAT | O_CLOEXEC | input.output_flags, 0644) : out[1], STDOUT_FILENO);
+    if (input.output_closed) ::close(STDOUT_FILENO);
     std::signal(SIGPIPE, SIG_DFL);
     execute(arguments, input);
   }
-  if (input.output_path) ::close(output);
-  in.close_reader();
-  out.close_writer();
-  errors.close_writer();
+  for (const int end : {in[0], out[1], errors[1]}) ::close(end);
 
   ToolResult result;
   uint64_t errors_size = 0;
   std::thread feeder([&] {
-    feed(in.writer, input);
-    in.close_writer();
+    feed(in[1], input);
+    if (input.signal != 0) ::kill(pid, input.signal);
+    ::close(in[1]);
   });
-  std::thread listener([&] { collect(errors.reader, &result.errors, errors_size); });
-  collect(out.reader, input.keep_output ? &result.output : nullptr, result.output_size);
+  std::thread listener([&] { collect(errors[0], &result.errors, errors_size); });
+  collect(out[0], input.keep_output ? &result.output : nullptr, result.output_size);
   int status = 0;
   rusage usage{};
   while (::wait4(pid, &status, 0, &usage) < 0 && errno == EINTR) {
   }
   feeder.join();
   listener.join();
+  for (const int end : {out[0], errors[0]}) ::close(end);
   if (WIFEXITED(status)) result.status = WEXITSTATUS(status);
   if (WIFSIGNALED(status)) result.signal = WTERMSIG(status);
   result.peak_kib = usage.ru_maxrss;
   return result;
+}
+
+ToolInput repeated(const std::string& piece, int times) {
+  ToolInput input;
+  input.keep_output = false;
+  input.next = [piece, times](std::string& next) mutable {
+    next = piece;
+    return times-- > 0;
+  };
+  return input;
 }
 
 ToolResult run_tool(const Arguments& arguments, const std::string& text) {
@@ -155,32 +134,33 @@ ToolResult run_tool(const Arguments& arguments, const std::string& text) {
   return run_tool(arguments, input);
 }
 
-RunningTool::RunningTool(const Arguments& arguments) {
-  Pipe in;
-  pid_ = ::fork();
-  if (pid_ == 0) {
-    ::dup2(in.reader, STDIN_FILENO);
-    execute(arguments, {});
+Arguments::Arguments(const char* words) {
+  std::istringstream in(words);
+  for (std::string word; in >> word;) push_back(word);
+}
+
+void expect_told(const ToolResult& result, const std::string& text) {
+  EXPECT_NE(result.errors.find(text), std::string::npos) << "missing: " << text << "\nin: " << result.errors;
+}
+
+Arguments operator+(Arguments all, const Arguments& more) {
+  all.insert(all.end(), more.begin(), more.end());
+  return all;
+}
+
+void check_runs(const Arguments& command, const std::vector<Run>& runs) {
+  for (const Run& run : runs) {
+    ToolInput input;
+    input.text = run.input;
+    input.environment = run.environment;
+    const Arguments arguments = command + run.arguments;
+    const ToolResult result = run_tool(arguments, input);
+    SCOPED_TRACE(testing::PrintToString(arguments) + " " + run.input + "\n" + result.errors);
+    EXPECT_EQ(result.output, run.output);
+    EXPECT_EQ(result.status, run.status);
+    EXPECT_EQ(result.errors.substr(0, 8), run.error.empty() ? "" : "lexaro: ");
+    expect_told(result, run.error);
   }
-  input_ = std::exchange(in.writer, -1);
-}
-
-RunningTool::~RunningTool() {
-  ::close(input_);
-  if (pid_ > 0) kill(SIGKILL);
-}
-
-void RunningTool::send(const std::string& text) const {
-  EXPECT_EQ(::write(input_, text.data(), text.size()), static_cast<ssize_t>(text.size()));
-}
-
-int RunningTool::kill(int signal_number) {
-  ::kill(pid_, signal_number);
-  int status = 0;
-  while (::waitpid(pid_, &status, 0) < 0 && errno == EINTR) {
-  }
-  pid_ = -1;
-  return WIFSIGNALED(status) ? WTERMSIG(status) : 0;
 }
 
 ToolTest::ToolTest() {
@@ -207,6 +187,13 @@ std::vector<std::string> ToolTest::files() const {
   for (const auto& entry : fs::directory_iterator(directory_)) names.push_back(entry.path().filename().string());
   std::sort(names.begin(), names.end());
   return names;
+}
+
+std::vector<std::string> lines_of(const std::string& text) {
+  std::vector<std::string> lines;
+  std::istringstream in(text);
+  for (std::string line; std::getline(in, line);) lines.push_back(line);
+  return lines;
 }
 
 std::string bytes(const std::string& hexadecimal) {

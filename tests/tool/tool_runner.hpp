@@ -3,7 +3,6 @@
 #pragma once
 
 #include <gtest/gtest.h>
-#include <sys/types.h>
 
 #include <functional>
 #include <map>
@@ -13,7 +12,14 @@
 
 namespace lx::test {
 
-using Arguments = std::vector<std::string>;
+// The words of a command line: a list of them, or a text with blanks between them.
+struct Arguments : std::vector<std::string> {
+  using vector::vector;
+  Arguments(const char* words);
+};
+using Environment = std::map<std::string, std::string>;
+
+Arguments operator+(Arguments all, const Arguments& more);
 
 struct ToolResult {
   int status = -1;  // exit code; -1 when a signal ended the program
@@ -25,35 +31,37 @@ struct ToolResult {
 };
 
 struct ToolInput {
-  std::string text;                                     // what standard input gives
-  std::function<bool(std::string& piece)> next;         // ... or piece by piece, until it returns false
-  bool wait_for_reader = false;                         // hand over the next piece when the last one was taken
-  bool keep_output = true;                              // false: only count its bytes
-  std::optional<std::string> output_path;               // standard output goes to this file
-  int output_flags = 0;                                 // how it is opened
-  bool output_pipe_closed = false;                      // nobody reads standard output
-  bool output_closed = false;                           // there is no standard output
-  bool unprivileged = false;                            // not as the superuser, whom permissions do not bind
-  std::map<std::string, std::string> environment = {};  // beside PATH
+  std::string text;                              // what standard input gives
+  std::function<bool(std::string& piece)> next;  // ... or piece by piece, until it returns false
+  bool wait_for_reader = false;                  // hand over the next piece when the last one was taken
+  bool keep_output = true;                       // false: only count its bytes
+  std::optional<std::string> output_path;        // standard output goes to this file
+  int output_flags = 0;                          // how it is opened
+  bool output_pipe_closed = false;               // nobody reads standard output
+  bool output_closed = false;                    // there is no standard output
+  int signal = 0;                                // sent when all input was handed over
+  bool unprivileged = false;                     // not as the superuser, whom permissions do not bind
+  Environment environment = {};                  // beside PATH
   std::string program = LEXARO_TOOL;
 };
 
+// A text over and over, and output that nobody keeps.
+ToolInput repeated(const std::string& piece, int times);
+
 ToolResult run_tool(const Arguments& arguments, const ToolInput& input = {});
 ToolResult run_tool(const Arguments& arguments, const std::string& text);
+void expect_told(const ToolResult& result, const std::string& text);
 
-// A program left running with its standard input open and silent.
-class RunningTool {
- public:
-  explicit RunningTool(const Arguments& arguments);
-  ~RunningTool();
-  void send(const std::string& text) const;
-  // Signals it, and returns the signal that ended it (0: it exited).
-  int kill(int signal_number);
-
- private:
-  pid_t pid_ = -1;
-  int input_ = -1;
+// One call of the program, and what it must do.
+struct Run {
+  Arguments arguments;
+  std::string input = "";
+  std::string output = "";
+  int status = 0;
+  std::string error = "";  // part of what standard error says; empty: nothing at all
+  Environment environment = {{"LC_ALL", "C.UTF-8"}};
 };
+void check_runs(const Arguments& command, const std::vector<Run>& runs);
 
 // A directory of its own for each test.
 class ToolTest : public testing::Test {
@@ -69,6 +77,8 @@ class ToolTest : public testing::Test {
  private:
   std::string directory_;
 };
+
+std::vector<std::string> lines_of(const std::string& text);
 
 // "C1 0E4481" as bytes; blanks are ignored.
 std::string bytes(const std::string& hexadecimal);
