@@ -5,6 +5,9 @@ target_include_directories(lexaro_options INTERFACE ${PROJECT_SOURCE_DIR} ${PROJ
 target_compile_options(lexaro_options INTERFACE
   -Wall -Wextra -Wconversion -Wshadow -Werror
   $<$<COMPILE_LANG_AND_ID:CXX,Clang>:-Wno-missing-field-initializers>)
+if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_LESS 13)
+  target_compile_options(lexaro_options INTERFACE -Wno-restrict)  # wrong about joined strings (GCC bug 105651)
+endif()
 if(LEXARO_SANITIZE)
   target_compile_options(lexaro_options INTERFACE -fsanitize=${LEXARO_SANITIZE} -fno-sanitize-recover=all
     -fno-omit-frame-pointer)
