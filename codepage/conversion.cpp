@@ -75,7 +75,7 @@ class BufferCall {
   }
 
   uint32_t run() {
-    while (handle_.held_count != 0) {
+    if (handle_.held_count != 0) {
       uint32_t status = continue_held();
       if (status != LX_OK) return status;
     }
@@ -150,14 +150,9 @@ class BufferCall {
       return LX_E_PARTIAL;
     }
     if (stop == Stop::full) spill(in, watch);
-    auto used = static_cast<size_t>(in.at - assembly);
-    if (used >= held) {
-      handle_.held_count = 0;
-      consume(used - held);
-    } else {  // strict reading ended the character early
-      handle_.held_count = static_cast<uint8_t>(held - used);
-      std::memmove(handle_.held, handle_.held + used, held - used);
-    }
+    // Strict reading too takes what it held: it held no byte that does not fit.
+    handle_.held_count = 0;
+    consume(static_cast<size_t>(in.at - assembly) - held);
     return stop == Stop::full ? LX_E_FULL : LX_OK;
   }
 

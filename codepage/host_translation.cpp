@@ -25,15 +25,6 @@ bool only_blanks(In rest) {
   }
 }
 
-// Where a further call would go on: before the shift byte of a double-byte run that has not begun.
-template <class In>
-auto resume_at(const In& in) {
-  if constexpr (In::kShifted) {
-    if (in.double_byte && in.at == in.behind_shift) return in.at - 1;
-  }
-  return in.at;
-}
-
 struct Attempt {
   size_t written = 0;  // units
   size_t characters = 0;
@@ -85,7 +76,7 @@ Attempt attempt(const Translation& wanted, In in, Out& out, size_t limit) {
   result.overflow = stop == Stop::full || more;
   result.forgiven = result.overflow && wanted.drop_blanks && only_blanks(in);
   result.all = stop == Stop::done && all;
-  result.consumed = static_cast<size_t>((result.overflow ? resume_at(in) : in.at) - begin);
+  result.consumed = static_cast<size_t>(in.at - begin);
   return result;
 }
 

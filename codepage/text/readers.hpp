@@ -246,10 +246,9 @@ struct ShiftedReader : ByteReader {
   static constexpr bool kShifted = true;
 
   bool double_byte;
-  bool past_shift = false;                // the character begins here, whatever its first byte
-  bool all_shifts = false;                // a shift byte is never a character, however many there are
-  const uint8_t* behind_shift = nullptr;  // where the last shift byte ended
-  const uint8_t* odd_shift = nullptr;     // a shift byte that changed nothing, until somebody takes note of it
+  bool past_shift = false;             // the character begins here, whatever its first byte
+  bool all_shifts = false;             // a shift byte is never a character, however many there are
+  const uint8_t* odd_shift = nullptr;  // a shift byte that changed nothing, until somebody takes note of it
 
   ShiftedReader(const CodePage& code_page, const uint8_t* text, size_t length, uint32_t state)
       : ByteReader(code_page, text, length),
@@ -316,7 +315,7 @@ struct ShiftedReader : ByteReader {
   bool turn() {
     if (*at != (double_byte ? leave_ : enter_) || at[1] == enter_ || at[1] == leave_) return false;
     double_byte = !double_byte;
-    behind_shift = ++at;
+    ++at;
     return true;
   }
   bool ascii_ahead() const {
@@ -329,7 +328,7 @@ struct ShiftedReader : ByteReader {
       bool enters = *at == page->enter_byte;
       if (enters == double_byte) odd_shift = at;
       double_byte = enters;
-      behind_shift = ++at;
+      ++at;
       if (all_shifts) continue;
       if (strict && !done() && at_shift()) return Got::shift;
       past_shift = !strict;
