@@ -21,15 +21,12 @@
 #include <string>
 #include <vector>
 
+#include "bench/support/library.hpp"
 #include "bench/support/machine.hpp"
 #include "bench/support/system_locales.hpp"
 
 namespace lx::bench {
 namespace {
-
-struct Failure : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
 
 struct Language {
   const char* tag;
@@ -319,36 +316,21 @@ bool run_language(const Language& language, int repetitions) {
   return never_slower;
 }
 
-int run(int repetitions) {
+int run(const Options& options) {
+  const Library library(options);
   const SystemLocales locales({"en_US", "de_DE", "es_ES", "sv_SE"});
   const std::string peers = "ICU " U_ICU_VERSION ", C library with locales of its own";
   std::printf("%s\n", machine_description(peers).c_str());
   std::printf("| Language | Work | Lexaro ns a word | ICU | C library | Times the faster peer |\n");
   std::printf("| --- | --- | ---: | ---: | ---: | ---: |\n");
   bool never_slower = true;
-  for (const Language& language : kLanguages) never_slower &= run_language(language, repetitions);
+  for (const Language& language : kLanguages) {
+    if (options.wants(language.tag)) never_slower &= run_language(language, options.quick ? 3 : 15);
+  }
   return never_slower ? 0 : 1;
 }
 
 }  // namespace
 }  // namespace lx::bench
 
-int main(int argc, char** argv) {
-  const bool quick = argc == 2 && std::strcmp(argv[1], "--quick") == 0;
-  if (argc > 1 && !quick) {
-    std::fprintf(stderr, "usage: bench_collate [--quick]\n");
-    return 2;
-  }
-  if (LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS) != LX_OK) {
-    std::fprintf(stderr, "bench_collate: no locale data in %s\n", LEXARO_DATA);
-    return 2;
-  }
-  int status = 2;
-  try {
-    status = lx::bench::run(quick ? 3 : 15);
-  } catch (const std::runtime_error& failure) {
-    std::fprintf(stderr, "bench_collate: %s\n", failure.what());
-  }
-  LXTerm();
-  return status;
-}
+int main(int argc, char** argv) { return lx::bench::run_program("bench_collate", argc, argv, lx::bench::run); }

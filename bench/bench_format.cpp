@@ -26,15 +26,12 @@
 #include <string>
 #include <vector>
 
+#include "bench/support/library.hpp"
 #include "bench/support/machine.hpp"
 #include "bench/support/system_locales.hpp"
 
 namespace lx::bench {
 namespace {
-
-struct Failure : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
 
 struct Country {
   const char* tag;  // of ICU, and the source of the C library's locale
@@ -402,7 +399,8 @@ bool run_country(const Country& country, int repetitions) {
   return never_slower;
 }
 
-int run(int repetitions) {
+int run(const Options& options) {
+  const Library library(options);
   const SystemLocales locales({"en_US", "de_DE"});
   std::string peers = "ICU " U_ICU_VERSION ", C library with locales of its own";
 #ifdef BENCH_FMT
@@ -412,29 +410,13 @@ int run(int repetitions) {
   std::printf("| Country | Work | Lexaro ns a value | ICU | C library | {fmt} | Times the fastest peer |\n");
   std::printf("| --- | --- | ---: | ---: | ---: | ---: | ---: |\n");
   bool never_slower = true;
-  for (const Country& country : kCountries) never_slower &= run_country(country, repetitions);
+  for (const Country& country : kCountries) {
+    if (options.wants(country.tag)) never_slower &= run_country(country, options.quick ? 3 : 15);
+  }
   return never_slower ? 0 : 1;
 }
 
 }  // namespace
 }  // namespace lx::bench
 
-int main(int argc, char** argv) {
-  const bool quick = argc == 2 && std::strcmp(argv[1], "--quick") == 0;
-  if (argc > 1 && !quick) {
-    std::fprintf(stderr, "usage: bench_format [--quick]\n");
-    return 2;
-  }
-  if (LXInit(LEXARO_DATA, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS) != LX_OK) {
-    std::fprintf(stderr, "bench_format: no locale data in %s\n", LEXARO_DATA);
-    return 2;
-  }
-  int status = 2;
-  try {
-    status = lx::bench::run(quick ? 3 : 15);
-  } catch (const std::runtime_error& failure) {
-    std::fprintf(stderr, "bench_format: %s\n", failure.what());
-  }
-  LXTerm();
-  return status;
-}
+int main(int argc, char** argv) { return lx::bench::run_program("bench_format", argc, argv, lx::bench::run); }

@@ -14,6 +14,7 @@
 #include "bench/convert/corpus.hpp"
 #include "bench/convert/peers.hpp"
 #include "bench/support/machine.hpp"
+#include "bench/support/program.hpp"
 
 namespace lx::bench {
 namespace {
@@ -113,9 +114,13 @@ std::string results(Peer& peer, const Texts& fields) {
   return all;
 }
 
-struct Options {
-  bool quick = false;
-  const char* data = LEXARO_DATA;
+// The library comes up with the first call and goes with these.
+struct Library {
+  explicit Library(const Options& options) { setenv("NLS1_LOCALEDIR", options.data, 1); }
+  ~Library() {
+    TermThread(HSV1_ResolveThread(&qlgnlthr_HSV1__T, "bench_host"));
+    TermProcess(HSV1_ResolveProcess(&qlgnlprc_HSV1__P, "bench_host"));
+  }
 };
 
 // Times iconv; prints the row.
@@ -136,11 +141,13 @@ double measure(const HostRow& row, size_t size, const Options& options) {
 }
 
 int run(const Options& options) {
+  const Library library(options);
   std::printf("%s\n", machine_description(peer_versions()).c_str());
   std::printf("| Fields | Bytes | Lexaro ns | iconv ns | Times iconv |\n| --- | ---: | ---: | ---: | ---: |\n");
   std::string slower;
   for (size_t size : kSizes) {
     for (const HostRow& row : kRows) {
+      if (!options.wants(row.name().c_str())) continue;
       if (measure(row, size, options) < 1)
         slower += "SLOWER than iconv: " + row.name() + ", " + std::to_string(size) + " bytes\n";
     }
@@ -149,37 +156,7 @@ int run(const Options& options) {
   return slower.empty() ? 0 : 1;
 }
 
-bool parse(int count, char** arguments, Options& options) {
-  for (int i = 1; i < count; ++i) {
-    if (std::strcmp(arguments[i], "--quick") == 0) {
-      options.quick = true;
-    } else if (std::strcmp(arguments[i], "--data") == 0 && i + 1 < count) {
-      options.data = arguments[++i];
-    } else {
-      return false;
-    }
-  }
-  return true;
-}
-
 }  // namespace
 }  // namespace lx::bench
 
-int main(int argc, char** argv) {
-  using namespace lx::bench;
-  Options options;
-  if (!parse(argc, argv, options)) {
-    std::fprintf(stderr, "usage: bench_host [--quick] [--data DIRECTORY]\n");
-    return 2;
-  }
-  setenv("NLS1_LOCALEDIR", options.data, 1);
-  int status = 2;
-  try {
-    status = run(options);
-  } catch (const Failure& failure) {
-    std::fprintf(stderr, "bench_host: %s\n", failure.what());
-  }
-  TermThread(HSV1_ResolveThread(&qlgnlthr_HSV1__T, "bench_host"));
-  TermProcess(HSV1_ResolveProcess(&qlgnlprc_HSV1__P, "bench_host"));
-  return status;
-}
+int main(int argc, char** argv) { return lx::bench::run_program("bench_host", argc, argv, lx::bench::run); }

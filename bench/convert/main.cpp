@@ -8,6 +8,7 @@
 
 #include "bench/convert/peers.hpp"
 #include "bench/convert/table.hpp"
+#include "bench/support/library.hpp"
 #include "bench/support/machine.hpp"
 
 namespace lx::bench {
@@ -15,12 +16,6 @@ namespace {
 
 constexpr double kSingleByteAim = 3;
 constexpr double kMultibyteAim = 2;
-
-struct Options {
-  bool quick = false;
-  const char* only = "";  // of "ROW, SIZE"
-  const char* data = LEXARO_DATA;
-};
 
 constexpr Size kSizes[] = {{"16 MiB", 16 << 20, 1}, {"4 KiB", 4 << 10, 16}, {"64-byte", 64, 256}};
 
@@ -44,13 +39,14 @@ Effort effort_for(const Options& options, const Size& size) {
 }
 
 int run(const Options& options) {
+  const Library library(options);
   std::printf("%s", machine_description(peer_versions()).c_str());
   int slower = 0;
   for (const Size& size : kSizes) {
     std::vector<Result> results;
     for (const Row& row : rows()) {
       std::string name = row.name() + ", " + size.name;
-      if (name.find(options.only) == std::string::npos) continue;
+      if (!options.wants(name.c_str())) continue;
       results.push_back({row, measure(row, size, effort_for(options, size))});
     }
     if (results.empty()) continue;
@@ -62,44 +58,7 @@ int run(const Options& options) {
   return slower == 0 ? 0 : 1;
 }
 
-int usage() {
-  std::fprintf(stderr, "usage: bench_convert [--quick] [--only TEXT] [--data DIRECTORY]\n");
-  return 2;
-}
-
-bool parse(int count, char** arguments, Options& options) {
-  for (int i = 1; i < count; ++i) {
-    const char* value = i + 1 < count ? arguments[i + 1] : nullptr;
-    if (std::strcmp(arguments[i], "--quick") == 0) {
-      options.quick = true;
-    } else if (std::strcmp(arguments[i], "--only") == 0 && value != nullptr) {
-      options.only = arguments[++i];
-    } else if (std::strcmp(arguments[i], "--data") == 0 && value != nullptr) {
-      options.data = arguments[++i];
-    } else {
-      return false;
-    }
-  }
-  return true;
-}
-
 }  // namespace
 }  // namespace lx::bench
 
-int main(int argc, char** argv) {
-  using namespace lx::bench;
-  Options options;
-  if (!parse(argc, argv, options)) return usage();
-  if (LXInit(options.data, nullptr, nullptr, nullptr, LX_INIT_NO_DEFAULTS) != LX_OK) {
-    std::fprintf(stderr, "bench_convert: no locale data in %s\n", options.data);
-    return 2;
-  }
-  int status = 2;
-  try {
-    status = run(options);
-  } catch (const Failure& failure) {
-    std::fprintf(stderr, "bench_convert: %s\n", failure.what());
-  }
-  LXTerm();
-  return status;
-}
+int main(int argc, char** argv) { return lx::bench::run_program("bench_convert", argc, argv, lx::bench::run); }

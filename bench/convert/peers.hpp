@@ -4,16 +4,12 @@
 
 #include <cstddef>
 #include <memory>
-#include <stdexcept>
 #include <string>
 
 #include "bench/convert/page.hpp"
+#include "bench/support/program.hpp"
 
 namespace lx::bench {
-
-struct Failure : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
 
 class Peer {
  public:
