@@ -3,6 +3,7 @@
 // white space.
 #include "objects/aliases.hpp"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstring>
 #include <span>
@@ -19,23 +20,25 @@ TRC1_Unit trace_unit = {"Lexaro", "aliases", 0};
 constexpr char kAliasFile[] = "alias.txt";
 constexpr int32_t kAliasFileRoom = sizeof kAliasFile + 1;  // with its separator
 constexpr size_t kMaxLine = 32767;
+constexpr size_t kShortName = 8;  // names are longer on the average, so that one block takes all
 constexpr int kRecordSize = 104;  // what the message about a failed allocation has always said
 
-constexpr bool is_white(char character) {
-  return character == ' ' || character == '\t' || character == '\r' || character == '\n';
-}
+// By character, for the many of a start: the one behind a name, and the form in which an alias is kept.
+struct Characters {
+  bool white[256];
+  char upper[256];
 
-// One record for every word is room enough: the names of the code pages take none.
-size_t count_words(const char* text, size_t length) {
-  size_t count = 0;
-  bool before = true;
-  for (size_t i = 0; i < length; ++i) {
-    bool white = is_white(text[i]);
-    count += before && !white ? 1 : 0;
-    before = white;
+  constexpr Characters() : white(), upper() {
+    for (int i = 0; i < 256; ++i) {
+      const auto character = static_cast<char>(i);
+      white[i] = character == ' ' || character == '\t' || character == '\r' || character == '\n';
+      upper[i] = character >= 'a' && character <= 'z' ? static_cast<char>(character - ('a' - 'A')) : character;
+    }
   }
-  return count;
-}
+};
+constexpr Characters kCharacters;
+
+bool is_white(char character) { return kCharacters.white[static_cast<uint8_t>(character)]; }
 
 // Reads the text in place: names are terminated and aliases turned to upper case where they stand.
 class AliasReader {
@@ -46,7 +49,7 @@ class AliasReader {
   bool read(char* text, size_t length) {
     char* end = text + length;
     *end = '\n';
-    words_ = count_words(text, length);
+    expected_ = length / kShortName + 1;
     while (text < end) {
       auto* line_end = static_cast<char*>(std::memchr(text, '\n', static_cast<size_t>(end - text) + 1));
       auto line_length = static_cast<size_t>(line_end - text);
@@ -79,13 +82,14 @@ class AliasReader {
     return true;
   }
 
-  // The character behind a token is white space or the end of the line, and becomes its terminator.
+  // There is white space at the end of every line. What is behind a token becomes its terminator.
   static Token next_token(char*& at, char* end) {
     while (at < end && is_white(*at)) ++at;
     char* begin = at;
-    while (at < end && !is_white(*at)) ++at;
+    if (at == end) return {begin, 0};
+    while (!is_white(*at)) ++at;
     auto length = static_cast<size_t>(at - begin);
-    if (length != 0) *at = '\0';
+    *at = '\0';
     if (at < end) ++at;
     return {begin, length};
   }
@@ -112,12 +116,9 @@ class AliasReader {
                alias.text, kMaxCodePageName);
       return false;
     }
-    if (manager_.aliases == nullptr && !make_room(alias)) return false;
+    if (manager_.alias_count == room_ && !make_room(alias)) return false;
     LX_TRACE(TRC1_LEVEL_DETAIL, "Processing alias '%s'", alias.text);
-    for (size_t i = 0; i < alias.length; ++i) {
-      char character = alias.text[i];
-      if (character >= 'a' && character <= 'z') alias.text[i] = static_cast<char>(character - ('a' - 'A'));
-    }
+    for (size_t i = 0; i < alias.length; ++i) alias.text[i] = kCharacters.upper[static_cast<uint8_t>(alias.text[i])];
     Alias& record = manager_.aliases[manager_.alias_count++];
     record = {code_page_, alias.text, static_cast<uint8_t>(alias.length)};
     LX_TRACE(TRC1_LEVEL_DETAIL, "Saved alias %s, length = %d", record.alias, static_cast<int>(alias.length));
@@ -125,15 +126,22 @@ class AliasReader {
   }
 
   bool make_room(const Token& alias) {
-    manager_.aliases = static_cast<Alias*>(allocate(words_ * sizeof(Alias)));
-    if (manager_.aliases != nullptr) return true;
-    LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for codepage %s, alias %s", kRecordSize, code_page_,
-             alias.text);
-    return false;
+    const size_t room = room_ == 0 ? expected_ : room_ * 2;
+    auto* more = static_cast<Alias*>(allocate(room * sizeof(Alias)));
+    if (more == nullptr) {
+      LX_TRACE(TRC1_LEVEL_ERROR, "Unable to allocate %d bytes for codepage %s, alias %s", kRecordSize, code_page_,
+               alias.text);
+      return false;
+    }
+    std::copy_n(manager_.aliases, room_, more);
+    Owned<Alias>(std::exchange(manager_.aliases, more));
+    room_ = room;
+    return true;
   }
 
   LXObjMgr& manager_;
-  size_t words_ = 0;
+  size_t expected_ = 0;  // records
+  size_t room_ = 0;
   const char* code_page_ = nullptr;
 };
 

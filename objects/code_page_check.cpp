@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 #include "objects/code_page_check.hpp"
 
+#include <algorithm>
 #include <cstring>
 #include <initializer_list>
 
@@ -48,6 +49,12 @@ struct Step {
   uint16_t index;
 };
 
+// The last byte whose masked value none before it has.
+unsigned last_distinct(const Step& step) {
+  const bool low_bits = (step.mask & (step.mask + 1)) == 0;
+  return low_bits ? std::min<unsigned>(step.high, step.low + step.mask) : step.high;
+}
+
 // Checks the walks from all states of `level` at once, byte by byte, every state once a byte: a walk may take
 // `max_depth` bytes. `read` gives a state, `leaf` judges one that ends a character.
 template <class Read, class Leaf>
@@ -58,7 +65,8 @@ bool walks_end(StateSet& level, uint32_t state_count, unsigned max_depth, Read r
     bool sound = level.all_of(state_count, [&](uint32_t number) {
       Step step = read(number);
       if (step.final) return leaf(step);
-      for (unsigned byte = step.low; byte <= step.high; ++byte) {
+      const unsigned last = last_distinct(step);
+      for (unsigned byte = step.low; byte <= last; ++byte) {
         uint32_t target = step.index + (byte & step.mask);
         if (target >= state_count) return false;
         next.insert(target);
