@@ -41,6 +41,7 @@ TEST(Aliases, OfAFile) {
       {"comment sign inside", "Latin1 l#1 #x\n", "L#1>Latin1 #X>Latin1 ", 0},
       {"line ends of other systems", "Latin1 l1\r\n iso\r\n\r\nGreek el\r\n", "L1>Latin1 ISO>Latin1 EL>Greek ", 0},
       {"no ASCII", "A \xE4\xC4z\nB \xE4\xC4z\n", "\xE4\xC4Z>A \xE4\xC4Z>B ", 0},
+      {"many short ones", "A b c d e f g h i j k l", "B>A C>A D>A E>A F>A G>A H>A I>A J>A K>A L>A ", 0},
       {"longest name", k32 + " x\n", "X>" + k32 + " ", 0},
       {"longest alias", "A " + k64 + " x\n", kUpper64 + ">A X>A ", 0},
       {"name too long", "A x\n" + k33 + " y\nB z\n", "X>A ", 1},
