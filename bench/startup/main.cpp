@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
-// What a short program pays before its first converted string, beside iconv and ICU: the time of a process that
-// converts one string, less the time of the same program when it ends at once. Exit status: 0; 1: above the aim or
-// slower than the faster peer; 2: it could not be measured.
+// What a short program pays before its first converted string, beside iconv and ICU: the time and the memory of a
+// process that converts one string, less those of the same program when it ends at once; and the memory of ten locales.
+// Exit status: 0; 1: above the aims or slower than the faster peer; 2: it could not be measured.
 #include <spawn.h>
 #include <sys/wait.h>
 #include <time.h>
@@ -9,6 +9,7 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstring>
+#include <string>
 #include <utility>
 #include <vector>
 
@@ -22,7 +23,8 @@ namespace {
 
 constexpr int kRepetitions = 400;
 constexpr int kQuickRepetitions = 60;
-constexpr double kAim = 100;  // microseconds
+constexpr double kAim = 100;      // microseconds
+constexpr long kMemoryAim = 500;  // kilobytes of its own
 
 double now() {
   timespec time = {};
@@ -41,6 +43,20 @@ double run(const char* program, const char* mode) {
   return now() - start;
 }
 
+// Kilobytes at the end of the process.
+struct Memory {
+  long resident = 0;
+  long own = 0;  // not shared with other processes
+};
+Memory memory(const char* program, const char* mode) {
+  std::FILE* pipe = popen((std::string("'") + program + "' " + mode + " memory").c_str(), "r");
+  Memory result;
+  const bool told = pipe != nullptr && std::fscanf(pipe, "%ld kB %ld", &result.resident, &result.own) == 2;
+  if (pipe != nullptr) pclose(pipe);
+  if (!told) std::fprintf(stderr, "bench_startup: %s does not tell its memory\n", program);
+  return result;
+}
+
 double median(std::vector<double> values) {
   std::nth_element(values.begin(), values.begin() + static_cast<std::ptrdiff_t>(values.size() / 2), values.end());
   return values[values.size() / 2];
@@ -54,7 +70,7 @@ struct Contender {
 
   bool measure() {
     empty.push_back(run(program, kEmpty));
-    working.push_back(run(program, "work"));
+    working.push_back(run(program, kWork));
     return empty.back() >= 0 && working.back() >= 0;
   }
   // Of neighbours in time, which share what else the machine is doing.
@@ -64,6 +80,23 @@ struct Contender {
     return median(std::move(differences));
   }
 };
+
+// Whether the aim is met.
+bool print_memory(const Contender& ours, const Contender& peer) {
+  std::printf("\nKilobytes more than the empty process: resident, and of these the process's own\n\n");
+  std::printf("| Program | One string converted | Ten locales used |\n| --- | ---: | ---: |\n");
+  bool met = true;
+  for (const Contender* contender : {&ours, &peer}) {
+    const Memory empty = memory(contender->program, kEmpty);
+    const Memory one = memory(contender->program, kWork);
+    const Memory ten = memory(contender->program, kTen);
+    std::printf("| %s | %ld, %ld | %ld, %ld |\n", contender->name, one.resident - empty.resident, one.own - empty.own,
+                ten.resident - empty.resident, ten.own - empty.own);
+    if (contender == &ours) met = one.own - empty.own <= kMemoryAim;
+  }
+  if (!met) std::printf("\nABOVE the aim of %ld KB\n", kMemoryAim);
+  return met;
+}
 
 int compare(int repetitions) {
   Contender contenders[] = {{"Lexaro", LEXARO_CHILD}, {"iconv", ICONV_CHILD}, {"ICU", ICU_CHILD}};
@@ -85,7 +118,8 @@ int compare(int repetitions) {
   bool slower = cost > std::min(contenders[1].cost(), contenders[2].cost());
   if (slower) std::printf("\nSLOWER than the faster peer: %.0f us\n", cost);
   if (cost > kAim) std::printf("\nABOVE the aim of %.0f us: %.0f us\n", kAim, cost);
-  return slower || cost > kAim ? 1 : 0;
+  const bool light = print_memory(contenders[0], contenders[2]);
+  return slower || cost > kAim || !light ? 1 : 0;
 }
 
 }  // namespace
