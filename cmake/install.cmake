@@ -23,7 +23,7 @@ install(FILES ${PROJECT_SOURCE_DIR}/data/NOTICE DESTINATION ${CMAKE_INSTALL_DATA
 install(FILES ${PROJECT_SOURCE_DIR}/docs/collation.md ${PROJECT_SOURCE_DIR}/docs/performance.md
   ${PROJECT_SOURCE_DIR}/docs/scaling.md DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/lexaro COMPONENT doc)
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/examples DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/lexaro COMPONENT doc
-  PATTERN ".git*" EXCLUDE)
+  USE_SOURCE_PERMISSIONS PATTERN ".git*" EXCLUDE)
 
 install(EXPORT LexaroTargets NAMESPACE Lexaro:: DESTINATION ${LEXARO_PACKAGE_DIR} COMPONENT dev)
 configure_package_config_file(${PROJECT_SOURCE_DIR}/cmake/LexaroConfig.cmake.in

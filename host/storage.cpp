@@ -3,7 +3,6 @@
 #include <lexaro/host.h>
 #include <pthread.h>
 
-#include <atomic>
 #include <cstddef>
 #include <cstdlib>
 
@@ -36,20 +35,19 @@ class FirstUse {
 void trace(int32_t line, const char* event, const char* source) {
   static TRC1_Unit unit{"Lexaro", "host", 0};
   TRC1_Sync(&unit);
-  if ((std::atomic_ref(unit.flags).load(std::memory_order_relaxed) & TRC1_LEVEL_INIT) == 0) return;
+  if ((__atomic_load_n(&unit.flags, __ATOMIC_RELAXED) & TRC1_LEVEL_INIT) == 0) return;
   TRC1_Printf(&unit, line, "%s for %s", event, source == nullptr ? "an unnamed caller" : source);
 }
 
 // What the host field of a descriptor returns once another thread may have set it, made by `make` on first use.
 template <typename Make>
 void* made_once(HSV1_Descriptor* descriptor, Make make) {
-  const std::atomic_ref<void*> host(descriptor->host);
-  if (void* made = host.load(std::memory_order_acquire); made != nullptr) return made;
+  if (void* made = __atomic_load_n(&descriptor->host, __ATOMIC_ACQUIRE); made != nullptr) return made;
   const FirstUse guard;
-  void* made = host.load(std::memory_order_relaxed);
+  void* made = __atomic_load_n(&descriptor->host, __ATOMIC_RELAXED);
   if (made == nullptr) {
     made = make();
-    host.store(made, std::memory_order_release);
+    __atomic_store_n(&descriptor->host, made, __ATOMIC_RELEASE);
   }
   return made;
 }

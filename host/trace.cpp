@@ -121,8 +121,8 @@ void append_dump_row(TraceLine& line, const unsigned char* bytes, size_t count) 
 
 [[gnu::weak]] void TRC1_Sync(TRC1_Unit* unit) noexcept {
   const uint32_t levels = lx::settings().levels;
-  const std::atomic_ref<uint32_t> flags(unit->flags);
-  if (flags.load(std::memory_order_relaxed) != levels) flags.store(levels, std::memory_order_relaxed);
+  if (__atomic_load_n(&unit->flags, __ATOMIC_RELAXED) != levels)
+    __atomic_store_n(&unit->flags, levels, __ATOMIC_RELAXED);
 }
 
 [[gnu::weak]] void TRC1_Event(TRC1_Unit* unit, int32_t line, uint32_t kind, const char* function,

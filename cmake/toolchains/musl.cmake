@@ -11,3 +11,7 @@ foreach(language C CXX)
   set(CMAKE_${language}_FLAGS_INIT "-target x86_64-linux-musl")
 endforeach()
 set(CMAKE_TRY_COMPILE_PLATFORM_VARIABLES ZIG)
+# What tells the processor's features stands in GCC's run-time library, which needs no C library, and is not in Zig's.
+execute_process(COMMAND g++ -print-libgcc-file-name OUTPUT_VARIABLE libgcc OUTPUT_STRIP_TRAILING_WHITESPACE)
+set(CMAKE_CXX_STANDARD_LIBRARIES ${libgcc})
+set(CMAKE_C_STANDARD_LIBRARIES ${libgcc})
