@@ -73,6 +73,7 @@ TEST_F(CommandLine, FileNamesAreTakenAsTheyAre) {
 TEST_F(CommandLine, HelpAndVersion) {
   EXPECT_EQ(run_tool("--version").output.rfind("lexaro 1.", 0), 0U);
   EXPECT_EQ(run_tool("help").output, run_tool("--help").output);
+  EXPECT_NE(run_tool("list sorts -h").output.find("What can be listed"), std::string::npos);
   const ToolResult help = run_tool("convert -h");
   EXPECT_EQ(help.output, run_tool("help convert").output);
   EXPECT_NE(help.output.find("Usage: lexaro"), std::string::npos) << help.output;

@@ -42,16 +42,22 @@ std::set<std::string> placeholders(const std::string& text) {
   return {std::sregex_token_iterator(text.begin(), text.end(), field), {}};
 }
 
-// All texts between quotes, neighbours joined, and those that are the first argument of message().
+// All texts between quotes, neighbours joined, and those that are meant for people: the first argument of message(),
+// and what has blanks among the arguments of functions that report something.
 void collect_literals(const fs::path& file, std::set<std::string>& all, std::set<std::string>& messages) {
+  static const std::regex words("[a-z]+ |\\} [a-z]");
+  static const std::regex report("\\b(error|fail|bad|need|require|word|check_alone|Fault|[A-Z][a-z]+Error)\\(");
   std::ostringstream content;
   content << std::ifstream(file).rdbuf();
   const std::string code = content.str();
   std::string joined;
   std::size_t end = 0;
+  std::string statement;  // up to here, without its texts
   bool is_message = false;
+  bool is_reported = false;
   const auto finish = [&] {
     all.insert(joined);
+    is_message = is_message || (is_reported && std::regex_search(joined, words));
     if (is_message && !joined.empty()) messages.insert(joined);
     joined.clear();
   };
@@ -60,7 +66,10 @@ void collect_literals(const fs::path& file, std::set<std::string>& all, std::set
     if (!raw && code[at - 1] == '\'' && (end = at + 1)) continue;  // the character '"'
     if (code.find_first_not_of(" \n", end) != at || end == 0) {
       finish();
-      is_message = at >= 8 && code.substr(0, code.find_last_not_of(" \n", at - 1) + 1).ends_with("message(");
+      statement += code.substr(end, at - end);
+      for (const char* begin : {";", "{\n", "}\n"}) statement.erase(0, statement.rfind(begin) + 1);
+      is_message = statement.substr(0, statement.find_last_not_of(" \n") + 1).ends_with("message(");
+      is_reported = std::regex_search(statement, report);
     }
     end = raw ? code.find(")\"", at) + 1 : at + 1;
     while (!raw && code[end] != '"') end += code[end] == '\\' ? 2 : 1;
@@ -68,6 +77,29 @@ void collect_literals(const fs::path& file, std::set<std::string>& all, std::set
     ++end;
   }
   finish();
+}
+
+// The texts in the help of a command and those below it: what it does, the lists' second column and the notes.
+void collect_help(const ToolInput& program, const Arguments& command, std::set<std::string>& texts) {
+  constexpr std::size_t kColumn = 30;
+  static const std::set<std::string> headings = {"Positionals:", "Options:", "Subcommands:"};
+  const std::string help = run_tool(command + "--help", program).output;
+  std::string list;
+  for (std::size_t at = 0, end = 0; at < help.size(); at = end + 1) {
+    end = help.find('\n', at);
+    const std::string line = help.substr(at, end - at);
+    if (at == 0) texts.insert(line);
+    if (headings.contains(line)) {
+      list = line;
+    } else if (!list.empty() && !line.empty() && line[0] != ' ') {
+      texts.insert(help.substr(at, help.size() - at - 1));
+      return;
+    } else if (!list.empty() && line.size() > kColumn && line[kColumn - 1] == ' ') {
+      texts.insert(line.substr(kColumn));
+      if (list != "Subcommands:") continue;
+      collect_help(program, command + Arguments{line.substr(2, line.find(' ', 2) - 2)}, texts);
+    }
+  }
 }
 
 TEST(MessageCatalogs, HoldTheTextsOfTheCodeInAllLanguages) {
@@ -78,6 +110,13 @@ TEST(MessageCatalogs, HoldTheTextsOfTheCodeInAllLanguages) {
       if (entry.path().extension() != ".txt") collect_literals(entry.path(), all, messages);
     }
   }
+  ToolInput program;
+  program.environment["LC_ALL"] = "C.UTF-8";
+  for (const char* path : {LEXARO_TOOL, LEXAROC_TOOL}) {
+    program.program = path;
+    collect_help(program, {}, messages);
+  }
+  EXPECT_TRUE(messages.contains("List the sort orders") && messages.contains("Check sources or compiled files"));
   Texts german = catalog("de");
   Texts japanese = catalog("ja");
   std::set<std::string> english;
@@ -96,10 +135,12 @@ TEST(MessageCatalogs, HoldTheTextsOfTheCodeInAllLanguages) {
 TEST_F(Messages, SpeakTheUsersLanguage) {
   const std::string broken = fs::path(write("lexaro", "no catalog")).parent_path();
   const std::string english = "there is no command \"x\"";
+  const std::string page = write("cp_00001.txt", "41 A\n41 B\nname X\n");
   const struct {
     Environment environment;
     Arguments arguments;
     std::string text;
+    const char* program = LEXARO_TOOL;
   } cases[] = {
       {{{"LANG", "de_DE.UTF-8"}}, "help x", "Es gibt keinen Befehl „x“"},
       {{{"LANG", "ja_JP.UTF-8"}}, "help x", "コマンド「x」はありません"},
@@ -111,10 +152,26 @@ TEST_F(Messages, SpeakTheUsersLanguage) {
       {{{"LANG", "de_DE.UTF-8"}}, "help", "Aufruf: lexaro [OPTIONEN] BEFEHL"},
       {{{"LANG", "ja_JP.eucJP"}}, "sort --help", bytes("B9D4A4F2A5EDA5B1A1BCA5EBA4CE")},
       {{}, "parse integer --base 16 FFFFFFFF", "the value does not fit into 32 bits"},
+      {{{"LANG", "de_DE.UTF-8"}}, "list sorts -h", "Was aufgelistet werden kann"},
+      {{{"LANG", "de_DE.UTF-8"}}, "convert -f", "--from: 1 Wert fehlt: FROM"},
+      {{{"LANG", "de_DE.UTF-8"}}, "locale --native --territory", "--territory ist nicht mit --native vereinbar"},
+      {{{"LANG", "ja_JP.UTF-8"}}, "convert --nl cr", "--nl: cr は {keep,lf,nel,crlf} のいずれでもありません"},
+      {{{"LANG", "ja_JP.UTF-8"}}, "sort --frob", "余分な引数です: --frob"},
+      {{{"LANG", "de_DE.UTF-8"}}, "", "Es fehlt ein Befehl\nMehr zeigt der Aufruf mit --help.\n", LEXAROC_TOOL},
+      {{{"LANG", "de_DE.UTF-8"}}, "data a", "OUTPUT_DIR fehlt", LEXAROC_TOOL},
+      {{{"LANG", "ja_JP.UTF-8"}}, "data --layout 3", "値 3 は 1 から 2 の範囲にありません", LEXAROC_TOOL},
+      {{{"LANG", "de_DE.UTF-8"}}, {"check", page}, ":2:4: die Bytes 41 sind doppelt angegeben\n", LEXAROC_TOOL},
+      {{{"LANG", "ja_JP.UTF-8"}}, {"check", page}, "「name」は文字より前に書きます", LEXAROC_TOOL},
+      // Columns, and help that is whole or English
+      {{{"LANG", "ja_JP.UTF-8"}}, "data -h", "\n  SOURCE_DIR TEXT 必須        ソース", LEXAROC_TOOL},
+      {{{"LANG", "ja_JP.eucJP"}}, "data -h", " TEXT " + bytes("C9ACBFDC") + "        " + bytes("A5BD"), LEXAROC_TOOL},
+      {{{"LANG", "de_DE.ISO-8859-1"}}, "data -h", "Verzeichnis der Quellen", LEXAROC_TOOL},
+      {{{"LANG", "de_DE.ISO-8859-1"}}, "catalog -h", "Compile a message catalog\nUsage", LEXAROC_TOOL},
   };
   for (const auto& one : cases) {
     ToolInput input;
     input.environment = one.environment;
+    input.program = one.program;
     const ToolResult result = run_tool(one.arguments, input);
     EXPECT_NE((result.output + result.errors).find(one.text), std::string::npos)
         << testing::PrintToString(one.environment) << " " << result.output << result.errors;

@@ -36,6 +36,7 @@ constexpr Listing kListings[] = {
 
 Command add_list_command(CLI::App& program) {
   CLI::App* app = program.add_subcommand("list", "List what the locale data hold");
+  app->footer(kExplanation);  // of the lists below it, too
   auto aliases = std::make_shared<bool>(false);
   auto json = std::make_shared<bool>(false);
   const auto add = [&](const char* name, const char* help) {
@@ -48,7 +49,6 @@ Command add_list_command(CLI::App& program) {
   std::vector<CLI::App*> lists;
   for (const Listing& listing : kListings) lists.push_back(add(listing.name, listing.help));
   app->require_subcommand(0, 1);
-  app->footer(kExplanation);
   return {app, [pages, lists, aliases, json](const CommonOptions& common) {
             if (pages->parsed()) return list_code_pages(common, *aliases, *json);
             for (std::size_t i = 0; i < lists.size(); ++i) {

@@ -47,16 +47,13 @@ Command add_help_command(CLI::App& program) {
   app->add_option("COMMAND", *topic, "A command of the program")->type_name("");
   return {app, [&program, topic](const CommonOptions&) {
             if (topic->empty()) {
-              translate_help(program);
-              // help() would answer for the command that was given, which is this one
-              print(program.get_formatter()->make_help(&program, "lexaro", CLI::AppFormatMode::Normal));
+              print(help_text(program, "lexaro"));
               return ExitStatus::kExact;
             }
             const auto named = [&](const CLI::App* command) { return command->get_name() == *topic; };
             const std::vector<CLI::App*> found = program.get_subcommands(named);
             if (found.empty()) throw usage_failure(message("there is no command \"{0}\"", display_name(*topic)));
-            translate_help(*found.front());
-            print(found.front()->help("lexaro"));
+            print(help_text(*found.front(), "lexaro " + *topic));
             return ExitStatus::kExact;
           }};
 }
@@ -66,13 +63,12 @@ ExitStatus report_parse_error(CLI::App& program, const CLI::ParseError& error) {
     if (dynamic_cast<const CLI::CallForVersion*>(&error)) {
       print(std::string(error.what()) + "\n");
     } else {
-      translate_help(program);
-      print(program.help());
+      print(requested_help(program));
     }
     return ExitStatus::kExact;
   }
   std::string command = "lexaro";
-  Message text = std::string(error.what());
+  Message text = parse_error_text(program, error);
   if (const auto unknown = program.remaining(); program.get_subcommands().empty() && !unknown.empty()) {
     text = message("there is no command or option \"{0}\"", display_name(unknown.front()));
   }

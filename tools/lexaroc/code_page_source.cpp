@@ -54,7 +54,7 @@ bool CodePageReader::read_header(Cursor& cursor) {
     cursor = start;
     return false;
   }
-  if (!page_.to_unicode.empty()) start.fail("\"" + key + "\" must stand before the characters");
+  if (!page_.to_unicode.empty()) start.fail(tool::message("\"{0}\" must stand before the characters", key));
   if (!seen_.insert(key).second) start.fail(tool::message("\"{0}\" is given twice", key));
   if (key == "id") {
     cursor.expect(U' ');
@@ -93,7 +93,7 @@ bool CodePageReader::read_header(Cursor& cursor) {
 }
 
 void CodePageReader::put(Spot spot, uint32_t unicode) {
-  auto fail = [&](const std::string& message) { throw SourceError(spot, message); };
+  auto fail = [&](const tool::Message& message) { throw SourceError(spot, message); };
   if (row_full_) fail("the row runs past the byte FF");
   if (unicode > 0xFFFF) fail("only characters up to U+FFFF are possible");
   if (unicode == kUnassigned) fail("U+FFFD stands for bytes that are no character");
@@ -102,12 +102,12 @@ void CodePageReader::put(Spot spot, uint32_t unicode) {
   if (page_.mixed()) {
     if (length == 1 && (first == page_.enter_byte || first == page_.leave_byte)) fail("a shift byte is no character");
   } else if (lengths_[first] != 0 && lengths_[first] != length) {
-    fail("the byte " + hex_text(first, 2) + " begins characters of different length");
+    fail(tool::message("the byte {0} begins characters of different length", hex_text(first, 2)));
   }
   lengths_[first] = static_cast<uint8_t>(length);
   if (length > 1 && (next_ & 0xFF) == 0) fail("a later byte of a character cannot be 00");
   if (!page_.to_unicode.emplace(next_, static_cast<uint16_t>(unicode)).second) {
-    fail("the bytes " + hex_text(next_, 2 * length) + " are given twice");
+    fail(tool::message("the bytes {0} are given twice", hex_text(next_, 2 * length)));
   }
   row_full_ = (next_ & 0xFF) == 0xFF;
   if (!row_full_) ++next_;
@@ -200,7 +200,7 @@ void CodePageReader::read_line(Cursor& cursor) {
 
 void CodePageReader::check_header() {
   for (const char* key : {"id", "name", "family", "kind", "substitution", "line-ends"}) {
-    require(seen_.count(key) != 0, source_.end(), std::string("\"") + key + "\" is missing");
+    require(seen_.count(key) != 0, source_.end(), tool::message("\"{0}\" is missing", key));
   }
   require(seen_.count("shift") == (page_.mixed() ? 1u : 0u), source_.end(),
           page_.mixed() ? "a mixed page needs \"shift\"" : "only a mixed page has \"shift\"");

@@ -65,9 +65,9 @@ class Distinct {
                   (element.spot.line == other.spot.line && element.spot.column > other.spot.column);
     Spot spot = second ? element.spot : other.spot;
     if (spot.line == 0) return;
-    throw SourceError(spot, element_name(second ? characters : other.characters) + " gets the weights that " +
-                                element_name(second ? other.characters : characters) +
-                                " has; write \"=\" if that is meant");
+    throw SourceError(spot, tool::message("{0} gets the weights that {1} has; write \"=\" if that is meant",
+                                          element_name(second ? characters : other.characters),
+                                          element_name(second ? other.characters : characters)));
   }
 
  private:

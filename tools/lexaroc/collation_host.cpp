@@ -38,9 +38,10 @@ class HostOrder {
     }
     constexpr size_t kMostTables = (65535 - sizeof(SortHeader)) / (256 * sizeof(SortWeight));
     if (sort_.tables.size() > kMostTables) {
-      throw SourceError(spot_, "the characters of the code page lie on " + std::to_string(sort_.tables.size()) +
-                                   " pages, and there is room for " + std::to_string(kMostTables) +
-                                   " tables: give pages that may follow their code points as \"block\"");
+      throw SourceError(spot_,
+                        tool::message("the characters of the code page lie on {0} pages, and there is room for {1} "
+                                      "tables: give pages that may follow their code points as \"block\"",
+                                      sort_.tables.size(), kMostTables));
     }
   }
 

@@ -55,17 +55,17 @@ class Numbering {
         secondary_[set.secondary];
         tertiary_[set.tertiary];
       }
-      if (secondary_.size() > kMostSmallWeights) throw SourceError(element->spot, too_many("secondary"));
-      if (tertiary_.size() > kMostSmallWeights) throw SourceError(element->spot, too_many("tertiary"));
+      if (secondary_.size() > kMostSmallWeights) {
+        throw SourceError(element->spot, "this needs one secondary weight more than the 255 that are possible");
+      }
+      if (tertiary_.size() > kMostSmallWeights) {
+        throw SourceError(element->spot, "this needs one tertiary weight more than the 255 that are possible");
+      }
     }
     uint8_t number = 0;
     for (auto& [rank, value] : secondary_) value = ++number;
     number = 0;
     for (auto& [rank, value] : tertiary_) value = ++number;
-  }
-
-  static std::string too_many(const char* level) {
-    return std::string("this needs one ") + level + " weight more than the 255 that are possible";
   }
 
   void primaries() {

@@ -17,8 +17,9 @@ std::u16string read_characters(Cursor& cursor) {
     characters.push_back(static_cast<char16_t>(read_character(cursor)));
   } while (!cursor.done() && cursor.peek() != U' ' && cursor.peek() != U'/');
   if (characters.size() > kMostCharacters) {
-    throw SourceError(spot, std::to_string(characters.size()) +
-                                " characters cannot be weighed together: the format knows single characters and pairs");
+    throw SourceError(spot, tool::message("{0} characters cannot be weighed together: the format knows single "
+                                          "characters and pairs",
+                                          characters.size()));
   }
   return characters;
 }
@@ -80,10 +81,11 @@ WeightSets Tailoring::sets_of(const std::u16string& characters, Spot spot) const
   for (char16_t c : characters) {
     auto found = collation_.characters.find(c);
     if (found == collation_.characters.end()) {
+      const std::string name = unicode_name(c);
       throw SourceError(
-          spot, unicode_name(c) + (collation_.is_tabulated(c)
-                                       ? " has only a special weight: nothing can be placed after it"
-                                       : " gets its weight from its code point: nothing can be placed after it"));
+          spot, collation_.is_tabulated(c)
+                    ? tool::message("{0} has only a special weight: nothing can be placed after it", name)
+                    : tool::message("{0} gets its weight from its code point: nothing can be placed after it", name));
     }
     sets.insert(sets.end(), found->second.sets.begin(), found->second.sets.end());
   }
@@ -160,9 +162,11 @@ LetterCase Tailoring::case_of(const std::u16string& characters) const {
 void Tailoring::assign(const std::u16string& characters, const Element& element) {
   size_t room = characters.size() == 1 ? kMostSets : 1;
   if (element.sets.size() > room) {
-    throw SourceError(element.spot, std::string(room == 1 ? "a pair" : "a character") + " can have " +
-                                        (room == 1 ? "one weight set" : "two weight sets") + ", and this would have " +
-                                        std::to_string(element.sets.size()));
+    const size_t count = element.sets.size();
+    throw SourceError(element.spot,
+                      room == 1
+                          ? tool::message("a pair can have one weight set, and this would have {0}", count)
+                          : tool::message("a character can have two weight sets, and this would have {0}", count));
   }
   if (characters.size() == 2) {
     auto [found, added] = collation_.pairs.emplace(CharacterPair(characters[0], characters[1]), element);

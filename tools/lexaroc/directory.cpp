@@ -53,10 +53,11 @@ std::vector<DirectoryEntry> unpack_directory(std::string_view section) {
   std::vector<DirectoryEntry> entries;
   for (size_t offset = 0; section.size() - offset >= sizeof(DirectoryRecord); offset += sizeof(DirectoryRecord)) {
     auto record = record_at<DirectoryRecord>(section, offset);
-    std::string where = "record " + std::to_string(entries.size() + 1);
-    if (record.type >= kObjectTypes) throw StructureError(where + " has an unknown object type");
+    size_t number = entries.size() + 1;
+    if (record.type >= kObjectTypes)
+      throw StructureError(tool::message("record {0} has an unknown object type", number));
     const void* end = std::memchr(record.name, 0, sizeof record.name);
-    if (end == nullptr) throw StructureError(where + " has a name without end");
+    if (end == nullptr) throw StructureError(tool::message("record {0} has a name without end", number));
     entries.push_back({static_cast<ObjectType>(record.type), record.id, std::string(record.name)});
   }
   return entries;

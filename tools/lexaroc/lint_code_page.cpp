@@ -27,7 +27,8 @@ class PageLint {
 
   void expect(Code code, uint16_t unicode) {
     if (page_.unicode_of(code) != unicode || page_.exact_code(unicode) != code) {
-      error("on every page of this family, " + hex_text(code, 2) + " is " + unicode_name(unicode) + ", both ways");
+      error(tool::message("on every page of this family, {0} is {1}, both ways", hex_text(code, 2),
+                          unicode_name(unicode)));
     }
   }
 
@@ -51,25 +52,25 @@ class PageLint {
     for (unsigned i = 0; i < page_.line_bytes.size(); ++i) {
       uint8_t byte = page_.line_bytes[i];
       if (byte == 0 || page_.unicode_of(byte) == kUnassigned)
-        error("line end " + hex_text(byte, 2) + " is no character");
+        error(tool::message("line end {0} is no character", hex_text(byte, 2)));
       for (unsigned j = 0; j < i; ++j) {
-        if (page_.line_bytes[j] == byte) error("line end " + hex_text(byte, 2) + " is given twice");
+        if (page_.line_bytes[j] == byte) error(tool::message("line end {0} is given twice", hex_text(byte, 2)));
       }
-      check_alone(byte, "line end");
+      check_alone(byte, "line end {0} is part of the character {1}");
     }
-    check_alone(page_.substitution, "substitution byte");
+    check_alone(page_.substitution, "substitution byte {0} is part of the character {1}");
     if (page_.mixed()) {
-      check_alone(page_.enter_byte, "shift byte");
-      check_alone(page_.leave_byte, "shift byte");
+      for (uint8_t byte : {page_.enter_byte, page_.leave_byte}) {
+        check_alone(byte, "shift byte {0} is part of the character {1}");
+      }
     }
   }
 
-  void check_alone(uint8_t byte, const char* what) {
+  void check_alone(uint8_t byte, const char* error_text) {
     for (auto at = page_.to_unicode.lower_bound(0x100); at != page_.to_unicode.end(); ++at) {
       for (unsigned i = 0, length = code_length(at->first); i < length; ++i) {
         if (code_byte(at->first, length, i) != byte) continue;
-        error(std::string(what) + " " + hex_text(byte, 2) + " is part of the character " +
-              hex_text(at->first, 2 * length));
+        error(tool::message(error_text, hex_text(byte, 2), hex_text(at->first, 2 * length)));
         return;
       }
     }

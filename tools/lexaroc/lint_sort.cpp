@@ -28,31 +28,33 @@ class SortLint {
 
   void check_page(unsigned page) {
     const SortPageRule& rule = sort_.pages[page];
-    std::string name = "page " + hex_text(page, 2);
-    if (rule.kind == SortPageKind::empty) error(name + " has no weights");
+    tool::Message name = tool::message("page {0}", hex_text(page, 2));
+    if (rule.kind == SortPageKind::empty) error(tool::message("{0} has no weights", name));
     if (rule.kind == SortPageKind::primary) check_primary(rule.base, name);
-    if (rule.kind == SortPageKind::special && rule.base == 0) error(name + " begins with a special weight 0");
+    if (rule.kind == SortPageKind::special && rule.base == 0)
+      error(tool::message("{0} begins with a special weight 0", name));
     bool by_base = rule.kind == SortPageKind::primary || rule.kind == SortPageKind::special;
-    if (by_base && rule.base > 0x10000 - 256) error(name + " runs past the weight FFFF");
+    if (by_base && rule.base > 0x10000 - 256) error(tool::message("{0} runs past the weight FFFF", name));
   }
 
   // Zero bytes end the levels of a sort key.
-  void check_primary(unsigned primary, const std::string& name) {
-    if (primary < kFirstPrimary) error(name + " has a primary weight below " + hex_text(kFirstPrimary, 4));
+  void check_primary(unsigned primary, const tool::Message& name) {
+    if (primary < kFirstPrimary)
+      error(tool::message("{0} has a primary weight below {1}", name, hex_text(kFirstPrimary, 4)));
   }
 
-  void check_set(const SortSet& set, const std::string& name) {
+  void check_set(const SortSet& set, const tool::Message& name) {
     if (set.primary != 0) check_primary(set.primary, name);
-    if (set.secondary == 0 || set.tertiary == 0) error(name + " lacks a secondary or tertiary weight");
+    if (set.secondary == 0 || set.tertiary == 0) error(tool::message("{0} lacks a secondary or tertiary weight", name));
     if (set.secondary != 0) smallest_.secondary = std::min(smallest_.secondary, set.secondary);
     if (set.tertiary != 0) smallest_.tertiary = std::min(smallest_.tertiary, set.tertiary);
   }
 
-  void check_weights(const SortEntry& entry, const std::string& name) {
+  void check_weights(const SortEntry& entry, const tool::Message& name) {
     if (!entry.special) {
       check_set({entry.weight, entry.secondary, entry.tertiary}, name);
     } else if (entry.weight == 0) {
-      error(name + " has no weights");
+      error(tool::message("{0} has no weights", name));
     }
   }
 
@@ -68,16 +70,17 @@ class SortLint {
 
   void check_expansion(size_t i) {
     const SortExpansionRow& row = sort_.expansions[i];
-    std::string name = "the expansion of " + unicode_name(row.character);
-    if (i > 0 && row.character <= sort_.expansions[i - 1].character) error(name + " is out of order");
+    tool::Message name = tool::message("the expansion of {0}", unicode_name(row.character));
+    if (i > 0 && row.character <= sort_.expansions[i - 1].character) error(tool::message("{0} is out of order", name));
     auto table = sort_.tables.find(row.character >> 8);
-    if (table == sort_.tables.end() || !table->second[row.character & 0xFF].expands) error(name + " is never read");
+    if (table == sort_.tables.end() || !table->second[row.character & 0xFF].expands)
+      error(tool::message("{0} is never read", name));
     for (const SortSet& set : row.sets) check_set(set, name);
   }
 
   void check_pair(const SortPairRow& row) {
-    std::string name = "the pair " + unicode_name(row.first) + " " + unicode_name(row.second);
-    if (!pairs_.insert({row.first, row.second}).second) error(name + " is given twice");
+    tool::Message name = tool::message("the pair {0} {1}", unicode_name(row.first), unicode_name(row.second));
+    if (!pairs_.insert({row.first, row.second}).second) error(tool::message("{0} is given twice", name));
     check_weights(row.weights, name);
   }
 

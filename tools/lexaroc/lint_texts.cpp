@@ -121,19 +121,21 @@ Spot spot_of(const T& object, const std::string& key) {
 }
 
 // Formats consist of characters and the directives that the time functions know.
-std::string format_fault(const std::u16string& format, bool number_sign_allowed) {
+tool::Message format_fault(const std::u16string& format, bool number_sign_allowed) {
   constexpr std::u16string_view kDirectives = u"aAbBcdHIjmMpSUwWxXyY%", kFormatsThemselves = u"cxX";
-  if (format.empty()) return "a format is needed";
+  if (format.empty()) return tool::message("a format is needed");
   for (size_t i = 0; i < format.size(); ++i) {
     if (format[i] != u'%') continue;
     bool number_sign = ++i < format.size() && format[i] == u'#';
     if (number_sign) ++i;
-    if (i == format.size() || kDirectives.find(format[i]) == std::u16string_view::npos) return "an unknown directive";
+    if (i == format.size() || kDirectives.find(format[i]) == std::u16string_view::npos)
+      return tool::message("an unknown directive");
     if (kFormatsThemselves.find(format[i]) != std::u16string_view::npos)
-      return "%c, %x and %X stand for these formats and cannot be part of one";
-    if (number_sign && !number_sign_allowed) return "\"#\" cannot be used: the host page of this territory moves it";
+      return tool::message("%c, %x and %X stand for these formats and cannot be part of one");
+    if (number_sign && !number_sign_allowed)
+      return tool::message("\"#\" cannot be used: the host page of this territory moves it");
   }
-  return "";
+  return {};
 }
 
 // Group sizes with ";" between them, the last one 0.
@@ -156,7 +158,7 @@ bool is_capitals(const std::u16string& text, size_t length) {
 }  // namespace
 
 void lint_territory(const Territory& territory, Report& report) {
-  auto error = [&](const std::string& key, const std::string& message) {
+  auto error = [&](const std::string& key, const tool::Message& message) {
     report.error(territory.file, spot_of(territory, key), message);
   };
   for (unsigned i = 0; i < kSeparators; ++i) {
@@ -176,7 +178,7 @@ void lint_territory(const Territory& territory, Report& report) {
   bool number_sign =
       std::find(std::begin(kMovedNumberSign), std::end(kMovedNumberSign), territory.id) == std::end(kMovedNumberSign);
   for (TerritoryText which : {TerritoryText::time_format, TerritoryText::short_date, TerritoryText::long_date}) {
-    std::string fault = format_fault(territory.text(which), number_sign);
+    tool::Message fault = format_fault(territory.text(which), number_sign);
     if (!fault.empty()) error(kTerritoryTextKeys[static_cast<unsigned>(which)], fault);
   }
   for (TerritoryText which : {TerritoryText::grouping, TerritoryText::monetary_grouping}) {
@@ -218,7 +220,7 @@ class TreeLint {
   void default_ids(const Language& language) {
     auto need = [&](const char* key, ObjectType type, uint16_t id) {
       if (!has_id(entries_, type, id)) {
-        report_.error(language.file, spot_of(language, key), std::string("there is no such ") + type_name(type));
+        report_.error(language.file, spot_of(language, key), tool::message("there is no such {0}", type_name(type)));
       }
     };
     need("default-territory", ObjectType::territory, language.default_territory);
@@ -228,7 +230,7 @@ class TreeLint {
 
   // Programs show the names, and find the day or month in a date by the name that stands there.
   void names(const Language& language) {
-    auto error = [&](const std::string& key, const std::string& message) {
+    auto error = [&](const std::string& key, const tool::Message& message) {
       report_.error(language.file, spot_of(language, key), message);
     };
     std::map<std::pair<std::string, std::u16string>, std::string> keys;  // by kind of name ("day") and name
@@ -240,7 +242,7 @@ class TreeLint {
         error(key, "a text is needed");
       } else if (dot != std::string::npos) {
         auto [same, added] = keys.emplace(std::pair(key.substr(0, dot), *named.text), key);
-        if (!added) error(key, "the same name as " + same->second);
+        if (!added) error(key, tool::message("the same name as {0}", same->second));
       }
     }
     if (!is_capitals(language.texts[0], 2)) error("abbreviation", "expected two capitals");
@@ -250,7 +252,8 @@ class TreeLint {
   void representable(const T& object, const CodePage& page) {
     for (const NamedText& named : texts_of(object)) {
       if (char16_t c = lacking(page, *named.text)) {
-        report_.error(object.file, spot_of(object, named.key), unicode_name(c) + " does not exist in " + page.name);
+        report_.error(object.file, spot_of(object, named.key),
+                      tool::message("{0} does not exist in {1}", unicode_name(c), page.name));
       }
     }
   }
@@ -259,7 +262,7 @@ class TreeLint {
   const T* need_named(ObjectType type, const std::vector<T>& objects, const std::string& name) {
     const T* object = find_named(objects, name);
     // There is no line to name, only the place where the object is missing.
-    if (object == nullptr) report_.error(tree_.folder(type), "no object has the name \"" + name + "\"");
+    if (object == nullptr) report_.error(tree_.folder(type), tool::message("no object has the name \"{0}\"", name));
     return object;
   }
 
@@ -285,7 +288,7 @@ class TreeLint {
       for (const CodePage& page : tree_.code_pages) {
         if (lacking(page, *named.text) != 0 || encoded_length(page, *named.text) <= longest) continue;
         report_.error(object.file, spot_of(object, named.key),
-                      "longer than " + std::to_string(longest) + " bytes in " + page.name);
+                      tool::message("longer than {0} bytes in {1}", longest, page.name));
         break;
       }
     }
@@ -293,17 +296,19 @@ class TreeLint {
 
   void aliases() {
     for (const Alias& alias : tree_.aliases) {
-      auto error = [&](const std::string& message) { report_.error(tree_.alias_file, alias.spot, message); };
+      auto error = [&](const tool::Message& message) { report_.error(tree_.alias_file, alias.spot, message); };
       const CodePage* page = find_named(tree_.code_pages, alias.code_page);
       if (page == nullptr) {
-        error("there is no code page \"" + alias.code_page + "\"");
+        error(tool::message("there is no code page \"{0}\"", alias.code_page));
         continue;
       }
       for (const CodePage& other : tree_.code_pages) {
         if (&other == page) continue;
         if (folded(other.name) == folded(alias.alias))
-          error("\"" + alias.alias + "\" is the name of another code page");
-        if (std::to_string(other.id) == alias.alias) error(alias.alias + " is the number of another code page");
+          error(tool::message("\"{0}\" is the name of another code page", alias.alias));
+        if (std::to_string(other.id) == alias.alias) {
+          error(tool::message("{0} is the number of another code page", alias.alias));
+        }
       }
     }
   }

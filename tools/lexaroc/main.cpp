@@ -13,6 +13,7 @@
 #include "dump.hpp"
 #include "object_file.hpp"
 #include "tools/lexaro/failure.hpp"
+#include "tools/lexaro/help.hpp"
 
 namespace {
 
@@ -79,6 +80,16 @@ int run_builtin(const fs::path& sources, const fs::path& output) {
   return kDone;
 }
 
+int answer_parse_error(const CLI::App& app, const CLI::ParseError& error) {
+  if (error.get_exit_code() == 0) {  // --help comes as an error too
+    std::cout << lx::tool::requested_help(app) << std::flush;
+    return kDone;
+  }
+  std::cerr << lx::tool::parse_error_text(app, error).shown << '\n'
+            << lx::tool::message("Run with {0} for more information.", "--help").shown << '\n';
+  return kBadUsage;
+}
+
 int run(int argc, char** argv) {
   CLI::App app("Compiler of locale data and message catalogs");
   app.require_subcommand(1);
@@ -131,7 +142,7 @@ int run(int argc, char** argv) {
   try {
     app.parse(argc, argv);
   } catch (const CLI::ParseError& error) {
-    return app.exit(error) == 0 ? kDone : kBadUsage;
+    return answer_parse_error(app, error);
   }
   return result;
 }

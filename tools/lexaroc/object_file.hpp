@@ -40,7 +40,7 @@ ObjectFile split_object_file(std::string_view bytes);
 template <class T>
 T record_at(std::string_view section, size_t offset) {
   if (offset > section.size() || section.size() - offset < sizeof(T)) {
-    throw StructureError("a record at offset " + std::to_string(offset) + " is not inside its section");
+    throw StructureError(tool::message("a record at offset {0} is not inside its section", offset));
   }
   T record;
   section.copy(reinterpret_cast<char*>(&record), sizeof record, offset);

@@ -66,10 +66,9 @@ std::string pack_sort(const SortObject& sort) {
   size_t combinations = expansions + sort.expansions.size() * sizeof(SortExpansion);
   size_t size = combinations + sort.pairs.size() * sizeof(SortCombination);
   if (size > kLargestSection) {
-    throw PackError("the sort object would have " + std::to_string(size) + " bytes (" +
-                    std::to_string(sort.tables.size()) + " tables, " + std::to_string(sort.expansions.size()) +
-                    " expansions, " + std::to_string(sort.pairs.size()) + " pairs); " +
-                    std::to_string(kLargestSection) + " are possible");
+    throw PackError(
+        tool::message("the sort object would have {0} bytes ({1} tables, {2} expansions, {3} pairs); {4} are possible",
+                      size, sort.tables.size(), sort.expansions.size(), sort.pairs.size(), kLargestSection));
   }
   SortHeader header{};
   header.default_secondary = sort.default_secondary;

@@ -184,8 +184,8 @@ SortObject SortWeightsReader::take(Spot end) {
     if (!stated_[page]) throw SourceError(end, tool::message("page {0} is missing", hex_text(page, 2)));
   }
   if (seen_count_ != sort_.tables.size() * 256) {
-    throw SourceError(end, std::to_string(sort_.tables.size() * 256 - seen_count_) +
-                               " characters of the pages with tables are missing");
+    throw SourceError(end, tool::message("{0} characters of the pages with tables are missing",
+                                         sort_.tables.size() * 256 - seen_count_));
   }
   return std::move(sort_);
 }

@@ -22,7 +22,8 @@ std::vector<T> read_objects(const fs::path& directory, ObjectType type, const st
     if (type == ObjectType::sort && path.filename() == kCollationRootFile) continue;
     auto expected = parse_object_stem(path.stem().string());
     if (!expected || expected->type != type) {
-      report.error(path.string(), {}, "the file name is not of the form " + object_stem(type, 0) + ".txt");
+      report.error(path.string(), {},
+                   tool::message("the file name is not of the form {0}", object_stem(type, 0) + ".txt"));
       continue;
     }
     if (!only.empty() && only.count(expected->id) == 0) continue;

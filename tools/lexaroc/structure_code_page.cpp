@@ -7,39 +7,43 @@ namespace lx::compiler {
 
 namespace {
 
-void require(bool condition, const std::string& message) {
-  if (!condition) throw StructureError(message);
+void require(bool condition, const char* error_text) {
+  if (!condition) throw StructureError(error_text);
 }
 
 // Follows every path of one walk.
 class Walk {
  public:
-  Walk(const char* name, const std::vector<Step>& states, size_t elements, unsigned longest)
+  Walk(const tool::Message& name, const std::vector<Step>& states, size_t elements, unsigned longest)
       : name_(name), states_(states), elements_(elements), longest_(longest), depths_(states.size()) {}
 
   // Bytes of the longest path that begins with this byte.
   unsigned depth_of_first(uint8_t byte) {
-    require(!states_.empty(), std::string(name_) + " has no states");
+    require(!states_.empty(), "{0} has no states");
     const Step& start = states_[0];
     return byte < start.low || byte > start.high ? 1 : depth_behind(start, byte, 1);
   }
 
  private:
+  void require(bool condition, const char* error_text) const {
+    if (!condition) throw StructureError(tool::message(error_text, name_));
+  }
+
   unsigned depth_behind(const Step& step, unsigned byte, unsigned level) {
     size_t target = size_t{step.index} + (byte & step.mask);
     if (step.final) {
-      require(target < elements_, std::string(name_) + " leaves its table of results");
+      require(target < elements_, "{0} leaves its table of results");
       return 1;
     }
-    require(target < states_.size(), std::string(name_) + " leaves its states");
-    require(level < longest_, std::string(name_) + " takes more bytes than a character has");
+    require(target < states_.size(), "{0} leaves its states");
+    require(level < longest_, "{0} takes more bytes than a character has");
     return 1 + depth_from(target, level + 1);
   }
 
   unsigned depth_from(size_t state, unsigned level) {
     unsigned& depth = depths_[state];
     if (depth != 0) {
-      require(level + depth - 1 <= longest_, std::string(name_) + " takes more bytes than a character has");
+      require(level + depth - 1 <= longest_, "{0} takes more bytes than a character has");
       return depth;
     }
     unsigned deepest = 1;
@@ -50,7 +54,7 @@ class Walk {
     return depths_[state] = deepest;
   }
 
-  const char* name_;
+  tool::Message name_;
   const std::vector<Step>& states_;
   size_t elements_;
   unsigned longest_;
@@ -117,10 +121,11 @@ void check_code_page_image(const CodePageImage& image) {
   check_widths(image);
   unsigned longest = image.header.max_length;
   if (!image.by_rule()) {
-    check_walk(image, Walk("the to-Unicode walk", image.states, image.to_unicode.size(), longest), true);
+    check_walk(image, Walk(tool::message("the to-Unicode walk"), image.states, image.to_unicode.size(), longest), true);
   }
   if (image.header.type_states != 0) {
-    check_walk(image, Walk("the type walk", image.type_states, image.type_entries.size(), longest), false);
+    check_walk(image, Walk(tool::message("the type walk"), image.type_states, image.type_entries.size(), longest),
+               false);
   }
 }
 

@@ -13,7 +13,7 @@ AmountForm read_amount_form(Cursor& cursor) {
   AmountForm form;
   auto field = [&cursor](const char* name, unsigned largest) {
     std::string prefix = std::string(name) + " ";
-    if (!cursor.accept(prefix)) cursor.fail("expected \"" + prefix + "N\"");
+    if (!cursor.accept(prefix)) cursor.fail(tool::message("expected \"{0}\"", prefix + "N"));
     return cursor.decimal(largest);
   };
   form.symbol_precedes = field("precedes", 1) != 0;
