@@ -10,6 +10,7 @@ set(CMAKE_CXX_COMPILER ${ZIG} c++)
 foreach(language C CXX)
   set(CMAKE_${language}_FLAGS_INIT "-target x86_64-linux-musl")
 endforeach()
+set(CMAKE_CROSSCOMPILING_EMULATOR /usr/bin/env)  # it is this machine's code
 set(CMAKE_TRY_COMPILE_PLATFORM_VARIABLES ZIG)
 # What tells the processor's features stands in GCC's run-time library, which needs no C library, and is not in Zig's.
 execute_process(COMMAND g++ -print-libgcc-file-name OUTPUT_VARIABLE libgcc OUTPUT_STRIP_TRAILING_WHITESPACE)

@@ -144,14 +144,15 @@ TEST(NumbersRead, SeparatorsOfLocales) {
       {"Swedish_Sweden", u"1 234,5", 1, 1},
       {"Polish_Poland", u"1,5", 1.5, 3},
       {"Japanese_Japan", u"1,234.5", 1234.5, 7}};
-  for (auto [name, text, value, end] : kTexts) {
-    auto expect = [name = name, text = text, value = value, end = end](const Form& form, LXLocale* locale) {
+  for (const auto& each : kTexts) {
+    auto expect = [&each](const Form& form, LXLocale* locale) {
+      const auto& [name, text, value, end] = each;
       if (!can_be_spelled(form, text)) return;
       for (uint32_t flags : {0u, LX_NUM_TEXTOPT | kMoney}) {  // the separators of money have been changed
         EXPECT_EQ(read(form, locale, spelled(form, text), kDecimal, flags), (Reading{value, end, LX_OK, 0})) << name;
       }
     };
-    for_each_form(expect, name);
+    for_each_form(expect, std::get<0>(each));
   }
 }
 

@@ -257,7 +257,7 @@ TEST(CatalogFaults, DamagedFiles) {
   // Sets may have the same messages, but not so many that checking them takes far longer than reading the file.
   std::vector<std::pair<uint32_t, std::string>> messages;
   for (uint32_t i = 1; i <= 100; ++i) messages.emplace_back(i, "x");
-  for (uint32_t sets : {2, 14, 15}) {
+  for (uint32_t sets : {2u, 14u, 15u}) {
     std::string image = catalog_image("English_UnitedStates.Small@BINARY", {{1, messages}});
     image[12 + 3 * (LXMcGetByteOrder() == 1)] = static_cast<char>(sets);
     std::memcpy(image.data() + 156, std::array{152u}.data(), 4);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-// A variable of the environment, set (or removed: null) as long as the object lives.
+// The environment of a test: its variables, and what the C library makes of them.
 #pragma once
 
 #include <cstdlib>
@@ -7,6 +7,14 @@
 
 namespace lx::test {
 
+#ifdef __GLIBC__
+inline constexpr bool kSystemHasLocales = true;
+#else
+inline constexpr bool kSystemHasLocales = false;
+#endif
+inline constexpr char kOneLocale[] = "the C library has one locale, in UTF-8, for all names";
+
+// Set (or removed: null) as long as the object lives.
 class Variable {
  public:
   Variable(const char* name, const char* value) : name_(name), had_(std::getenv(name) != nullptr) {

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 // Message catalogs shown by the tool.
+#include "tests/support/environment.hpp"
 #include "tests/tool/tool_runner.hpp"
 
 namespace lx::test {
@@ -8,6 +9,7 @@ namespace {
 using Catalogs = ToolTest;
 
 TEST_F(Catalogs, AreShownInTheEncodingOfTheTerminal) {
+  if (!kSystemHasLocales) GTEST_SKIP() << kOneLocale;
   const std::string source = write("m.msg", "$quote \"\n$set 2\n1 \"one\\n\"\n7 \"Grüße\\\\\"\n$set 9\n1 \"x\"\n");
   const std::string catalog = path("m.cat");
   ToolInput compile;

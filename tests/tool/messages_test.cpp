@@ -6,6 +6,7 @@
 #include <set>
 #include <sstream>
 
+#include "tests/support/environment.hpp"
 #include "tests/tool/tool_runner.hpp"
 
 namespace lx::test {
@@ -133,6 +134,7 @@ TEST(MessageCatalogs, HoldTheTextsOfTheCodeInAllLanguages) {
 }
 
 TEST_F(Messages, SpeakTheUsersLanguage) {
+  if (!kSystemHasLocales) GTEST_SKIP() << kOneLocale;
   const std::string broken = fs::path(write("lexaro", "no catalog")).parent_path();
   const std::string english = "there is no command \"x\"";
   const std::string page = write("cp_00001.txt", "41 A\n41 B\nname X\n");

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: Apache-2.0
-#include <charconv>
 #include <limits>
+#include <locale>
 #include <memory>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -87,13 +88,13 @@ struct InCodePage {
   }
 };
 
+// As in C on the plain side, whatever the user's locale.
 template <class Number>
 std::optional<Number> read_number(const std::string& text) {
+  std::istringstream in(text);
+  in.imbue(std::locale::classic());
   Number number{};
-  const char* begin = text.data() + (text.starts_with('+') ? 1 : 0);
-  const char* end = text.data() + text.size();
-  const auto result = std::from_chars(begin, end, number);
-  if (result.ec != std::errc() || result.ptr != end) return std::nullopt;
+  if (!(in >> std::noskipws >> number) || in.peek() != std::istringstream::traits_type::eof()) return std::nullopt;
   return number;
 }
 
