@@ -50,7 +50,7 @@ void collect_literals(const fs::path& file, std::set<std::string>& all, std::set
   static const std::regex report("\\b(error|fail|bad|need|require|word|check_alone|Fault|[A-Z][a-z]+Error)\\(");
   std::ostringstream content;
   content << std::ifstream(file).rdbuf();
-  const std::string code = content.str();
+  const std::string code = std::regex_replace(content.str(), std::regex("\n *//[^\n]*"), "\n");
   std::string joined;
   std::size_t end = 0;
   std::string statement;  // up to here, without its texts
@@ -73,7 +73,8 @@ void collect_literals(const fs::path& file, std::set<std::string>& all, std::set
       is_reported = std::regex_search(statement, report);
     }
     end = raw ? code.find(")\"", at) + 1 : at + 1;
-    while (!raw && code[end] != '"') end += code[end] == '\\' ? 2 : 1;
+    while (!raw && end < code.size() && code[end] != '"') end += code[end] == '\\' ? 2 : 1;
+    ASSERT_LT(end, code.size()) << file << ": a text without end";
     joined += raw ? code.substr(at + 2, end - at - 3) : unescaped(code.substr(at + 1, end - at - 1));
     ++end;
   }
