@@ -2,6 +2,8 @@
 // The environment of a test: its variables, and what the C library makes of them.
 #pragma once
 
+#include <locale.h>
+
 #include <cstdlib>
 #include <string>
 
@@ -13,6 +15,13 @@ inline constexpr bool kSystemHasLocales = true;
 inline constexpr bool kSystemHasLocales = false;
 #endif
 inline constexpr char kOneLocale[] = "the C library has one locale, in UTF-8, for all names";
+
+// Not on an emulated machine of another byte order: it finds the files of this machine, and cannot read them.
+inline bool system_has(const char* locale) {
+  const locale_t found = newlocale(LC_ALL_MASK, locale, nullptr);
+  if (found != nullptr) freelocale(found);
+  return found != nullptr;
+}
 
 // Set (or removed: null) as long as the object lives.
 class Variable {

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 // What comes out of a conversion.
+#include "tests/support/environment.hpp"
 #include "tests/tool/tool_runner.hpp"
 
 namespace lx::test {
@@ -38,9 +39,11 @@ TEST_F(ConvertText, WhatCannotBeConverted) {
   expect_conversion("-f UTF-8 -c", "41 E3 81", "41", 1, "cut off");
   expect_conversion("-f UTF-8", "C0 80", "EF BF BD EF BF BD", 1, "2 malformed");
   expect_conversion("-f IBM930", "0E 4481", "E3 81 82", 1, "1 unbalanced shift");
-  expect_conversion(
-      "-t 37", "E2 82 AC FF E2 82 AC FE", "3F 3F 3F 3F", 1,
-      "2 characters replaced (first at byte 0: U+20AC \"€\"), 2 malformed sequences (first at byte 3: X'FF')");
+  // The C library knows which characters can be shown.
+  const std::string euro = system_has("C.UTF-8") ? "U+20AC \"€\"" : "U+20AC";
+  const std::string all =
+      "2 characters replaced (first at byte 0: " + euro + "), 2 malformed sequences (first at byte 3: X'FF')";
+  expect_conversion("-t 37", "E2 82 AC FF E2 82 AC FE", "3F 3F 3F 3F", 1, all.c_str());
 }
 
 // Next line, line feed, carriage return and line feed, and a lone carriage return, in three families of pages.

@@ -148,19 +148,20 @@ TEST_F(Locale, WithoutData) {
   if (!kSystemHasLocales) GTEST_SKIP() << kOneLocale;
   // A program that stands alone finds no data beside it, only the library that the linker is told of.
   fs::create_directory(path("bin"));
-  fs::copy(LEXARO_TOOL, path("bin/lexaro"));
+  fs::copy(LEXARO_TOOL_FILE, path("bin/lexaro"));
+  const Arguments program = Arguments(LEXARO_EMULATOR) + Arguments{path("bin/lexaro")};
   ToolInput input;
-  input.program = path("bin/lexaro");
+  input.program = "/usr/bin/env";
   input.environment = {{"LD_LIBRARY_PATH", LEXARO_LIBRARY_DIR}, {"LANG", "de_CH.UTF-8"}};
-  const ToolResult user = run_tool("locale --item day.sunday --item codepage.name", input);
+  const ToolResult user = run_tool(program + "locale --item day.sunday --item codepage.name", input);
   EXPECT_EQ(user.status, 0);
   EXPECT_EQ(user.output, "Sunday\nUS-ASCII\n");
   expect_told(user, "built-in");
   expect_told(user, "\"de_CH.UTF-8\" of the system is not known");
-  EXPECT_EQ(run_tool("locale German", input).status, 4);
-  EXPECT_EQ(run_tool("locale C --json", input).status, 0);
-  EXPECT_EQ(run_tool({"--locale-dir", path("bin"), "locale"}, input).status, 4);
-  EXPECT_EQ(run_tool("list languages", input).status, 4);
+  EXPECT_EQ(run_tool(program + "locale German", input).status, 4);
+  EXPECT_EQ(run_tool(program + "locale C --json", input).status, 0);
+  EXPECT_EQ(run_tool(program + Arguments{"--locale-dir", path("bin"), "locale"}, input).status, 4);
+  EXPECT_EQ(run_tool(program + "list languages", input).status, 4);
 }
 
 // A damaged object is never replaced by another one's values.
