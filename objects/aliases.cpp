@@ -4,6 +4,7 @@
 #include "objects/aliases.hpp"
 
 #include <algorithm>
+#include <array>
 #include <cstdio>
 #include <cstring>
 #include <span>
@@ -23,30 +24,38 @@ constexpr size_t kMaxLine = 32767;
 constexpr size_t kShortName = 8;  // names are longer on the average, so that one block takes all
 constexpr int kRecordSize = 104;  // what the message about a failed allocation has always said
 
-// By character, for the many of a start: the one behind a name, and the form in which an alias is kept.
-struct Characters {
-  bool white[256];
-  char upper[256];
+// By character: every start goes through all of the text.
+constexpr auto kWhite = [] {
+  std::array<bool, 256> white{};
+  for (char character : {' ', '\t', '\r', '\n'}) white[static_cast<uint8_t>(character)] = true;
+  return white;
+}();
 
-  constexpr Characters() : white(), upper() {
-    for (int i = 0; i < 256; ++i) {
-      const auto character = static_cast<char>(i);
-      white[i] = character == ' ' || character == '\t' || character == '\r' || character == '\n';
-      upper[i] = character >= 'a' && character <= 'z' ? static_cast<char>(character - ('a' - 'A')) : character;
-    }
+bool is_white(char character) { return kWhite[static_cast<uint8_t>(character)]; }
+
+const char* text_at(const LXObjMgr& manager, uint32_t offset) { return manager.alias_text + offset; }
+
+// The form in which an alias is shown.
+class UpperCase {
+ public:
+  UpperCase(const LXObjMgr& manager, const Alias& alias) {
+    std::transform(text_at(manager, alias.alias), text_at(manager, alias.alias) + alias.alias_length, text_,
+                   [](char c) { return c >= 'a' && c <= 'z' ? static_cast<char>(c - ('a' - 'A')) : c; });
   }
+  const char* text() const { return text_; }
+
+ private:
+  char text_[kMaxAlias + 1] = {};
 };
-constexpr Characters kCharacters;
 
-bool is_white(char character) { return kCharacters.white[static_cast<uint8_t>(character)]; }
-
-// Reads the text in place: names are terminated and aliases turned to upper case where they stand.
+// Reads the manager's text in place: names are terminated where they stand.
 class AliasReader {
  public:
   explicit AliasReader(LXObjMgr& manager) : manager_(manager) {}
 
-  // `text` has room for one character more than `length`.
-  bool read(char* text, size_t length) {
+  // There is room for one character more than `length`.
+  bool read(size_t length) {
+    char* text = manager_.alias_text;
     char* end = text + length;
     *end = '\n';
     expected_ = length / kShortName + 1;
@@ -118,10 +127,10 @@ class AliasReader {
     }
     if (manager_.alias_count == room_ && !make_room(alias)) return false;
     LX_TRACE(TRC1_LEVEL_DETAIL, "Processing alias '%s'", alias.text);
-    for (size_t i = 0; i < alias.length; ++i) alias.text[i] = kCharacters.upper[static_cast<uint8_t>(alias.text[i])];
     Alias& record = manager_.aliases[manager_.alias_count++];
-    record = {code_page_, alias.text, static_cast<uint8_t>(alias.length)};
-    LX_TRACE(TRC1_LEVEL_DETAIL, "Saved alias %s, length = %d", record.alias, static_cast<int>(alias.length));
+    record = {offset_of(code_page_), offset_of(alias.text), static_cast<uint8_t>(alias.length)};
+    LX_TRACE(TRC1_LEVEL_DETAIL, "Saved alias %s, length = %d", UpperCase(manager_, record).text(),
+             static_cast<int>(alias.length));
     return true;
   }
 
@@ -138,6 +147,8 @@ class AliasReader {
     room_ = room;
     return true;
   }
+
+  uint32_t offset_of(const char* name) const { return static_cast<uint32_t>(name - manager_.alias_text); }
 
   LXObjMgr& manager_;
   size_t expected_ = 0;  // records
@@ -197,7 +208,7 @@ uint32_t LXBuildAliasList(LXObjMgr* manager) noexcept {
     Owned<char> text = load_text(name, length);
     if (!text) return 1;
     manager->alias_text = text.give_up();
-    return AliasReader(*manager).read(manager->alias_text, length) ? 0 : 1;
+    return AliasReader(*manager).read(length) ? 0 : 1;
   });
 }
 
@@ -207,9 +218,11 @@ const char* LXGetCodepageFromAlias(LXObjMgr* manager, const char* name) noexcept
     LX_TRACE(TRC1_LEVEL_PARAMETER, "Searching for %s.", name);
     size_t length = std::strlen(name);
     for (const Alias& alias : aliases_of(*manager)) {
-      if (alias.alias_length != length || compare_ignoring_case(alias.alias, name, length) != 0) continue;
-      LX_TRACE(TRC1_LEVEL_PARAMETER, "%s -> %s", alias.alias, alias.code_page);
-      return alias.code_page;
+      if (alias.alias_length != length) continue;
+      if (compare_ignoring_case(text_at(*manager, alias.alias), name, length) != 0) continue;
+      const char* code_page = text_at(*manager, alias.code_page);
+      LX_TRACE(TRC1_LEVEL_PARAMETER, "%s -> %s", UpperCase(*manager, alias).text(), code_page);
+      return code_page;
     }
     return nullptr;
   });
@@ -229,7 +242,7 @@ int32_t LXEnumAliases(LXObjMgr* manager, LXEnumAliasFn callback, void* context) 
   return exported(trace_unit, __func__, [&]() -> int32_t {
     if (manager == nullptr || callback == nullptr) return 0;
     for (const Alias& alias : aliases_of(*manager)) {
-      if (callback(context, alias.alias, alias.code_page) == 0) break;
+      if (callback(context, UpperCase(*manager, alias).text(), text_at(*manager, alias.code_page)) == 0) break;
     }
     return 0;
   });

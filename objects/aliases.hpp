@@ -9,10 +9,10 @@ inline constexpr int kMaxCodePageName = 32;
 inline constexpr int kMaxAlias = 64;
 
 // One further name of a code page, in the order of the file. The names stand in the text of the file, which the manager
-// keeps, with terminators in the place of the white space behind them.
+// keeps, as written, with terminators in the place of the white space behind them.
 struct Alias {
-  const char* code_page;  // as written
-  const char* alias;      // in upper case
+  uint32_t code_page;  // bytes from the beginning of the text
+  uint32_t alias;      // likewise
   uint8_t alias_length;
 };
 

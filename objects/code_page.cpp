@@ -218,9 +218,10 @@ void note_ascii(CodePage& page) {
 
 void fill_types(CodePage& page, LXCharType* types) {
   page.types = types;
-  for (uint32_t i = 0; i < page.raw.type_entry_count; ++i) {
-    types[i] = {page.raw.type_entries[i].flags, page.raw.type_entries[i].delta};
-  }
+  std::transform(page.raw.type_entries, page.raw.type_entries + page.raw.type_entry_count, types,
+                 [](const TypeEntry& entry) {
+                   return LXCharType{entry.flags, entry.delta};
+                 });
 }
 
 uint32_t bits_for_half_forms(const CheckedCodePage& checked) {

@@ -82,27 +82,21 @@ bool walks_end(StateSet& level, uint32_t state_count, unsigned max_depth, Read r
   }
 }
 
-// Checks the walks behind each first byte that `start` accepts, where a character may be shorter than the longest: a
-// walk that read more bytes than the character has would read past its end.
+// Checks the walks behind each first byte that `start` accepts, those for characters of one length at a time: a walk
+// that read more bytes than the character has would read past its end.
 template <class Read, class Leaf>
 bool walks_fit_lengths(const CodePageHeader& header, const Step& start, uint32_t state_count, Read read, Leaf leaf) {
-  StateSet longest;
-  for (unsigned byte = start.low; byte <= start.high; ++byte) {
-    unsigned depth = allowed_depth(header, byte);
-    if (depth == 0) continue;
-    uint32_t next = start.index + (byte & start.mask);
-    if (next >= state_count) return false;
-    if (depth == header.max_length) {
-      longest.insert(next);
-    } else if (Step step = read(next); step.final) {
-      if (!leaf(step)) return false;
-    } else {
-      StateSet level;
+  for (unsigned length = 2; length <= header.max_length; ++length) {
+    StateSet level;
+    for (unsigned byte = start.low; byte <= start.high; ++byte) {
+      if (allowed_depth(header, byte) != length) continue;
+      uint32_t next = start.index + (byte & start.mask);
+      if (next >= state_count) return false;
       level.insert(next);
-      if (!walks_end(level, state_count, depth - 1, read, leaf)) return false;
     }
+    if (!walks_end(level, state_count, length - 1, read, leaf)) return false;
   }
-  return walks_end(longest, state_count, header.max_length - 1, read, leaf);
+  return true;
 }
 
 unsigned greatest_masked(unsigned mask, unsigned low, unsigned high) {
