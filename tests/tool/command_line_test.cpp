@@ -73,7 +73,10 @@ TEST_F(CommandLine, FileNamesAreTakenAsTheyAre) {
 }
 
 TEST_F(CommandLine, HelpAndVersion) {
+  ToolInput compiler;
+  compiler.program = LEXAROC_TOOL;
   EXPECT_EQ(run_tool("--version").output.rfind("lexaro 1.", 0), 0U);
+  EXPECT_EQ(run_tool("--version", compiler).output.rfind("lexaroc 1.", 0), 0U);
   EXPECT_EQ(run_tool("help").output, run_tool("--help").output);
   EXPECT_NE(run_tool("list sorts -h").output.find("What can be listed"), std::string::npos);
   const ToolResult help = run_tool("convert -h");

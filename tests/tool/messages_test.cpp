@@ -138,6 +138,7 @@ TEST_F(Messages, SpeakTheUsersLanguage) {
   if (!kSystemHasLocales) GTEST_SKIP() << kOneLocale;
   const std::string broken = fs::path(write("lexaro", "no catalog")).parent_path();
   const std::string english = "there is no command \"x\"";
+  const std::string long_name(300, 'x');
   const std::string page = write("cp_00001.txt", "41 A\n41 B\nname X\n");
   const struct {
     Environment environment;
@@ -164,6 +165,10 @@ TEST_F(Messages, SpeakTheUsersLanguage) {
       {{{"LANG", "de_DE.UTF-8"}}, "data a", "OUTPUT_DIR fehlt", LEXAROC_TOOL},
       {{{"LANG", "ja_JP.UTF-8"}}, "data --layout 3", "値 3 は 1 から 2 の範囲にありません", LEXAROC_TOOL},
       {{{"LANG", "de_DE.UTF-8"}}, {"check", page}, ":2:4: die Bytes 41 sind doppelt angegeben\n", LEXAROC_TOOL},
+      {{{"LANG", "de_DE.UTF-8"}},
+       {"check", long_name},
+       "lexaroc: " + long_name + ": Dateiname zu lang\n",
+       LEXAROC_TOOL},
       {{{"LANG", "ja_JP.UTF-8"}}, {"check", page}, "「name」は文字より前に書きます", LEXAROC_TOOL},
       // Columns, and help that is whole or English
       {{{"LANG", "ja_JP.UTF-8"}}, "data -h", "\n  SOURCE_DIR TEXT 必須        ソース", LEXAROC_TOOL},

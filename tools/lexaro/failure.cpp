@@ -2,6 +2,7 @@
 #include "tools/lexaro/failure.hpp"
 
 #include <cstdio>
+#include <filesystem>
 
 namespace lx::tool {
 
@@ -9,6 +10,13 @@ Failure usage_failure(const Message& text) { return {ExitStatus::kUsage, text}; 
 
 Failure system_failure(const Message& subject, int error_number) {
   return {ExitStatus::kInputOutput, subject + ": " + system_error_text(error_number)};
+}
+
+Failure system_failure(const std::system_error& error) {
+  const auto* of_file = dynamic_cast<const std::filesystem::filesystem_error*>(&error);
+  const int number = error.code().value();
+  if (of_file != nullptr) return system_failure(display_name(of_file->path1().string()), number);
+  return {ExitStatus::kInputOutput, system_error_text(number)};
 }
 
 void complain(const Message& text) {

@@ -5,6 +5,7 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 #include "tools/messages/message.hpp"
 
@@ -37,6 +38,8 @@ class Failure : public std::runtime_error {
 Failure usage_failure(const Message& text);
 // "subject: text of the error number".
 Failure system_failure(const Message& subject, int error_number);
+// ... of an error that the standard library met; its subject is the file, if there is one.
+Failure system_failure(const std::system_error& error);
 
 // Writes "lexaro: text" to standard error.
 void complain(const Message& text);

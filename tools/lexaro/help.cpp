@@ -112,7 +112,8 @@ std::string help_text(const CLI::App& command, const std::string& name) {
   return "";
 }
 
-std::string requested_help(const CLI::App& program) {
+std::string requested_text(const CLI::App& program, const CLI::ParseError& error) {
+  if (dynamic_cast<const CLI::CallForVersion*>(&error)) return std::string(error.what()) + "\n";
   const std::vector<const CLI::App*> commands = given_commands(program);
   std::string name = program.get_name();
   for (std::size_t i = 1; i < commands.size(); ++i) name += " " + commands[i]->get_name();

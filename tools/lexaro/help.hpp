@@ -11,8 +11,8 @@ namespace lx::tool {
 
 // The help of a command, whole in one language, in the encoding of the terminal.
 std::string help_text(const CLI::App& command, const std::string& name);
-// ... of the command that was given on the command line, or of the program.
-std::string requested_help(const CLI::App& program);
+// What --help or --version asked for, which the parser reports as errors too.
+std::string requested_text(const CLI::App& program, const CLI::ParseError& error);
 
 // The parser's own text in English, where there is no other.
 Message parse_error_text(const CLI::App& program, const CLI::ParseError& error);

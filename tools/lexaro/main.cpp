@@ -9,6 +9,7 @@
 #include <memory>
 #include <new>
 #include <string>
+#include <system_error>
 #include <utility>
 #include <vector>
 
@@ -59,12 +60,8 @@ Command add_help_command(CLI::App& program) {
 }
 
 ExitStatus report_parse_error(CLI::App& program, const CLI::ParseError& error) {
-  if (error.get_exit_code() == 0) {  // --help and --version come as errors too
-    if (dynamic_cast<const CLI::CallForVersion*>(&error)) {
-      print(std::string(error.what()) + "\n");
-    } else {
-      print(requested_help(program));
-    }
+  if (error.get_exit_code() == 0) {
+    print(requested_text(program, error));
     return ExitStatus::kExact;
   }
   std::string command = "lexaro";
@@ -137,6 +134,8 @@ ExitStatus guarded_run(int argument_count, char** arguments) {
     return failure.status();
   } catch (const std::bad_alloc&) {
     complain(message("out of memory"));
+  } catch (const std::system_error& error) {
+    complain(system_failure(error).text());
   } catch (const std::exception& error) {
     complain(message(error.what()));
   }

@@ -83,8 +83,7 @@ void write_file(const fs::path& path, std::string_view bytes) {
 void make_directory(const fs::path& path) {
   std::error_code error;
   fs::create_directories(path, error);
-  if (error)
-    throw IoError(path.string() + ": " + tool::message("cannot create") + ": " + tool::message(error.message()));
+  if (error) fail(path, "cannot create", error.value());
 }
 
 std::vector<fs::path> list_files(const fs::path& directory, std::string_view extension) {
@@ -93,9 +92,7 @@ std::vector<fs::path> list_files(const fs::path& directory, std::string_view ext
   for (fs::directory_iterator entry(directory, error), end; !error && entry != end; entry.increment(error)) {
     if (entry->path().extension() == extension && entry->is_regular_file()) files.push_back(entry->path());
   }
-  if (error && error != std::errc::no_such_file_or_directory) {
-    throw IoError(directory.string() + ": " + tool::message("cannot list") + ": " + tool::message(error.message()));
-  }
+  if (error && error != std::errc::no_such_file_or_directory) fail(directory, "cannot list", error.value());
   std::sort(files.begin(), files.end());
   return files;
 }

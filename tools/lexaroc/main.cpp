@@ -4,6 +4,7 @@
 #include <iostream>
 #include <optional>
 #include <set>
+#include <system_error>
 
 #include "builtin.hpp"
 #include "catalog_command.hpp"
@@ -11,6 +12,7 @@
 #include "check.hpp"
 #include "compile.hpp"
 #include "dump.hpp"
+#include "lexaro/lexaro.h"
 #include "object_file.hpp"
 #include "tools/lexaro/failure.hpp"
 #include "tools/lexaro/help.hpp"
@@ -81,8 +83,8 @@ int run_builtin(const fs::path& sources, const fs::path& output) {
 }
 
 int answer_parse_error(const CLI::App& app, const CLI::ParseError& error) {
-  if (error.get_exit_code() == 0) {  // --help comes as an error too
-    std::cout << lx::tool::requested_help(app) << std::flush;
+  if (error.get_exit_code() == 0) {
+    std::cout << lx::tool::requested_text(app, error) << std::flush;
     return kDone;
   }
   std::cerr << lx::tool::parse_error_text(app, error).shown << '\n'
@@ -92,6 +94,7 @@ int answer_parse_error(const CLI::App& app, const CLI::ParseError& error) {
 
 int run(int argc, char** argv) {
   CLI::App app("Compiler of locale data and message catalogs");
+  app.set_version_flag("--version", std::string("lexaroc ") + LXVersion());
   app.require_subcommand(1);
   int result = kDone;
   fs::path sources, output;
@@ -155,8 +158,8 @@ int main(int argc, char** argv) {
   } catch (const IoError& error) {
     std::cerr << "lexaroc: " << error.text.shown << '\n';
     return kIoFailure;
-  } catch (const fs::filesystem_error& error) {
-    std::cerr << "lexaroc: " << error.what() << '\n';
+  } catch (const std::system_error& error) {
+    std::cerr << "lexaroc: " << lx::tool::system_failure(error).text().shown << '\n';
     return kIoFailure;
   } catch (const Fault& error) {
     std::cerr << "lexaroc: " << error.text.shown << '\n';
