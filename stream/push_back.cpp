@@ -23,13 +23,24 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "push_back", 0};
 
-// `put`: whether there was room.
+uint32_t status_of(bool there_was_room) { return there_was_room ? LX_OK : LX_E_BUFFER; }
+
+// `put` returns the status.
 template <class Put>
 int32_t push_back_call(const char* function, LXStream* stream, LXLocale* locale, Put put) {
   return stream_call(trace_unit, function, stream, locale, Direction::read, int32_t{0},
-                     [&](LocaleCall& call, LXStream& open) -> int32_t {
-                       return put(open, page_of(call.locale)) ? 1 : call.fail(LX_E_BUFFER, 0);
+                     [&](LocaleCall& call, LXStream& open) {
+                       call.status = put(open, page_of(call.locale));
+                       return call.status == LX_OK ? 1 : 0;
                      });
+}
+
+// The character at s; shifted text comes with its state.
+template <class... State>
+int32_t push_back_text(const char* function, LXStream* stream, LXLocale* locale, const char* s, State... state) {
+  return push_back_call(function, stream, locale, [&](LXStream& open, const CodePage& page) -> uint32_t {
+    return s != nullptr ? status_of(push_back(open, page, character_at(page, s, state...))) : LX_E_ARGUMENT;
+  });
 }
 
 }  // namespace
@@ -40,27 +51,23 @@ using namespace lx;
 extern "C" {
 
 int32_t LXUngetChar(LXStream* stream, LXLocale* locale, const char* s, uint32_t /*reserved*/) noexcept {
-  return push_back_call(__func__, stream, locale, [&](LXStream& open, const CodePage& page) {
-    return push_back(open, page, character_at(page, s));
-  });
+  return push_back_text(__func__, stream, locale, s);
 }
 
 int32_t LXUngetCharU(LXStream* stream, LXLocale* locale, LXUChar ch, uint32_t /*reserved*/) noexcept {
   return push_back_call(__func__, stream, locale,
-                        [&](LXStream& open, const CodePage&) { return push_back_unit(open, ch); });
+                        [&](LXStream& open, const CodePage&) { return status_of(push_back_unit(open, ch)); });
 }
 
 int32_t LXUngetCharW(LXStream* stream, LXLocale* locale, LXWChar packed, uint32_t /*reserved*/) noexcept {
   return push_back_call(__func__, stream, locale, [&](LXStream& open, const CodePage& page) {
-    return push_back(open, page, character_of(page, packed));
+    return status_of(push_back(open, page, character_of(page, packed)));
   });
 }
 
 int32_t LXUngetCharEx(LXStream* stream, LXLocale* locale, const char* s, uint32_t state,
                       uint32_t /*reserved*/) noexcept {
-  return push_back_call(__func__, stream, locale, [&](LXStream& open, const CodePage& page) {
-    return push_back(open, page, character_at(page, s, state));
-  });
+  return push_back_text(__func__, stream, locale, s, state);
 }
 
 }  // extern "C"

@@ -23,8 +23,8 @@ class LineReader {
         line_(line_characters<Kind>(page)),
         flags_((flags & kLineEnds) != 0 ? flags : flags | LX_EOL_1),
         buffer_(buffer),
-        room_(size > 0 ? static_cast<size_t>(size) : 0),
-        terminated_((flags & LX_OPT_TERMINATE) != 0 && size > 0) {
+        room_(static_cast<size_t>(size)),
+        terminated_((flags & LX_OPT_TERMINATE) != 0) {
     if (terminated_) --room_;
   }
 
@@ -140,7 +140,8 @@ int32_t read_line(const char* function, LXStream* stream, LXLocale* locale, Unit
   return stream_call(
       trace_unit, function, stream, locale, Direction::read, kFailed,
       [&](LocaleCall& call, LXStream& open) -> int32_t {
-        if (buffer == nullptr && size > 0) return call.fail(LX_E_ARGUMENT, kFailed);
+        if (size <= 0) return 0;
+        if (buffer == nullptr) return call.fail(LX_E_ARGUMENT, kFailed);
         return LineReader<Kind>(open, page_of(call.locale), buffer, size, flags).read(call.status);
       },
       flags, kFlags);

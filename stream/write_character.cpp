@@ -31,6 +31,14 @@ int32_t write_call(const char* function, LXStream* stream, LXLocale* locale, Put
                      });
 }
 
+// The character at s; shifted text comes with its state.
+template <class... State>
+int32_t write_text(const char* function, LXStream* stream, LXLocale* locale, const char* s, State... state) {
+  return write_call(function, stream, locale, [&](LXStream& open, const CodePage& page) -> uint32_t {
+    return s != nullptr ? write(open, page, character_at(page, s, state...)) : LX_E_ARGUMENT;
+  });
+}
+
 }  // namespace
 }  // namespace lx
 
@@ -39,8 +47,7 @@ using namespace lx;
 extern "C" {
 
 int32_t LXWriteChar(LXStream* stream, LXLocale* locale, const char* s) noexcept {
-  return write_call(__func__, stream, locale,
-                    [&](LXStream& open, const CodePage& page) { return write(open, page, character_at(page, s)); });
+  return write_text(__func__, stream, locale, s);
 }
 
 int32_t LXWriteCharU(LXStream* stream, LXLocale* locale, LXUChar ch) noexcept {
@@ -56,9 +63,7 @@ int32_t LXWriteCharW(LXStream* stream, LXLocale* locale, LXWChar packed) noexcep
 }
 
 int32_t LXWriteCharEx(LXStream* stream, LXLocale* locale, const char* s, uint32_t state) noexcept {
-  return write_call(__func__, stream, locale, [&](LXStream& open, const CodePage& page) {
-    return write(open, page, character_at(page, s, state));
-  });
+  return write_text(__func__, stream, locale, s, state);
 }
 
 }  // extern "C"

@@ -100,11 +100,12 @@ class Streams : public testing::Test {
   int32_t put(LXStream* stream, const Character& c, bool back) {
     auto unit = static_cast<LXUChar>(c.code);
     const std::string text = bytes_of_code(c.code, c.size);
-    const std::vector<char> s(text.begin(), text.end());  // behind it a memory checker is on guard
+    const std::vector<char> copy(text.begin(), text.end());  // behind it a memory checker is on guard
+    const char* s = c.size != 0 ? copy.data() : nullptr;
     if (ucs2_) return back ? LXUngetCharU(stream, l_, unit, 0) : LXWriteCharU(stream, l_, unit);
     if (form_.kind == Form::wide) return back ? LXUngetCharW(stream, l_, c.code, 0) : LXWriteCharW(stream, l_, c.code);
-    if (form_.kind == Form::plain) return back ? LXUngetChar(stream, l_, &s[0], 0) : LXWriteChar(stream, l_, &s[0]);
-    return back ? LXUngetCharEx(stream, l_, &s[0], c.state, 0) : LXWriteCharEx(stream, l_, &s[0], c.state);
+    if (form_.kind == Form::plain) return back ? LXUngetChar(stream, l_, s, 0) : LXWriteChar(stream, l_, s);
+    return back ? LXUngetCharEx(stream, l_, s, c.state, 0) : LXWriteCharEx(stream, l_, s, c.state);
   }
   int32_t line(char* out, int32_t size, uint32_t flags) {
     if (ucs2_) return LXReadStringU(stream_, l_, reinterpret_cast<LXUChar*>(out), size, flags);
@@ -140,6 +141,7 @@ TEST_F(Streams, ReadWhereverTheRoutineFails) {
         }
       }
       EXPECT_TRUE(next == list_.size() && script_.at == bytes_.size()) << form_.name() << ", " << choice << ", " << n;
+      expect(line(nullptr, static_cast<int32_t>(n % 2) - 1, 0), 0, LX_OK);  // without room, also at the end
       close();
     }
   }
@@ -257,6 +259,10 @@ TEST_F(Streams, WrongUse) {
     Character c = {0, 1, 1, 'a', 0};
     expect(put(nullptr, c, writes), 0, LX_E_ARGUMENT);
     expect(put(stream_, c, writes), 0, LX_E_DIRECTION);
+    if (!ucs2_ && form_.kind != Form::wide) {
+      c.size = 0;  // no text at all
+      expect(put(stream_, c, !writes), 0, LX_E_ARGUMENT);
+    }
     expect(writes ? read(c) : LXFlushStream(stream_, l_, 0), 0, LX_E_DIRECTION);
     expect(line(nullptr, 0, writes ? 0 : 0x1100), -2, writes ? LX_E_DIRECTION : LX_E_ARGUMENT);
     if (!writes && wire_.follows_shifts()) {  // a run that lost a byte: told once, then read as it is
