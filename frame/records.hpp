@@ -77,6 +77,9 @@ struct LXObjMgr {
   uint32_t alias_count;
   char* alias_text;
   std::atomic<const void*> pairs[lx::kPairPlaces];
+  bool built_in;         // the entries are those of the library itself
+  LXObjEntry* replaced;  // what these took the place of; locales may still point there
+  uint16_t replaced_count;
 };
 
 struct LXLocale {

@@ -208,12 +208,15 @@ uint32_t LXLoadDefaultObj(LXObjMgr* /*manager*/, LXObjEntry* entry) noexcept {
 uint32_t LXLoadDefaults(LXObjMgr* manager) noexcept {
   return exported(trace_unit, __func__, [&]() -> uint32_t {
     if (manager == nullptr) return 0;
+    if (manager->built_in) return 1;
     static constexpr const char* kNames[] = {"English", "UnitedStates", "US-ASCII"};
     constexpr uint16_t kCount = 3;
     auto entries = Owned<LXObjEntry>::zeroed(kCount);
     if (!entries) return 0;
+    manager->replaced_count = manager->first[kObjectTypes];
+    manager->replaced = std::exchange(manager->entries, entries.give_up());
     for (uint8_t type = 0; type < kCount; ++type) {
-      LXObjEntry& entry = entries[type];
+      LXObjEntry& entry = manager->entries[type];
       entry.id = 1;
       entry.type = type;
       std::strcpy(entry.name, kNames[type]);
@@ -222,7 +225,7 @@ uint32_t LXLoadDefaults(LXObjMgr* manager) noexcept {
     }
     manager->first[LX_SORT] = kCount;
     manager->first[kObjectTypes] = kCount;
-    manager->entries = entries.give_up();
+    manager->built_in = true;
     manager->no_defaults = 1;
     manager->directory[0] = '\0';
     return 1;

@@ -56,7 +56,17 @@ size_t name_size(const char* name, int32_t length) {
   return length < 0 ? std::strlen(name) : static_cast<size_t>(length);
 }
 
+// The result is that of the last object, `before` when there is none.
+uint32_t unload_all(LXObjMgr& manager, LXObjEntry* entries, uint16_t count, uint32_t before) {
+  uint32_t result = before;
+  for (LXObjEntry* entry = entries; entry < entries + count; ++entry) {
+    if (entry->loaded() && (entry->flags & kEntryBuiltIn) == 0) result = LXUnloadObj(&manager, entry);
+  }
+  return result;
+}
+
 }  // namespace
+
 bool drop_pairs(LXObjMgr& manager) {
   bool all = true;
   for (std::atomic<const void*>& place : manager.pairs) {
@@ -106,12 +116,12 @@ uint32_t LXTermObjManager(LXObjMgr* manager) noexcept {
   return exported(trace_unit, __func__, [&]() -> uint32_t {
     if (manager == nullptr) return LX_OK;
     uint32_t result = LXDestroyAliasList(manager);
-    for (uint16_t i = 0; i < manager->first[kObjectTypes]; ++i) {
-      LXObjEntry& entry = manager->entries[i];
-      if (entry.loaded() && (entry.flags & kEntryBuiltIn) == 0) result = LXUnloadObj(manager, &entry);
-    }
+    result = unload_all(*manager, manager->replaced, manager->replaced_count, result);
+    result = unload_all(*manager, manager->entries, manager->first[kObjectTypes], result);
     if (!drop_pairs(*manager)) result = 1;
-    if (manager->entries != nullptr && !release(manager->entries)) result = 1;
+    for (LXObjEntry* entries : {manager->replaced, manager->entries}) {
+      if (entries != nullptr && !release(entries)) result = 1;
+    }
     if (!release(manager)) result = 1;
     return result;
   });

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include "support/counting_allocator.hpp"
 #include "support/descriptors.hpp"
 #include "support/environment.hpp"
 #include "support/object_builder.hpp"
@@ -160,6 +161,30 @@ TEST(ControlFile, LongestDirectory) {
   uint32_t rc = 0;
   EXPECT_NE(LXGetObjFromID(managed.manager, LX_TERRITORY, 1, 0, &rc), nullptr);
   EXPECT_EQ(rc, LX_OK);
+}
+
+// What was given out before stays as it is, to the manager's end.
+TEST(ControlFile, BuiltInObjectsTakeThePlaceOfOthers) {
+  DataDirectory directory;
+  write_small_directory(directory);
+  static CountingAllocator memory;  // managers that need no LXInit go on using it
+  ASSERT_EQ(memory.init(directory.path()), LX_OK);
+  LXObjMgr* manager = LXGetObjManager();
+  uint32_t rc = 99;
+  LXObjEntry* entry = LXGetObjFromName(manager, LX_CODEPAGE, "Small", -1, 0, &rc);
+  memory.arm(0, true);
+  EXPECT_EQ(LXLoadDefaults(manager), 0u);
+  EXPECT_EQ(contents_of(manager), "2 2 5 0");
+  memory.disarm();
+  for (int i = 0; i < 2; ++i) {
+    EXPECT_EQ(LXLoadDefaults(manager), 1u);
+    EXPECT_EQ(contents_of(manager), "1 1 1 0");
+    LXCodePageInfo info;
+    EXPECT_EQ(LXGetCodePageInfo(entry, &info), LX_OK);
+    EXPECT_EQ(info.max_length, 4);
+  }
+  EXPECT_EQ(LXTerm(), LX_OK);
+  EXPECT_EQ(memory.live, 0);
 }
 
 }  // namespace
