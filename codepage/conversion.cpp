@@ -251,7 +251,7 @@ LXConversion* LXOpenConversion(LXLocale* target_locale, LXLocale* source_locale,
   return locale_call(trace_unit, __func__, target_locale, 0, 0, static_cast<LXConversion*>(nullptr),
                      [&](LocaleCall& call) -> LXConversion* {
                        LXLocale* source = locale_or_default(source_locale);
-                       if (source == nullptr) return nullptr;
+                       if (source == nullptr) return call.fail(LX_E_ARGUMENT, static_cast<LXConversion*>(nullptr));
                        LXConversion* handle = make_handle(call.locale, *source);
                        if (handle == nullptr) call.status = LX_E_MEMORY;
                        return handle;
@@ -283,7 +283,7 @@ uint32_t LXConvertBuffer(LXConversion* handle, char** out, int32_t* out_room, co
 int32_t LXConversionRatio(LXLocale* target_locale, LXLocale* source_locale, uint32_t /*reserved*/) noexcept {
   return locale_call(trace_unit, __func__, target_locale, 0, 0, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     LXLocale* source = locale_or_default(source_locale);
-    if (source == nullptr) return -1;
+    if (source == nullptr) return call.fail(LX_E_ARGUMENT, -1);
     if (call.locale.code_page->id == source->code_page->id) return 1;
     const CodePage& page = page_of(call.locale);
     return page.max_length + (page.shift_sensitive ? 1 : 0);

@@ -37,7 +37,7 @@ int32_t convert_string(const char* function, LXLocale* target_locale, char* out,
   return locale_call(
       trace_unit, function, target_locale, flags, kStringOptions, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
         const LXLocale* source = locale_or_default(source_locale);
-        if (source == nullptr) return -1;
+        if (source == nullptr) return call.fail(LX_E_ARGUMENT, -1);
         const CodePage& from = page_of(*source);
         return convert_bytes(page_of(call.locale), to_shifts, bytes_of(out), Target(out, out_size, flags), from,
                              from_shifts, byte_source(from, in, from_shifts, in_length, flags))
@@ -69,7 +69,7 @@ int32_t LXConvertStringW(LXLocale* target_locale, LXWChar* out, int32_t out_size
   return locale_call(trace_unit, __func__, target_locale, flags, kStringOptions, int32_t{-1},
                      [&](LocaleCall& call) -> int32_t {
                        const LXLocale* source_record = locale_or_default(source_locale);
-                       if (source_record == nullptr) return -1;
+                       if (source_record == nullptr) return call.fail(LX_E_ARGUMENT, -1);
                        Source<LXWChar> source(in, in_length);
                        Target target(out, out_size, flags);
                        return convert_source(source, WideReader(page_of(*source_record), source.text, source.length),

@@ -9,7 +9,12 @@
 namespace lx {
 namespace {
 
-uint8_t blank_of(const CodePage& page) { return static_cast<uint8_t>(WideWriter(page, nullptr, 0).code(0x0020)); }
+// What fields are filled with: the first byte of the blank.
+uint8_t blank_of(const CodePage& page) {
+  uint8_t bytes[kMaxCharacterLength];
+  unpack(bytes, WideWriter(page, nullptr, 0).code(0x0020));
+  return bytes[0];
+}
 
 template <class In>
 bool only_blanks(In rest) {
@@ -45,7 +50,9 @@ Stop carry_last(In& in, Out& out) {
   out.put(code);
   in = ahead;
   Got next = ahead.next(character);
-  return next == Got::end ? Stop::done : next == Got::partial ? Stop::partial : Stop::full;
+  if (next == Got::character) return Stop::full;
+  in = ahead;  // shift bytes behind the last character are read with it
+  return next == Got::end ? Stop::done : Stop::partial;
 }
 
 // Carries over what fits in the room of the writer, or as many characters as the limit allows.
@@ -130,10 +137,11 @@ Attempt copy_units(const Translation& wanted) {
 // Of UCS-2 into a single-byte page only half of the room is used.
 Attempt fill_half(const Translation& wanted, Ucs2Reader in, SingleByteWriter out, size_t limit) {
   auto* const end = in.end;
-  size_t units = std::min(wanted.in_length, limit) / sizeof(LXUChar);
+  const size_t length = wanted.in_length & ~size_t{1};  // half a unit is none
+  size_t units = std::min(length, limit) / sizeof(LXUChar);
   in.end = in.at + units;
   Attempt result = attempt(wanted, in, out, units);
-  result.overflow = wanted.in_length > limit;
+  result.overflow = length > limit;
   result.forgiven =
       result.overflow && wanted.drop_blanks && only_blanks(Ucs2Reader(in.end, static_cast<size_t>(end - in.end)));
   result.all = !result.overflow;

@@ -18,10 +18,10 @@ class Model {
       characters_ = in_.size();
       consumed_ = characters_;
     } else if (half) {
-      characters_ = std::min(call_.text.size(), limit_) / 2;
+      characters_ = std::min(in_.size() * 2, limit_) / 2;
       for (size_t i = 0; i < characters_; ++i) out_.add(out_.piece(static_cast<uint16_t>(in_[i])));
       consumed_ = characters_;
-      if (call_.text.size() > limit_) refuse(characters_, false);
+      if (in_.size() * 2 > limit_) refuse(characters_, false);
     } else {
       carry();
     }

@@ -158,7 +158,9 @@ TEST(TranslationCases, WorkAsWritten) {
       {930, 57352, "A日", 2, 2, LX_OPT_CHARS, {2, "\xC1\x0E\x45\x62\x0F", 2, 0}},
       {367, 930, "\x0E\x0E\x0F\x0F\xC1\x0F\x0F", 7, 9, 0, {1, "A", 7, 0}},
       {57352, 930, "\x0E\x41\x0E\x45\x66\x0F", 6, 3, 0, {3, "\xEF\xBF\xBD", 3, 40}},  // no enter byte
-      {367, 1200, units, 6, 5, 0, {2, "AB", 4, 40}},  // one byte each uses half of the room
+      {930, 933, "\xC1\x0E\x88\x61\x0F", 5, 2, 0, {2, "\xC1\x3F", 5, 0}},  // the shift byte behind goes with it
+      {367, 1200, units, 6, 5, 0, {2, "AB", 4, 40}},                       // one byte each uses half of the room
+      {367, 1200, units, 5, 4, 0, {2, "AB", 4, 0}},                        // half a unit is none
       {1200, 1200, units, 6, 2, LX_OPT_TERMINATE | kPad, {6, units, 6, 0}},
   };
   for (const auto& one : cases) {
