@@ -22,7 +22,7 @@ Text<Unit> given_text(const CodePage& page, const Unit* at, uint32_t state, int3
     text.length = measured_length(at) + (terminator == Terminator::included ? 1 : 0);
   } else {
     text.length = static_cast<size_t>(length);
-    if ((options & LX_OPT_CHARS) != 0) text.length = Kind::length_of_characters(page, text, text.length);
+    if ((options & LX_OPT_CHARS) != 0) text.length = length_of_counted<Kind>(page, text, text.length);
   }
   return text;
 }

@@ -12,8 +12,6 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "collate", 0};
 
-constexpr size_t kShortWork = 1024;
-
 int32_t sign_of(int32_t less) { return less < 0 ? -1 : less > 0 ? 1 : 0; }
 
 // ---- Quick comparison ----
@@ -228,7 +226,10 @@ class Side {
     primary_ = 0;
     while (primary_ == 0) {
       if (next_set_ >= weights_.count) {
-        if (reader_.done()) return false;
+        if (reader_.done()) {
+          levels_.finish();
+          return false;
+        }
         weights_ = reader_.next();
         next_set_ = 0;
         continue;
@@ -301,7 +302,7 @@ int32_t compare_weights(LocaleCall& call, const SortTables& sort, const Beginnin
   if (compare_quickly(sort, begin, a, b, result) == Verdict::decided) return result;
   auto length = [](const Reader& text) { return static_cast<size_t>(text.end - text.at); };
   size_t half = Levels::area_size(length(a));
-  WorkArea<kShortWork> area;
+  WorkArea area;
   if (!area.reserve(half + Levels::area_size(length(b)))) return call.fail(LX_E_MEMORY, int32_t{0});
   Side<Reader> side_a(sort, a, area.get(), length(a));
   Side<Reader> side_b(sort, b, area.get() + half, length(b));
@@ -358,7 +359,7 @@ int32_t compare_keys(LocaleCall& call, const Text<typename Kind::Unit>& a, const
                      uint32_t options) {
   size_t room_a = key_room(call, a.length, options);
   size_t room_b = key_room(call, b.length, options);
-  WorkArea<kShortWork> area;
+  WorkArea area;
   if (!area.reserve(room_a + room_b)) return call.fail(LX_E_MEMORY, int32_t{0});
   int32_t size_a = transform_text<Kind>(call, area.get(), room_a, a, options);
   int32_t size_b = size_a < 0 ? -1 : transform_text<Kind>(call, area.get() + room_a, room_b, b, options);

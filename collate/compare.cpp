@@ -54,8 +54,23 @@ uint32_t wanted_units(const UnitWalker<Unit>&) {
 
 // ---- Texts ----
 
+void dump_both(const void* a, size_t bytes_a, const void* b, size_t bytes_b) {
+  if (!traces(trace_unit, TRC1_LEVEL_DETAIL)) return;
+  TRC1_Dump(&trace_unit, __LINE__, "String1", a, bytes_a);
+  TRC1_Dump(&trace_unit, __LINE__, "String2", b, bytes_b);
+}
+
+// Of mixed text: two characters that differ, or that are of different length once they are made alike.
+void trace_mismatch(const ShiftedWalker& a, const ShiftedWalker& b, bool lengths) {
+  LX_TRACE(TRC1_LEVEL_DETAIL, "Strings are unequal: len1 = %d, len2 = %d", static_cast<int>(left(a)),
+           static_cast<int>(left(b)));
+  if (lengths) dump_both(a.at, left(a), b.at, left(b));
+}
+
 template <class Unit, class Walker, class Characters>
 int32_t compare_characters(Walker a, Walker b, Fold fold, const Characters& characters) {
+  const Walker begin_a = a;
+  const Walker begin_b = b;
   for (;;) {
     Character x;
     Character y;
@@ -75,8 +90,10 @@ int32_t compare_characters(Walker a, Walker b, Fold fold, const Characters& char
       x = characters.upper(x);
       y = characters.upper(y);
     }
-    if (lengths != 0) return lengths;
-    if (int32_t result = difference<Unit>(x, y)) return result;
+    if (int32_t result = lengths != 0 ? lengths : difference<Unit>(x, y)) {
+      if constexpr (std::same_as<Walker, ShiftedWalker>) trace_mismatch(begin_a, begin_b, lengths != 0);
+      return result;
+    }
   }
   a.finish();
   b.finish();
@@ -139,11 +156,6 @@ int32_t compare_mapped(LocaleCall& call, const Text<Unit>& a, const Text<Unit>& 
 
 // ---- The calls ----
 
-void dump(const char* label, const void* text, size_t bytes) {
-  if (traces(trace_unit, TRC1_LEVEL_DETAIL))
-    TRC1_Dump(&trace_unit, __LINE__, label, text, static_cast<uint32_t>(bytes));
-}
-
 template <class Kind, class Unit = typename Kind::Unit>
 Text<Unit> text_to_compare(const CodePage& page, const Unit* at, uint32_t state, int32_t length, uint32_t options) {
   Text<Unit> text = given_text<Kind>(page, at, state, length, options, Terminator::excluded);
@@ -152,28 +164,35 @@ Text<Unit> text_to_compare(const CodePage& page, const Unit* at, uint32_t state,
   return text;
 }
 
+// Before each character one shift byte is looked at.
+size_t whole_mixed_length(const CodePage& page, const Text<char>& text) {
+  ShiftedWalker walker(page, bytes_of(text.at), text.length, text.state);
+  while (left(walker) != 0) {
+    if (walker.skip_shift() && left(walker) == 0) break;
+    if (walker.length_here() > left(walker)) break;
+    walker.at += walker.length_here();
+  }
+  return text.length - left(walker);
+}
+
 template <class Kind, class Unit = typename Kind::Unit>
 int32_t compare_call(const char* function, LXLocale* locale, const Unit* str1, uint32_t state1, int32_t len1,
                      const Unit* str2, uint32_t state2, int32_t len2, uint32_t options) {
-  return locale_call(trace_unit, function, locale, options, kCompareOptions, int32_t{0}, [&](LocaleCall& call) {
+  constexpr uint32_t kAny = ~0u;  // bad ones are traced too
+  return locale_call(trace_unit, function, locale, options, kAny, int32_t{0}, [&](LocaleCall& call) -> int32_t {
     const CodePage& page = page_of(call.locale);
+    const bool shifted = Kind::kShifted && page.shift_sensitive;
+    if (shifted) LX_TRACE(TRC1_LEVEL_DETAIL, "Options = %08x", options);
+    if (std::same_as<Unit, LXUChar>) LX_TRACE(TRC1_LEVEL_DETAIL, "options = %08x", options);
+    if ((options & ~kCompareOptions) != 0) return call.fail(LX_E_ARGUMENT, 0);
     auto a = text_to_compare<Kind>(page, str1, state1, len1, options);
     auto b = text_to_compare<Kind>(page, str2, state2, len2, options);
-    if (Kind::kShifted && page.shift_sensitive) {
-      LX_TRACE(TRC1_LEVEL_DETAIL, "Options = %08x", options);
+    if (shifted) {
       LX_TRACE(TRC1_LEVEL_DETAIL, "len1 = %d, str1state = %d, len2 = %d, str2state = %d", static_cast<int>(a.length),
                static_cast<int>(a.state), static_cast<int>(b.length), static_cast<int>(b.state));
-    } else if (std::same_as<Unit, LXUChar>) {
-      LX_TRACE(TRC1_LEVEL_DETAIL, "options = %08x", options);
     }
-    dump("String1", a.at, a.length * sizeof(Unit));
-    dump("String2", b.at, b.length * sizeof(Unit));
-    int32_t result = compare_texts<Kind>(call, a, b, options);
-    if (Kind::kShifted && page.shift_sensitive && result != 0) {
-      LX_TRACE(TRC1_LEVEL_DETAIL, "Strings are unequal: len1 = %d, len2 = %d", static_cast<int>(a.length),
-               static_cast<int>(b.length));
-    }
-    return result;
+    dump_both(a.at, a.length * sizeof(Unit), b.at, b.length * sizeof(Unit));
+    return compare_texts<Kind>(call, a, b, options);
   });
 }
 
@@ -223,9 +242,10 @@ int32_t LXStrcmpU(LXLocale* locale, const LXUChar* ustr1, int32_t len1, const LX
 
 int32_t AdjustLength(LXLocale* locale, const char* str, uint32_t state, int32_t len) noexcept {
   return locale_call(trace_unit, __func__, locale, 0, 0, int32_t{0}, [&](LocaleCall& call) {
-    Text<char> text = {str, len > 0 ? static_cast<size_t>(len) : 0, state};
-    return static_cast<int32_t>(
-        ShiftedKind::with_walker(page_of(call.locale), text, [](auto walker) { return whole_length(walker); }));
+    const CodePage& page = page_of(call.locale);
+    const Text<char> text = {str, len > 0 ? static_cast<size_t>(len) : 0, state};
+    if (page.shift_sensitive) return static_cast<int32_t>(whole_mixed_length(page, text));
+    return static_cast<int32_t>(PlainKind::with_walker(page, text, [](auto walker) { return whole_length(walker); }));
   });
 }
 

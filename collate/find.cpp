@@ -71,24 +71,35 @@ Character wanted_bytes(const CodePage& page, const char* ch, bool shifted, uint3
 template <class Kind>
 class FirstForm {
  public:
-  FirstForm(const LXLocale& locale, Fold fold)
+  // `whole_texts`: what is compared is mapped as a whole, so that what one character becomes may be the same as what
+  // two others do.
+  FirstForm(const LXLocale& locale, Fold fold, bool whole_texts)
       : characters_(page_of(locale)),
         specials_(fold == Fold::upper ? locale.language : nullptr, kUpperSpecialSlot),
-        fold_(fold) {}
+        fold_(fold),
+        whole_texts_(whole_texts && !specials_.empty()) {}
 
   struct Form {
-    Character first;
+    Character first;  // no units: the next character has a part in it
     Character second;
     bool operator==(const Form&) const = default;
   };
+  // False: texts that begin with these are not the same.
+  bool may_begin_alike(const Form& a, const Form& b) const {
+    if (!whole_texts_) return a == b;
+    return a.first == b.first || a.first.units == 0 || b.first.units == 0;
+  }
   Form of(const Character& character) const {
     if (fold_ == Fold::none) return {character, {}};
     if (fold_ == Fold::half_width) return {characters_.full_to_half(character), {}};
     if (!specials_.empty()) {
       uint16_t ucs2 = characters_.to_unicode(character);
-      if (const SpecialPair* pair = specials_.may_begin(ucs2) ? specials_.find(ucs2, 0) : nullptr) {
-        return {characters_.from_unicode(pair->value1),
-                pair->value2 != 0 ? characters_.from_unicode(pair->value2) : Character{}};
+      if (specials_.may_begin(ucs2)) {
+        if (const SpecialPair* pair = specials_.find(ucs2, 0)) {
+          return {characters_.from_unicode(pair->value1),
+                  pair->value2 != 0 ? characters_.from_unicode(pair->value2) : Character{}};
+        }
+        if (whole_texts_) return {};
       }
     }
     return {characters_.upper(character), {}};
@@ -98,6 +109,7 @@ class FirstForm {
   CharactersOf<Kind> characters_;
   SpecialPairs specials_;
   Fold fold_;
+  bool whole_texts_;
 };
 
 template <class Walker>
@@ -116,14 +128,14 @@ Found find_text(LocaleCall& call, Walker text, Walker pattern, const Text<typena
   // Single-byte pages are compared by their bytes, of which each has one width.
   const bool whole_bytes = Kind::kBytes && page_of(call.locale).max_length == 1;
   const Fold fold = whole_bytes && fold_of(options) == Fold::half_width ? Fold::none : fold_of(options);
-  const FirstForm<Kind> forms(call.locale, fold);
+  const FirstForm<Kind> forms(call.locale, fold, whole_bytes);
   const size_t count = count_characters(pattern);
   Character first;
   Walker(pattern).next(first);
   const auto wanted = forms.of(first);
   Character character;
   for (Walker at = text; text.next(character); at = text) {
-    if (forms.of(character) != wanted) continue;
+    if (!forms.may_begin_alike(forms.of(character), wanted)) continue;
     Found found = found_before(begin, text, character);
     if (fold == Fold::none) {
       if (starts_with(at, pattern)) return found;
@@ -155,6 +167,9 @@ Unit* find_text_call(const char* function, LXLocale* locale, const Unit* str, ui
                static_cast<int>(pattern.length));
     }
     if (text.length == 0) return kNone;
+    // Folded and trimmed, a terminator may be the same as nothing. What has none in it is not found there.
+    bool ends_text = std::find(pattern.at, pattern.at + pattern.length, Unit{0}) == pattern.at + pattern.length;
+    if (len < 0 && ends_text) --text.length;
     size_t given = pattern.length;
     size_t characters = Kind::with_walker(page, pattern, [](auto walker) { return count_characters(walker); });
     pattern.length = Kind::with_walker(page, pattern, [](auto walker) { return whole_length(walker); });

@@ -11,7 +11,13 @@ namespace {
 
 TRC1_Unit trace_unit = {"Lexaro", "transform", 0};
 
-constexpr size_t kShortWork = 1024;
+// A length as the calls return it; -1: no result holds it.
+int32_t key_length(size_t length) { return length <= INT32_MAX ? static_cast<int32_t>(length) : -1; }
+
+// Of a key that could be made, or the failure.
+int32_t length_or_failure(LocaleCall& call, int32_t length) {
+  return length >= 0 ? length : call.fail(LX_E_MEMORY, -1);
+}
 
 // ---- Keys ----
 
@@ -46,6 +52,7 @@ size_t pack_specials(Level<LXSpecialWeight>& level, bool alone) {
 }
 
 KeyParts finish_levels(const SortTables& sort, Levels& levels) {
+  levels.finish();
   drop_trailing(levels.secondary, sort.default_secondary);
   drop_trailing(levels.tertiary, sort.default_tertiary);
   bool alone = levels.primary.size() + levels.secondary.size() + levels.tertiary.size() == 0;
@@ -88,9 +95,12 @@ size_t file_plain(const SortTables& sort, Levels& levels, const LXUChar* charact
     *tertiary++ = static_cast<uint8_t>(weights);
   }
   if (primary != levels.primary.end) {
-    levels.primary.end = levels.primary.insertion = primary;
-    levels.secondary.end = levels.secondary.insertion = secondary;
-    levels.tertiary.end = levels.tertiary.insertion = tertiary;
+    levels.primary.end_run();
+    levels.secondary.end_run();
+    levels.tertiary.end_run();
+    levels.primary.end = levels.primary.run = primary;
+    levels.secondary.end = levels.secondary.run = secondary;
+    levels.tertiary.end = levels.tertiary.run = tertiary;
   }
   return i;
 }
@@ -108,6 +118,12 @@ void file_characters(const SortTables& sort, Levels& levels, const LXUChar* char
     }
     for (unsigned set = 0; set < weights.count; ++set) levels.file(weights.sets[set], position, weights.mask);
   }
+}
+
+int32_t make_empty_key(uint8_t* key, size_t size) {
+  constexpr int32_t kLength = 3;
+  if (size >= kLength) std::memset(key, 0, kLength);
+  return kLength;
 }
 
 // ---- Characters ----
@@ -153,7 +169,7 @@ int32_t copy_as_key(uint8_t* key, size_t size, const Text<Unit>& text) {
       for (size_t byte = sizeof(Unit); byte-- > 0;) *key++ = static_cast<uint8_t>(text.at[i] >> 8 * byte);
     }
   }
-  return static_cast<int32_t>(length);
+  return key_length(length);
 }
 
 // The page's bytes of the characters, as many as fit; the length of all.
@@ -166,10 +182,20 @@ int32_t write_as_key(const CodePage& page, uint8_t* key, size_t size, const LXUC
     if (length + added <= size) std::memcpy(key + length, bytes, added);
     length += added;
   }
-  return static_cast<int32_t>(length);
+  return key_length(length);
 }
 
 // ---- The calls ----
+
+// One weight into a level whose weights may be read at any time.
+template <class Element>
+void insert(Element** insertion, Element** end, const Element& element, bool in_order) {
+  Element* at = in_order ? *end : *insertion;
+  std::memmove(at + 1, at, static_cast<size_t>(*end - at) * sizeof(Element));
+  *at = element;
+  ++*end;
+  if (in_order) *insertion = *end;
+}
 
 template <class Kind, class Unit = typename Kind::Unit>
 int32_t transform_call(const char* function, LXLocale* locale, void* key, int32_t key_size, const Unit* str,
@@ -187,14 +213,11 @@ int32_t transform_call(const char* function, LXLocale* locale, void* key, int32_
 }  // namespace
 
 int32_t make_key(const SortTables& sort, uint8_t* key, size_t size, const LXUChar* characters, size_t count) {
-  if (count == 0) {
-    if (size >= 3) std::memset(key, 0, 3);
-    return 3;
-  }
+  if (count == 0) return make_empty_key(key, size);
   size_t area_size = Levels::area_size(count);
   size_t gap = (4 - (reinterpret_cast<uintptr_t>(key) & 3)) & 3;
   bool inside = size >= gap + area_size;
-  WorkArea<kShortWork> area;
+  WorkArea area;
   if (!inside && !area.reserve(area_size)) return -1;
   Levels levels(inside ? key + gap : area.get(), count);
   file_characters(sort, levels, characters, count);
@@ -203,7 +226,7 @@ int32_t make_key(const SortTables& sort, uint8_t* key, size_t size, const LXUCha
     assemble(key, levels, parts);
     if (inside) std::memset(key + parts.length(), 0, size - parts.length());
   }
-  return static_cast<int32_t>(parts.length());
+  return key_length(parts.length());
 }
 
 template <class Kind>
@@ -216,23 +239,19 @@ int32_t transform_text(LocaleCall& call, uint8_t* key, size_t size, const Text<t
     std::memset(key, 0, std::min(size, size_t{3}));
     return 3;
   }
-  if (sort == nullptr && options == 0) return copy_as_key(key, size, text);
+  if (sort == nullptr && options == 0) return length_or_failure(call, copy_as_key(key, size, text));
   if constexpr (std::same_as<Kind, Ucs2Kind>) {
-    if (options == 0) {
-      int32_t length = make_key(*sort, key, size, text.at, text.length);
-      return length >= 0 ? length : call.fail(LX_E_MEMORY, -1);
-    }
+    if (options == 0) return length_or_failure(call, make_key(*sort, key, size, text.at, text.length));
   }
-  WorkArea<kShortWork> area;
+  WorkArea area;
   if (!area.reserve(text.length * 2 * sizeof(LXUChar))) return call.fail(LX_E_MEMORY, -1);
   auto* characters = reinterpret_cast<LXUChar*>(area.get());
   const SpecialPairs specials(options == LX_CMP_NOCASE ? call.locale.language : nullptr, kUpperSpecialSlot);
   size_t count = Kind::with_walker(page, text, [&](auto walker) {
     return read_folded(walker, CharactersOf<Kind>(page), fold_of(options), specials, characters);
   });
-  if (sort == nullptr) return write_as_key(page, key, size, characters, count);
-  int32_t length = make_key(*sort, key, size, characters, count);
-  return length >= 0 ? length : call.fail(LX_E_MEMORY, -1);
+  return length_or_failure(call, sort != nullptr ? make_key(*sort, key, size, characters, count)
+                                                 : write_as_key(page, key, size, characters, count));
 }
 
 template int32_t transform_text<PlainKind>(LocaleCall&, uint8_t*, size_t, const Text<char>&, uint32_t);
@@ -268,30 +287,25 @@ int32_t LXStrxfrmU(LXLocale* locale, void* key, int32_t key_size, const LXUChar*
 
 int32_t LXStrGenSortKey(LXLocale* locale, void* key, int32_t key_size, const LXUChar* chars, int32_t count) noexcept {
   return locale_call(trace_unit, __func__, locale, 0, 0, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
-    const SortTables* sort = sort_of(call.locale);
-    if (sort == nullptr) return call.fail(LX_E_ARGUMENT, -1);
     Text<LXUChar> text = given_text<Ucs2Kind>(page_of(call.locale), chars, 0, count, 0, Terminator::excluded);
     size_t size = key != nullptr && key_size > 0 ? static_cast<size_t>(key_size) : 0;
-    int32_t length = make_key(*sort, static_cast<uint8_t*>(key), size, text.at, text.length);
-    return length >= 0 ? length : call.fail(LX_E_MEMORY, -1);
+    auto* bytes = static_cast<uint8_t*>(key);
+    if (text.length == 0) return make_empty_key(bytes, size);
+    const SortTables* sort = sort_of(call.locale);
+    if (sort == nullptr) return call.fail(LX_E_ARGUMENT, -1);
+    return length_or_failure(call, make_key(*sort, bytes, size, text.at, text.length));
   });
 }
 
 void LXStrInsertWeights(uint16_t primary, uint16_t** p_ins, uint16_t** p_end, uint8_t secondary, uint8_t** s_ins,
                         uint8_t** s_end, uint8_t tertiary, uint8_t** t_ins, uint8_t** t_end, uint16_t special,
                         LXSpecialWeight** x_ins, LXSpecialWeight** x_end, uint16_t position, uint8_t mask) noexcept {
-  auto file = [&](auto weight, auto** insertion, auto** end, auto element, uint8_t bit) {
-    if (weight == 0) return;
-    Level level(*insertion);
-    level.end = *end;
-    level.file(element, (mask & bit) != 0);
-    *insertion = level.insertion;
-    *end = level.end;
-  };
-  file(primary, p_ins, p_end, primary, kPrimaryInOrder);
-  file(secondary, s_ins, s_end, secondary, kSecondaryInOrder);
-  file(tertiary, t_ins, t_end, tertiary, kTertiaryInOrder);
-  file(special, x_ins, x_end, LXSpecialWeight{position, special}, kSpecialInOrder);
+  exported(trace_unit, __func__, [&] {
+    if (primary != 0) insert(p_ins, p_end, primary, (mask & kPrimaryInOrder) != 0);
+    if (secondary != 0) insert(s_ins, s_end, secondary, (mask & kSecondaryInOrder) != 0);
+    if (tertiary != 0) insert(t_ins, t_end, tertiary, (mask & kTertiaryInOrder) != 0);
+    if (special != 0) insert(x_ins, x_end, LXSpecialWeight{position, special}, (mask & kSpecialInOrder) != 0);
+  });
 }
 
 }  // extern "C"

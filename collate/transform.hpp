@@ -15,7 +15,6 @@ inline bool is_transform(uint32_t options) {
 }
 
 // A block for short work on the stack, for longer work from the allocation callback.
-template <size_t kOnStack>
 class WorkArea {
  public:
   // False: no memory.
@@ -29,6 +28,8 @@ class WorkArea {
   uint8_t* get() const { return at_; }
 
  private:
+  static constexpr size_t kOnStack = 256;
+
   alignas(8) uint8_t here_[kOnStack];
   uint8_t* at_ = here_;
   Owned<uint8_t> block_;
@@ -40,7 +41,7 @@ template <class Kind>
 int32_t transform_text(LocaleCall& call, uint8_t* key, size_t size, const Text<typename Kind::Unit>& text,
                        uint32_t options);
 
-// Of UCS-2 characters; -1: no memory.
+// Of UCS-2 characters; -1: no memory, or a key that is too long for the result.
 int32_t make_key(const SortTables& sort, uint8_t* key, size_t size, const LXUChar* characters, size_t count);
 
 // Two texts by the locale's sort object, or in the order of their code page when it has none. Options as in the calls,

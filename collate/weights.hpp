@@ -2,7 +2,7 @@
 // Texts read as weights, and weights filed by level.
 #pragma once
 
-#include <cstring>
+#include <algorithm>
 
 #include "codepage/text/text_kinds.hpp"
 #include "objects/sort_object.hpp"
@@ -68,25 +68,24 @@ class WeightReader {
 };
 
 // The weights of one level: its elements, in the order in which they count. A run of weights that are not in text order
-// stands reversed behind the last one that is.
+// stands reversed behind the last one that is. It is turned round once, where it ends.
 template <class Element>
 struct Level {
   Element* begin;
-  Element* insertion;
+  Element* run;  // not turned yet; it reaches to the end
   Element* end;
 
-  explicit Level(Element* at) : begin(at), insertion(at), end(at) {}
+  explicit Level(Element* at) : begin(at), run(at), end(at) {}
   size_t size() const { return static_cast<size_t>(end - begin); }
-  void append(const Element& element) {
+  void end_run() {
+    if (run != end) std::reverse(run, end);
+    run = end;
+  }
+  void file(const Element& element, bool in_order) {
+    if (in_order) end_run();
     *end++ = element;
-    insertion = end;
+    if (in_order) run = end;
   }
-  void insert(const Element& element) {
-    std::memmove(insertion + 1, insertion, static_cast<size_t>(end - insertion) * sizeof(Element));
-    *insertion = element;
-    ++end;
-  }
-  void file(const Element& element, bool in_order) { in_order ? append(element) : insert(element); }
 };
 
 struct Levels {
@@ -111,6 +110,13 @@ struct Levels {
     if (set.secondary != 0) secondary.file(set.secondary, (mask & kSecondaryInOrder) != 0);
     if (set.tertiary != 0) tertiary.file(set.tertiary, (mask & kTertiaryInOrder) != 0);
     if (set.special != 0) special.file({position, set.special}, (mask & kSpecialInOrder) != 0);
+  }
+  // Behind the last set.
+  void finish() {
+    primary.end_run();
+    secondary.end_run();
+    tertiary.end_run();
+    special.end_run();
   }
 };
 

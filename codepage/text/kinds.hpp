@@ -36,7 +36,7 @@ struct PlainKind {
   }
   static size_t length_of_characters(const CodePage& page, const Text<char>& text, size_t characters) {
     const uint8_t* at = bytes_of(text.at);
-    if (page.max_length == 1 || page.shift_sensitive) return characters;  // here every byte is one
+    if (page.kind == PageKind::single) return characters;  // mixed pages too, where shift bytes are not followed
     for (; characters != 0; --characters) at += page.char_length[*at];
     return static_cast<size_t>(at - bytes_of(text.at));
   }
@@ -55,6 +55,20 @@ struct ShiftedKind {
   static size_t length_of_characters(const CodePage& page, const Text<char>& text, size_t characters) {
     return bytes_of_characters(page, bytes_of(text.at), text.state, characters);
   }
+  // With the shift byte that closes the double-byte run in which they end, for it belongs to the last of them. Only
+  // such a run is looked at behind its characters: a caller that counts them has it closed there.
+  static size_t length_with_run_closed(const CodePage& page, const Text<char>& text, size_t characters) {
+    const size_t length = length_of_characters(page, text, characters);
+    if (!page.shift_sensitive) return length;
+    ShiftedWalker walker(page, bytes_of(text.at), length, text.state);
+    for (Character character; walker.next(character);) {
+    }
+    while (walker.double_byte) {
+      walker.end = walker.at + 1;
+      if (!walker.skip_shift()) break;
+    }
+    return static_cast<size_t>(walker.at - bytes_of(text.at));
+  }
 };
 
 template <class U>
@@ -71,5 +85,15 @@ struct UnitKind {
 };
 using WideKind = UnitKind<LXWChar>;
 using Ucs2Kind = UnitKind<LXUChar>;
+
+// Units of a text that is given as so many characters, where the units themselves count and not only what they mean.
+template <class Kind>
+size_t length_of_counted(const CodePage& page, const Text<typename Kind::Unit>& text, size_t characters) {
+  if constexpr (Kind::kShifted) {
+    return Kind::length_with_run_closed(page, text, characters);
+  } else {
+    return Kind::length_of_characters(page, text, characters);
+  }
+}
 
 }  // namespace lx

@@ -275,7 +275,8 @@ extern LX_API LXFreeFn lxfree_cbk;
  * without control.nls) means the variable LX_LOCALEDIR, then the default directory. All memory is taken from
  * `alloc_cbk` and returned to `free_cbk` with `alloc_context` (null: the system allocator); only the first call's
  * callbacks count. `options`: LX_INIT_NO_DEFAULTS or 0. The first call of a process must not race with another.
- * Returns 0, LX_E_DEFAULTS (usable, on built-in English/UnitedStates/US-ASCII), LX_E_MANAGER or LX_E_MEMORY.
+ * Returns 0, LX_E_MANAGER, LX_E_MEMORY, or LX_E_DEFAULTS when the data could not be read: the library runs on built-in
+ * English/UnitedStates/US-ASCII, or, with LX_INIT_NO_DEFAULTS or when memory ran out, finds no object at all.
  */
 LX_API uint32_t LXInit(const char* directory, LXAllocFn alloc_cbk, LXFreeFn free_cbk, void* alloc_context,
                        uint32_t options) LX_NOEXCEPT;
@@ -341,12 +342,13 @@ extern LX_API const uint8_t LXDefCP3[128];
 
 /* Finds and reads the control file as LXInit does. rc: 0 or the last error; null only when nothing can be allocated. */
 LX_API LXObjMgr* LXInitObjManager(const char* directory, uint32_t options, uint32_t* rc) LX_NOEXCEPT;
-/* Unloads all objects and frees the manager: 0, or 1 when a free callback failed. */
+/* Unloads all objects and frees the manager: 0, or 1 or LX_E_FREE when a free callback failed. */
 LX_API uint32_t LXTermObjManager(LXObjMgr* manager) LX_NOEXCEPT;
 /*
  * The entry of that type and name (case is ignored; name_length may include the terminator; negative: strlen),
  * loaded unless no_load is 1. Null with rc LX_E_NOTFOUND, or rc 0 for the binary sort. An entry whose file cannot be
- * read is served with built-in data: the entry comes together with the error in rc.
+ * read is served with built-in data: the entry comes together with the error in rc. Of a sort, and with
+ * LX_INIT_NO_DEFAULTS of anything, there are none: null with that error.
  */
 LX_API LXObjEntry* LXGetObjFromName(LXObjMgr* manager, uint8_t type, const char* name, int32_t name_length,
                                     int32_t no_load, uint32_t* rc) LX_NOEXCEPT;
@@ -358,7 +360,11 @@ LX_API LXObjEntry* LXGetObjFromID(LXObjMgr* manager, uint8_t type, uint16_t id, 
 LX_API LXObjEntry* LXLoadObj(LXObjMgr* manager, LXObjEntry* entry, uint32_t* rc) LX_NOEXCEPT;
 LX_API uint32_t LXUnloadObj(LXObjMgr* manager, LXObjEntry* entry) LX_NOEXCEPT;      /* 0 or LX_E_FREE */
 LX_API uint32_t LXLoadDefaultObj(LXObjMgr* manager, LXObjEntry* entry) LX_NOEXCEPT; /* 0; 1: type without built-in */
-LX_API uint32_t LXLoadDefaults(LXObjMgr* manager) LX_NOEXCEPT;                      /* 1; 0: no memory */
+/*
+ * Makes the built-in objects the only ones that the manager finds: 1; 0: no memory. Entries that it gave out before
+ * stay valid as long as it lives. No other thread uses the manager meanwhile.
+ */
+LX_API uint32_t LXLoadDefaults(LXObjMgr* manager) LX_NOEXCEPT;
 
 /* The aliases of alias.txt: 0, or 1 when the file could not be used completely (what was read stays usable). */
 LX_API uint32_t LXBuildAliasList(LXObjMgr* manager) LX_NOEXCEPT;
@@ -432,7 +438,8 @@ LX_API int32_t LXGetLocaleTextInfoEx(LXLocale* locale, uint32_t item, char* buff
 /*
  * Sets the text of an item for this locale, or swaps the object of that name. options: 0 or LX_OPT_CHARS (length counts
  * characters). Length 0 and the empty text change nothing; an empty separator is set as one zero byte (60 and 67 only).
- * A separator is one byte, no digit, and differs from its partner (59 and 60, 66 and 67).
+ * A separator is one byte, no digit, and differs from its partner (59 and 60, 66 and 67); a list separator (61) may be
+ * a digit.
  * 1, or 0 with LX_E_ARGUMENT, LX_E_ITEM, LX_E_NOTFOUND (value refused, no such object) or LX_E_MEMORY.
  */
 LX_API int32_t LXSetLocaleTextInfo(LXLocale* locale, uint32_t item, const char* text, int32_t length,
@@ -493,7 +500,8 @@ LX_API LXWChar LXCpUnicodeToCharW(const LXObjEntry* record, LXUChar ucs2) LX_NOE
 /* The other width of a character; 0 when there is none. */
 LX_API LXWChar LXCpMbHalfToFullW(const LXObjEntry* record, LXWChar packed) LX_NOEXCEPT;
 LX_API LXWChar LXCpFullToHalfW(const LXObjEntry* record, LXWChar packed) LX_NOEXCEPT;
-/* Converts the older code page layout; both results come from the allocation callback. Null: no memory. */
+/* Converts the older code page layout; both results come from the allocation callback. Null: no memory, or sections
+   that are none of that layout. */
 LX_API uint8_t* LXCpV1toV2(const uint8_t* v1_section1, uint16_t v1_section1_size, const uint8_t* v1_section2,
                            uint16_t v1_section2_size, uint8_t** out_section2) LX_NOEXCEPT;
 LX_API LXWChar LXMbToW(const LXObjEntry* record, const char* bytes) LX_NOEXCEPT;
@@ -512,8 +520,9 @@ LX_API LXWChar LXCpMbCaseConvW(const LXObjEntry* record, LXWChar packed, uint32_
 /* ---- Conversion ---- */
 /*
  * Plain text is bytes of the locale's code page, W text packed characters of it, U text UCS-2. The Ex forms read and
- * write shift bytes of mixed host pages: a shift state is 0 (single-byte) or 1 (double-byte), and finished output
- * always ends in state 0. Flags: LX_OPT_TERMINATE, LX_OPT_CHARS; others give -1 with LX_E_ARGUMENT.
+ * write shift bytes of mixed host pages: a shift state is 0 (single-byte) or 1 (double-byte), and output ends in state
+ * 0 unless there is no room for a single unit or nothing to write. The plain forms write no shift bytes.
+ * Flags: LX_OPT_TERMINATE, LX_OPT_CHARS; others give -1 with LX_E_ARGUMENT.
  * Results count the units written, with the terminator when one is written: with LX_OPT_TERMINATE, or when the length
  * was measured, all input was converted and there is room. A character cut off by the end of the input is dropped.
  */
@@ -531,7 +540,8 @@ LX_API uint32_t LXCloseConversion(LXConversion* handle) LX_NOEXCEPT; /* 0 or LX_
 LX_API uint32_t LXConvertBuffer(LXConversion* handle, char** out, int32_t* out_room, const char** in, int32_t* in_left,
                                 uint32_t reserved) LX_NOEXCEPT;
 /* Most target bytes for one source byte of well-formed text, without changed line ends and the final shift byte. A byte
-   of malformed text takes up to three in UTF-8. */
+   of malformed text takes up to three in UTF-8. Between equal code pages it is 1, though one that has several codes
+   for a character may write a longer one than it read. */
 LX_API int32_t LXConversionRatio(LXLocale* target_locale, LXLocale* source_locale, uint32_t reserved) LX_NOEXCEPT;
 
 /* From the source's code page into the target's; the status stands in the target locale. */
@@ -644,7 +654,7 @@ LX_API char* LXNextCharEx(LXLocale* locale, const char* s, uint32_t state, uint3
 LX_API char* LXPrevChar(LXLocale* locale, const char* start, const char* current) LX_NOEXCEPT;
 LX_API char* LXPrevCharEx(LXLocale* locale, const char* start, const char* current, uint32_t state,
                           uint32_t* new_state) LX_NOEXCEPT;
-/* Whole characters; shift bytes are none. */
+/* Whole characters; to the Ex form shift bytes are none. */
 LX_API int32_t LXNumChars(LXLocale* locale, const char* s, int32_t byte_length) LX_NOEXCEPT;
 LX_API int32_t LXNumCharsEx(LXLocale* locale, const char* s, uint32_t state, int32_t byte_length) LX_NOEXCEPT;
 /* The last character start that is not more than `count` bytes (LX_OPT_CHARS: characters) away. */
@@ -721,6 +731,8 @@ LX_API int32_t LXMapStringU(LXLocale* locale, LXUChar* out, int32_t out_size, co
 /*
  * No function here cuts a character. Lengths count units, with LX_OPT_CHARS characters; negative ones are measured,
  * with the terminator where the text is copied or searched, without it where it is spanned, joined or cut into tokens.
+ * In the Ex forms, here and for collation, a text whose characters are counted must not end inside a double-byte run:
+ * the shift byte that closes the run is read, and belongs to the last character.
  */
 
 /*
@@ -748,7 +760,7 @@ LX_API int32_t LXWcscpy(LXLocale* locale, LXWChar* dst, int32_t dst_size, const 
 LX_API int32_t LXStrcpyU(LXLocale* locale, LXUChar* dst, int32_t dst_size, const LXUChar* src, int32_t src_len,
                          uint32_t options) LX_NOEXCEPT;
 /* Appends to a terminated text, which must have the room; LX_OPT_TERMINATE, or a measured length, terminates it.
-   Returns the new length, with the terminator when one was written. */
+   Returns the new length, with the terminator when one was written; for a src_len of 0, with the one that is there. */
 LX_API int32_t LXStrcat(LXLocale* locale, char* dst, const char* src, int32_t src_len, uint32_t options) LX_NOEXCEPT;
 LX_API int32_t LXStrcatEx(LXLocale* locale, char* dst, const char* src, uint32_t state, int32_t src_len,
                           uint32_t options) LX_NOEXCEPT;
@@ -857,10 +869,12 @@ LX_API int32_t LXWcscoll(LXLocale* locale, const LXWChar* wstr1, int32_t len1, c
 LX_API int32_t LXStrcollU(LXLocale* locale, const LXUChar* ustr1, int32_t len1, const LXUChar* ustr2, int32_t len2,
                           uint32_t options) LX_NOEXCEPT;
 /*
- * A key whose bytes compare (memcmp, then length) as the texts do. options: 0, LX_CMP_NOCASE, LX_CMP_NOWIDTH,
- * LX_OPT_CHARS. Returns the length of the whole key, -1 with LX_E_ARGUMENT or LX_E_MEMORY; a key longer than key_size
- * was not written (but for an empty text: as much of its three zero bytes as fits; 0 without room). The rest of a
- * buffer that held the work area (16 bytes a character) is zeroed.
+ * A key whose bytes compare (memcmp, then length) as the texts do; but in sorts with pairs of letters that count as one
+ * LXStrcoll may call texts equal, or order them otherwise, that are told apart by nothing but the places of their
+ * punctuation (special weights). options: 0, LX_CMP_NOCASE, LX_CMP_NOWIDTH, LX_OPT_CHARS.
+ * Returns the length of the whole key, -1 with LX_E_ARGUMENT or LX_E_MEMORY; a key longer than key_size was not written
+ * (but for an empty text: as much of its three zero bytes as fits; 0 without room). The rest of a buffer that held the
+ * work area (16 bytes a character) is zeroed.
  */
 LX_API int32_t LXStrxfrm(LXLocale* locale, void* key, int32_t key_size, const char* str, int32_t len,
                          uint32_t options) LX_NOEXCEPT;
@@ -870,7 +884,7 @@ LX_API int32_t LXWcsxfrm(LXLocale* locale, void* key, int32_t key_size, const LX
                          uint32_t options) LX_NOEXCEPT;
 LX_API int32_t LXStrxfrmU(LXLocale* locale, void* key, int32_t key_size, const LXUChar* ustr, int32_t len,
                           uint32_t options) LX_NOEXCEPT;
-/* The same from UCS-2; -1: no memory. */
+/* The same from UCS-2. Always 3 for an empty text; -1 with LX_E_MEMORY, or without a sort object LX_E_ARGUMENT. */
 LX_API int32_t LXStrGenSortKey(LXLocale* locale, void* key, int32_t key_size, const LXUChar* chars,
                                int32_t count) LX_NOEXCEPT;
 /* Files one set of weights into the arrays of the four levels: each has an insertion point and an end. */
@@ -941,8 +955,9 @@ LX_API double LXStringToDoubleEx(LXLocale* locale, const char* string, uint32_t 
                                  uint32_t* end_state, uint32_t flags) LX_NOEXCEPT;
 /*
  * An amount with the locale's currency symbol (LX_NUM_INTLSYM: the international one) and sign, of which three
- * characters count when it is negative. The decimal point always comes, also before no fraction digits. At most 512
- * bytes with LX_NUM_CHARLEN. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE, LX_NUM_INTLSYM, LX_NUM_CHARLEN.
+ * characters count when it is negative. The decimal point always comes, also before no fraction digits. With
+ * LX_NUM_CHARLEN the plain and the Ex form write at most 512 bytes. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE,
+ * LX_NUM_INTLSYM, LX_NUM_CHARLEN.
  */
 LX_API int32_t LXCurrencyToString(LXLocale* locale, double amount, char* buffer, int32_t length,
                                   uint32_t flags) LX_NOEXCEPT;
@@ -1007,7 +1022,8 @@ LX_API extern const int32_t LXEbcdic930ToNum[256];
  * Returns the units written, with the terminator; with LX_NUM_CHARLEN characters, in which `length` and
  * `format_length` count then too. What was written is returned for every error but a bad flag (-1, LX_E_ARGUMENT):
  * LX_E_BUFFER, LX_E_NOTFOUND (a field out of range), LX_E_FORMAT. %x, %X and the date of %c are written at the start
- * of the buffer: use them first in a format. flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE, LX_NUM_CHARLEN.
+ * of the buffer: use them first in a format. With LX_NUM_CHARLEN the plain and the Ex form write at most 512 bytes.
+ * flags: LX_NUM_TEXTOPT, LX_NUM_TERMINATE, LX_NUM_CHARLEN.
  */
 LX_API int32_t LXTimeToString(LXLocale* locale, const LXTime* time, char* buffer, int32_t length, const char* format,
                               int32_t format_length, uint32_t flags) LX_NOEXCEPT;
@@ -1078,7 +1094,10 @@ LX_API uint32_t LXStrExtractTimeEx(LXLocale* locale, LXTime* time, const char* s
                                    int32_t* position, int32_t length, const char* format, uint32_t* format_state,
                                    int32_t* format_position, int32_t format_length, int32_t* afternoon, int32_t ascii,
                                    uint32_t flags) LX_NOEXCEPT;
-/* Reads a number of at most `max_digits`: -1 when there is none; *error LX_E_NOTFOUND, also above `max_value`. */
+/*
+ * Reads a number of at most `max_digits`: -1 when there is none (0 at the end of the text); *error LX_E_NOTFOUND, also
+ * above `max_value`.
+ */
 LX_API int32_t LXStrReadNumber(uint32_t* error, const char* string, int32_t* position, int32_t length,
                                int32_t max_digits, int32_t max_value, int32_t ascii) LX_NOEXCEPT;
 LX_API int32_t LXStrReadNumberW(uint32_t* error, const LXWChar* string, int32_t* position, int32_t length,
@@ -1140,15 +1159,15 @@ LX_API int32_t LXReadStringW(LXStream* stream, LXLocale* locale, LXWChar* buffer
                              uint32_t flags) LX_NOEXCEPT;
 LX_API int32_t LXReadStringEx(LXStream* stream, LXLocale* locale, char* buffer, int32_t size,
                               uint32_t flags) LX_NOEXCEPT;
-/* Puts a character back, to be read next: 1; 0 with LX_E_DIRECTION or LX_E_BUFFER (no room). */
+/* Puts a character back, to be read next: 1; 0 with LX_E_DIRECTION, LX_E_ARGUMENT (null s) or LX_E_BUFFER (no room). */
 LX_API int32_t LXUngetChar(LXStream* stream, LXLocale* locale, const char* s, uint32_t reserved) LX_NOEXCEPT;
 LX_API int32_t LXUngetCharU(LXStream* stream, LXLocale* locale, LXUChar ch, uint32_t reserved) LX_NOEXCEPT;
 LX_API int32_t LXUngetCharW(LXStream* stream, LXLocale* locale, LXWChar packed, uint32_t reserved) LX_NOEXCEPT;
 LX_API int32_t LXUngetCharEx(LXStream* stream, LXLocale* locale, const char* s, uint32_t state,
                              uint32_t reserved) LX_NOEXCEPT;
 /*
- * Writes a character, behind what is kept: 1; 0 with LX_E_DIRECTION, LX_E_REFUSED (kept, to be flushed later) or
- * LX_E_BUFFER (refused, and no room to keep it).
+ * Writes a character, behind what is kept: 1; 0 with LX_E_DIRECTION, LX_E_ARGUMENT (null s), LX_E_REFUSED (kept, to be
+ * flushed later) or LX_E_BUFFER (refused, and no room to keep it).
  */
 LX_API int32_t LXWriteChar(LXStream* stream, LXLocale* locale, const char* s) LX_NOEXCEPT;
 LX_API int32_t LXWriteCharU(LXStream* stream, LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
@@ -1217,7 +1236,8 @@ LX_API LXObjEntry* LXGetLocaleObject(LXLocale* locale, uint8_t type) LX_NOEXCEPT
 LX_API uint16_t LXGetObjId(const LXObjEntry* entry) LX_NOEXCEPT;
 LX_API uint8_t LXGetObjType(const LXObjEntry* entry) LX_NOEXCEPT;
 LX_API const char* LXGetObjName(const LXObjEntry* entry) LX_NOEXCEPT;
-/* Calls back with every alias and its code page, in the order of alias.txt, until the callback returns 0. Returns 0. */
+/* Calls back with every alias, in upper case, and its code page, in the order of alias.txt, until the callback
+   returns 0. Returns 0. The alias stays valid until the callback returns, the code page as long as the manager. */
 typedef int32_t (*LXEnumAliasFn)(void* context, const char* alias, const char* code_page);
 LX_API int32_t LXEnumAliases(LXObjMgr* manager, LXEnumAliasFn callback, void* context) LX_NOEXCEPT;
 /* Calls back with every native name that LXMapNativeLocale knows and the locale it means, until the callback returns 0.

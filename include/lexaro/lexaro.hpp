@@ -72,30 +72,35 @@ int32_t length(const Text& text) {
   return length_of(text.size());
 }
 
-// Calls `write(buffer, room)`, which gives the units written, with more room until the library says that it fits.
+// Room beyond what any character needs: as long as so much is left, none was left out.
+inline constexpr std::size_t kSpareRoom = 16;
+
+// Calls `write(buffer, room)`, which gives the units written, with more room until the library says that it fits. What
+// the locale's own formats of dates and times leave out shows in the room only.
 template <typename Text, typename Write>
 Text write_until_it_fits(const char* call, LXLocale* locale, Write write) {
   Text text(64, typename Text::value_type());
   for (;;) {
     const int32_t written = write(units(text), length(text));
     const uint32_t status = LXGetError(locale);
-    if (status != LX_E_BUFFER || text.size() >= (std::size_t{1} << 24)) {
+    const std::size_t used = static_cast<std::size_t>(std::max(written, 0));
+    const bool fits = status != LX_E_BUFFER && used + kSpareRoom <= text.size();
+    if (fits || text.size() >= (std::size_t{1} << 24)) {
       check(call, status);
-      text.resize(static_cast<std::size_t>(std::max(written, 0)));
+      text.resize(used);
       return text;
     }
     text.resize(text.size() * 2);
   }
 }
 
-// The same for calls that leave out silently what does not fit: enough room is more than any character needs.
+// The same for calls that leave out silently what does not fit.
 template <typename Text, typename Write>
 Text write_with_room_to_spare(std::size_t expected, Write write) {
-  constexpr std::size_t kSpare = 16;
-  Text text(expected + 2 * kSpare, typename Text::value_type());
+  Text text(expected + 2 * kSpareRoom, typename Text::value_type());
   for (;;) {
     const std::size_t written = write(units(text), length(text));
-    if (written + kSpare <= text.size()) {
+    if (written + kSpareRoom <= text.size()) {
       text.resize(written);
       return text;
     }
@@ -108,19 +113,21 @@ Text write_with_room_to_spare(std::size_t expected, Write write) {
 // ---- The library ----
 
 // The library, in use as long as this object lives; it outlives everything else here. `directory` holds the locale data
-// (null: as LXInit finds them). Throws unless the data are there, or `options` is 0 and the built-in objects stand in.
+// (null: as LXInit finds them). Throws unless the data are there, or `options` is 0 and the built-in objects stand in;
+// a library that is in use already has decided that.
 class Library {
  public:
   explicit Library(const char* directory = nullptr, uint32_t options = LX_INIT_NO_DEFAULTS) {
     const uint32_t status = LXInit(directory, nullptr, nullptr, nullptr, options);
     on_defaults_ = status == LX_E_DEFAULTS;
-    if (!on_defaults_) detail::check("LXInit", status);
+    if (on_defaults_ && options != 0) LXTerm();
+    if (!on_defaults_ || options != 0) detail::check("LXInit", status);
   }
   Library(Library&& other) noexcept : used_(std::exchange(other.used_, false)), on_defaults_(other.on_defaults_) {}
   ~Library() {
     if (used_) LXTerm();
   }
-  // Only English, the United States and US-ASCII are there.
+  // Only English, the United States and US-ASCII are there, as this object found when it was the first.
   bool on_defaults() const noexcept { return on_defaults_; }
 
  private:
@@ -200,7 +207,8 @@ class Locale {
     return ordered("LXStrcollU", LXStrcollU(get(), detail::units(a), detail::length(a), detail::units(b),
                                             detail::length(b), options));
   }
-  // Keys order as strings (operator<) as compare() orders the texts. They are bytes, zero bytes among them.
+  // Keys order as strings (operator<) as compare() orders the texts, but for what is said of LXStrxfrm and punctuation.
+  // They are bytes, zero bytes among them.
   std::string sort_key(std::string_view text, uint32_t options = 0) {
     return key_of([&](char* out, int32_t room) {
       return LXStrxfrmEx(get(), out, room, detail::units(text), detail::length(text), 0, options);

@@ -155,6 +155,8 @@ TEST(CollationMemory, RunsOut) {
     memory.arm(0, true);
     EXPECT_GT(LXStrGenSortKey(form.locale(), key + 1, 999999, units.data(), 3000), 0);
     EXPECT_EQ(memory.calls, 0);
+    EXPECT_GT(LXStrGenSortKey(form.locale(), key, 10, units.data(), 15), 0) << "short work is done on the stack";
+    EXPECT_EQ(LXStrGenSortKey(form.locale(), key, 10, units.data(), 16), -1);
     memory.disarm();
   }
   LXTerm();

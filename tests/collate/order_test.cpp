@@ -184,6 +184,10 @@ TEST_F(Order, KeysOfLongTexts) {
   int32_t length = LXStrGenSortKey(form.locale(), key.data(), static_cast<int32_t>(key.size()), units_at(text), 70000);
   ASSERT_EQ(length, 2 * 69999 + 3 + 4);
   EXPECT_EQ(key.substr(2 * 69999, 7), std::string("\0\0\0\x11\x70\0\x11", 7));
+  text.assign(70000, u'f')[0] = u'e';  // one run, stored backwards
+  length = LXStrGenSortKey(form.locale(), key.data(), static_cast<int32_t>(key.size()), units_at(text), 70000);
+  ASSERT_EQ(length, 4 * 70000 + 3);
+  EXPECT_EQ(key.substr(2 * 70000, 70002), std::string(1, '\0') + std::string(69999, '\x25') + std::string("\x24\0", 2));
 }
 
 TEST_F(Order, KeysNeedGoodOptions) {
@@ -374,7 +378,19 @@ TEST_F(Order, OfABinaryLocaleIsThatOfTheOtherComparison) {
   EXPECT_EQ(std::string_view(key, 5), std::string_view("AB\0\0\0", 5)) << "as many as fit";
   EXPECT_EQ(form.transform(key, 5, text, 4, 1), -1);
   EXPECT_EQ(LXGetError(form.locale()), LX_E_ARGUMENT);
-  EXPECT_EQ(LXStrGenSortKey(form.locale(), key, 5, nullptr, 0), -1);
+  EXPECT_EQ(LXStrGenSortKey(form.locale(), key, 5, units_at(u"a"), 0), 3);
+  EXPECT_EQ(std::string_view(key, 3), std::string_view("\0\0\0", 3));
+  EXPECT_EQ(LXStrGenSortKey(form.locale(), key, 5, units_at(u"a"), 1), -1);
+  EXPECT_EQ(LXGetError(form.locale()), LX_E_ARGUMENT);
+  EXPECT_EQ(
+      LXStrxfrmEx(Collation(Form::shifted, 930, "BINARY").locale(), key, 5, "\x0E\x44\x81\x0F", 1, 0, LX_OPT_CHARS), 4);
+  // Without room the text is not looked at, only its length.
+  const LXWChar wide = 'a';
+  EXPECT_EQ(LXWcsxfrm(form.locale(), nullptr, 0, &wide, (1 << 29) - 1, 0), INT32_MAX - 3);
+  for (int32_t length : {1 << 29, 1 << 30, INT32_MAX}) {
+    EXPECT_EQ(LXWcsxfrm(form.locale(), nullptr, 0, &wide, length, 0), -1);
+    EXPECT_EQ(LXGetError(form.locale()), LX_E_MEMORY);
+  }
 }
 
 TEST_F(Order, NeedsALocale) {
@@ -401,6 +417,7 @@ TEST_F(Order, OfTextsInTexts) {
       {954, "aZ", "a0", LX_CMP_NOCASE, 0},   // both weigh nothing
       {819, "aZ", "a0", LX_CMP_NOCASE, -1},  // but are not the same bytes
       {954, "ab", "abc", LX_CMP_NOCASE, -1},
+      {954, "ab", "bx", LX_CMP_NOWIDTH, -1},
       {954, "b\xA3\xC1", "A", LX_CMP_NOWIDTH, 1},
       {954, "bA", "\xA3\xC1", LX_CMP_NOWIDTH, -1},  // trimming cuts what is sought to one byte
       {954, "b\xA3\xE1", "\xA3\xC1", LX_CMP_NOCASE, 1},
@@ -411,11 +428,14 @@ TEST_F(Order, OfTextsInTexts) {
   for (const auto& one : cases) {
     for (const char* sort : {"Plain", "Combining"}) {
       Collation form(Form::plain, one.page, sort);
-      Guarded text(one.text), wanted(one.wanted);
-      const char* at = LXStrstr(form.locale(), text.data(), static_cast<int32_t>(one.text.size()), wanted.data(),
-                                static_cast<int32_t>(one.wanted.size()), one.options);
-      EXPECT_EQ(at != nullptr ? at - text.data() : -1, one.found) << one.page << ' ' << one.text << ' ' << one.wanted;
-      EXPECT_EQ(LXGetError(form.locale()), LX_OK);
+      for (bool measured : {false, true}) {
+        Guarded text(std::string(one.text) + std::string(measured, '\0')),
+            wanted(std::string(one.wanted) + std::string(measured, '\0'));
+        const char* at = LXStrstr(form.locale(), text.data(), measured ? -1 : static_cast<int32_t>(one.text.size()),
+                                  wanted.data(), measured ? -1 : static_cast<int32_t>(one.wanted.size()), one.options);
+        EXPECT_EQ(at != nullptr ? at - text.data() : -1, one.found) << one.page << ' ' << one.text << ' ' << one.wanted;
+        EXPECT_EQ(LXGetError(form.locale()), LX_OK);
+      }
     }
   }
   Collation form(Form::ucs2, 819, "Combining");

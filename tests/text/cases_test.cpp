@@ -33,8 +33,15 @@ TEST_F(TextCases, Quirks) {
     std::string_view memory = "";
     int32_t size = 0;
     LanguageIndex language = kEnglish;
+    int32_t length = 0;  // of both texts, where it is not that of all their units
   } cases[] = {
       {"a copy one byte short", cpy, sjis, "ab\x83\x5C", "", 0, 2, "abZ", 3},
+      {"counted: no more than there is room for", cpy, utf8, "ab", "", LX_OPT_CHARS, 1, "a", 1, kEnglish, 1000000},
+      {"counted: with the end of the run", cpy, mixed, "\x0E\x44\x81\x0F", "", LX_OPT_CHARS, 1, "\x0E\x44\x81\x0F", 9,
+       kEnglish, 1},
+      {"appended so", cat, mixed, "", "\x0E\x44\x81\x0F\x0E", LX_OPT_CHARS, 1, "\x0E\x44\x81\x0F", 0, kEnglish, 1},
+      {"one s, two s and one", str, latin, "\xDFss", "ss\xDF", kFold, 0, "", 0, kGerman},
+      {"in another order", str, latin, "xs\xDF", "\xDFs", kFold, 1, "", 0, kGerman},
       {"nothing appended: terminator counts", cat, latin, "aX", "", 0, 3, "aX\0"sv},
       {"a long delimiter becomes zeros", tok, sjis, "a\x83\x5Cz", "\x83\x5C", 0, 0, "a\0\0z"sv},
       {"Turkish", map, turkish, "iI\xFD", "", kUpper, 3, "\xDDII", 3, kTurkish},
@@ -54,6 +61,7 @@ TEST_F(TextCases, Quirks) {
   for (const auto& c : cases) {
     TextCall call = {c.function, c.form, units_of(c.text), static_cast<int32_t>(c.text.size()), units_of(c.other)};
     call.other_length = static_cast<int32_t>(c.other.size());
+    if (c.length != 0) call.length = call.other_length = c.length;
     call.size = c.size;
     call.options = c.options;
     call.language = &test_languages()[c.language];

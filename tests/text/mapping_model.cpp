@@ -79,6 +79,10 @@ struct Meanings {
     if (form.page->max_length == 1) return glyph;
     if (!one_byte(glyph)) return form_or(object->full_width(glyph.code), glyph);
     uint16_t wide = full_model(unicode(glyph));
+    // Two characters that a page may have under either of two names.
+    for (auto [name, other] : {std::pair<uint16_t, uint16_t>{0xFF0D, 0x2212}, {0xFF5E, 0x301C}}) {
+      if (wide == name && !has(name) && has(other) && form.page->encode(name) == form.page->encode(other)) wide = other;
+    }
     bool longer = wide != unicode(glyph) && has(wide) && form.page->encode(wide).size() > 1;
     return longer ? this->glyph(wide) : glyph;
   }
@@ -285,7 +289,8 @@ Outcome map_model(const TextCall& call) {
     copying.options = by_characters ? LX_OPT_CHARS : 0;
     outcome = model(copying);
   } else {
-    outcome = Mapper{call}.write(characters_of(call.form, told(call.form, call.text, call.length, by_characters)));
+    outcome = Mapper{call}.write(
+        characters_of(call.form, told(call.form, call.text, call.length, by_characters, false, false)));
   }
   if (!by_characters) outcome.memory.resize(static_cast<size_t>(std::max(call.size, 0)), kUnwritten);
   return outcome;

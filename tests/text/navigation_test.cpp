@@ -85,6 +85,7 @@ TEST_F(Navigation, CountsAndMoves) {
       EXPECT_EQ(static_cast<size_t>(move(n, 0)), part.whole) << n << " units";
       if (form.kind != Form::shifted) continue;
       const char* part_at = place<char>(out_, first_units(text, n), 0);
+      part = characters_of(form, first_units(text, n), 1);
       EXPECT_EQ(static_cast<size_t>(AdjustLength(locale_, part_at, form.state, static_cast<int32_t>(n))), part.whole);
     }
     for (size_t n = 1; n <= all.list.size(); ++n) {

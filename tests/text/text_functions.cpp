@@ -7,7 +7,7 @@
 
 namespace lx::test {
 
-Units told(const Form& form, Units text, int32_t length, bool by_characters, bool with_terminator) {
+Units told(const Form& form, Units text, int32_t length, bool by_characters, bool with_terminator, bool run_closed) {
   if (length < 0) {
     text.push_back(0);
     auto zero = static_cast<size_t>(std::find(text.begin(), text.end(), 0u) - text.begin());
@@ -15,7 +15,10 @@ Units told(const Form& form, Units text, int32_t length, bool by_characters, boo
   }
   auto count = static_cast<size_t>(length);
   if (!by_characters || count == 0) return first_units(text, count);
-  return first_units(text, characters_of(form, text).list.at(count - 1).own_end());
+  const Character last = characters_of(form, text).list.at(count - 1);
+  size_t end = last.own_end();
+  for (bool open = run_closed && last.state != 0; open && end < last.end; ++end) open = text[end] != form.page->leave;
+  return first_units(text, end);
 }
 
 namespace {
@@ -43,8 +46,9 @@ struct Model {
   }
 
   void cpy() {
-    Units source = told(form, call.text, call.length, by_characters, true);
     size_t size = call.size > 0 ? static_cast<size_t>(call.size) : 0;
+    int32_t length = by_characters && call.length > 0 ? std::min(call.length, std::max(call.size, 0)) : call.length;
+    Units source = told(form, call.text, length, by_characters, true);
     Characters found = characters_of(form, by_characters ? source : first_units(source, size));
     if (size == 0 || found.list.empty()) {
       found = {};
@@ -89,7 +93,9 @@ struct Model {
   }
 
   void str() {
-    Units units = told(form, call.text, call.length, by_characters, true);
+    Units wanted = other_units();
+    bool terminator = std::find(wanted.begin(), wanted.end(), 0u) != wanted.end();
+    Units units = told(form, call.text, call.length, by_characters, terminator);
     auto list = characters_of(form, units).list;
     Characters pattern = other();
     size_t count = pattern.list.size();

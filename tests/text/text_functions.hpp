@@ -62,8 +62,9 @@ Outcome model(const TextCall& call);
 Outcome map_model(const TextCall& call);
 Outcome compare_model(const TextCall& call);
 
-// The part of a text that a length tells.
-Units told(const Form& form, Units text, int32_t length, bool by_characters, bool with_terminator = false);
+// The part of a text that a length tells. Counted characters come with the shift byte that closes their run, or alone.
+Units told(const Form& form, Units text, int32_t length, bool by_characters, bool with_terminator = false,
+           bool run_closed = true);
 // What trailing blanks leave.
 Units trimmed(const Form& form, const Units& text, bool full_width);
 

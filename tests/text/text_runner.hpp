@@ -196,6 +196,14 @@ inline std::vector<Form> forms_of(const PageSource& page, bool all) {
   return forms;
 }
 
+// Characters of a text that ends inside a double-byte run cannot be counted: behind the last one is nothing to look at.
+inline bool ends_inside(const Form& form, const Units& text) {
+  const Characters all = characters_of(form, text);
+  if (!form.follows_shifts() || all.list.empty() || all.cut || all.list.back().state == 0) return false;
+  return std::find(text.begin() + static_cast<ptrdiff_t>(all.list.back().own_end()), text.end(), form.page->leave) ==
+         text.end();
+}
+
 // The same choices for everybody, so that a failure can be repeated.
 class Choice {
  public:
@@ -205,7 +213,7 @@ class Choice {
 
   // A length for a text: measured, in units (of which some cut a character) or in characters.
   int32_t length(const Form& form, const Units& text, bool by_characters) {
-    if (below(3) == 0) return -1 - static_cast<int32_t>(below(2));
+    if (below(3) == 0 || (by_characters && ends_inside(form, text))) return -1 - static_cast<int32_t>(below(2));
     size_t all = by_characters ? characters_of(form, text).list.size() : text.size();
     return static_cast<int32_t>(often() ? all : below(all + 1));
   }
