@@ -111,6 +111,16 @@ TEST_F(Primitives, ChangedTables) {
   EXPECT_EQ(LXCpFullToHalfW(record, full), LXWChar{'Q'});  // the first single byte wins
 }
 
+// The minus sign and the wave dash are full-width forms on pages that read them so; what only looks alike is none.
+TEST_F(Primitives, FullWidthFormsOfTwoReadings) {
+  const struct {
+    const char* name;
+    LXWChar full, half;
+  } cases[] = {{"IBM930", 0x4260, 0x60}, {"IBM930", 0x43A1, 0xA0}, {"IBM939", 0x4260, 0x60}, {"IBM939", 0x43A1, 0xA1},
+               {"MS932", 0x817C, '-'},   {"IBM933", 0x43A1, 0},    {"MS950", 0xA1A8, 0}};
+  for (const auto& c : cases) EXPECT_EQ(LXCpFullToHalfW(page(c.name), c.full), c.half) << c.name << std::hex << c.full;
+}
+
 class OlderLayout : public Primitives {
  protected:
   void SetUp() override {

@@ -125,6 +125,9 @@ const struct Exception {
      [](const Expectation& e) { return e.page.encode(e.unicode) != e.code; }},
     {"half", "the spacing voice marks are those that have half-width forms", 2,
      [](const Expectation& e) { return e.unicode == 0x3099 || e.unicode == 0x309A; }},
+    {"full", "IBM-930 and 939 have the wide minus and tilde under other names", 4,
+     [](const Expectation& e) { return e.unicode == '-' || e.unicode == '~'; }},
+    {"half", "and find them again", 4, [](const Expectation& e) { return e.unicode == 0x2212 || e.unicode == 0x301C; }},
 };
 
 class PageCharacters : public testing::Test {

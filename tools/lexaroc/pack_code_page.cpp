@@ -9,10 +9,24 @@ namespace lx::compiler {
 
 namespace {
 
+// Two characters of JIS X 0208 have two readings in Unicode. A page gives one of them back and understands both.
+uint16_t other_reading(uint16_t wide) {
+  switch (wide) {
+    case 0xFF0D:  // full-width hyphen-minus
+      return 0x2212;
+    case 0xFF5E:  // full-width tilde
+      return 0x301C;
+    default:
+      return wide;
+  }
+}
+
 // The full-width form in the page, when it is a character of several bytes other than the one that is asked for.
 Code full_width_code(const CodePage& page, const UnicodeTables& unicode, Code code, uint16_t value) {
   uint16_t wide = unicode.full_width(value);
-  Code wide_code = wide == value ? kNoCode : page.exact_code(wide);
+  Code wide_code = wide == value ? kNoCode : page.from_unicode[wide];
+  uint16_t reading = page.unicode_of(wide_code);
+  if (reading != wide && reading != other_reading(wide)) wide_code = kNoCode;
   return wide_code == code || (wide_code != kNoCode && code_length(wide_code) == 1 && code_length(code) == 1)
              ? kNoCode
              : wide_code;
