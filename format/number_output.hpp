@@ -50,9 +50,15 @@ class Output {
     count = take(count);
     at_ = std::fill_n(at_, count, unit);
   }
-  // A text, of which at most so many characters are wanted. Double-byte runs are closed, whatever is cut off.
+  // A text, of which at most so many characters are wanted. Double-byte runs are closed, whatever is cut off, but one
+  // that begins where another ends goes on with it: not every reader takes an empty run.
   template <class Kind>
-  void put_text(const CodePage& page, const Text<Unit>& text, size_t wanted) {
+  void put_text(const CodePage& page, Text<Unit> text, size_t wanted) {
+    if (Kind::kShifted && continues_run(page, text)) {
+      text = {text.at + 1, text.length - 1, 1};
+      --at_;
+      ++left_;
+    }
     Kind::with_walker(page, text, [&](auto walker) {
       const auto begin = walker;
       auto ahead = walker;
@@ -86,6 +92,10 @@ class Output {
     left_ -= taken;
     characters_left_ -= taken;
     return taken;
+  }
+  bool continues_run(const CodePage& page, const Text<Unit>& text) const {
+    return page.shift_sensitive && at_ != begin_ && at_[-1] == static_cast<Unit>(page.leave_byte) && text.length != 0 &&
+           *text.at == static_cast<Unit>(page.enter_byte);
   }
   template <class Walker>
   static bool open_run(const Walker& walker) {

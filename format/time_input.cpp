@@ -13,7 +13,8 @@ int32_t string_to_time(const char* function, LXLocale* locale, LXTime* time, con
                        uint32_t flags) {
   constexpr uint32_t kFlags = LX_NUM_TEXTOPT | LX_NUM_CHARLEN;
   return locale_call(trace_unit, function, locale, flags, kFlags, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
-    if (time == nullptr || string == nullptr || format == nullptr) return call.fail(LX_E_ARGUMENT, -1);
+    bool given = (string != nullptr || length == 0) && (format != nullptr || format_length == 0);
+    if (time == nullptr || !given) return call.fail(LX_E_ARGUMENT, -1);
     const CodePage& page = page_of(call.locale);
     Text<Unit> text = text_of_call<Kind>(page, string, state, length, flags);
     Text<Unit> directives = text_of_call<Kind>(page, format, format_state, format_length, flags);

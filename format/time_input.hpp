@@ -182,8 +182,9 @@ class TimeReader {
       case DirectiveKind::date_time: {
         uint32_t status = read_format(request.alternate ? directive.alternate_item : directive.item, text);
         if (status != LX_OK) return status;
-        skip_characters(text, 1);
+        bool whole = skip_characters(text, 1) != 0;
         text.finish();
+        if (!whole) text.at = text.end;  // a character that the end cuts off
         return read_format(LX_ITEM_TIME_FORMAT, text);
       }
       default:

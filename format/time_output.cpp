@@ -56,7 +56,8 @@ int32_t time_to_string(const char* function, LXLocale* locale, const LXTime* tim
   constexpr uint32_t kAny = ~0u;
   return locale_call(trace_unit, function, locale, flags, kAny, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     if ((flags & LX_NUM_CHARLEN) != 0 && length <= 0) return call.fail(LX_E_BUFFER, 0);
-    if ((flags & ~kFlags) != 0 || time == nullptr || format == nullptr) return call.fail(LX_E_ARGUMENT, -1);
+    if ((flags & ~kFlags) != 0 || time == nullptr) return call.fail(LX_E_ARGUMENT, -1);
+    if (format == nullptr && format_length != 0) return call.fail(LX_E_ARGUMENT, -1);
     if (length <= 0 || buffer == nullptr) return call.fail(LX_E_BUFFER, 0);
 
     const CodePage& page = page_of(call.locale);
@@ -119,6 +120,7 @@ uint32_t expand_time(const char* function, LXLocale* locale, const LXTime* time,
       if (format_state != nullptr) *format_state = shift_state(walker);
       return writer.expand({&directive_of(code), alternate != 0}, out);
     });
+    if (out.at() != static_cast<size_t>(*to.position)) out.close();
     return to.moved(out, status);
   });
 }
@@ -129,7 +131,9 @@ uint32_t write_word_call(const char* function, LXLocale* locale, const Filling<K
   return status_call(function, locale, [&](LocaleCall& call) -> uint32_t {
     if (!to.given()) return LX_E_ARGUMENT;
     TimeOutput<Kind> out = to.output(&page_of(call.locale));
-    return to.moved(out, write_word(out, call.locale, item, text_option));
+    uint32_t status = write_word(out, call.locale, item, text_option);
+    out.close();
+    return to.moved(out, status);
   });
 }
 

@@ -61,7 +61,9 @@ class TimeOutput {
     at_ += units;
     return claimed;
   }
-  // A text that begins and ends in the single-byte state, or as many of its characters as there is room for.
+  // A text that begins and ends in the single-byte state, or as many of its characters as there is room for. A
+  // double-byte run at its end stays open: what comes next may go on with it, as leaving and entering again would leave
+  // an empty run behind, which not every reader takes.
   bool put_text(const Unit* text, size_t length) {
     if (shifts()) return put_shifted(text, length);
     if (length <= left()) {
@@ -88,7 +90,7 @@ class TimeOutput {
     });
     return *name == 0 || room == kLongest;
   }
-  // Returns to the single-byte state.
+  // Returns to the single-byte state, for which there is room behind every double-byte character.
   void close() {
     if (double_byte_ && !full()) turn();
   }
@@ -97,8 +99,13 @@ class TimeOutput {
   // is there.
   TimeOutput laid_over() const { return {page_, begin_, 0, left(), at_ == 0 ? state() : 0}; }
   TimeOutput behind() const { return {page_, begin_ + at_, 0, left(), state()}; }
-  void advance(const TimeOutput& part) {
-    if (at_ == 0 || part.begin_ != begin_) double_byte_ = part.double_byte_;
+  // A double-byte run stays open where the output goes on behind it.
+  void advance(TimeOutput& part) {
+    if (at_ == 0 || part.begin_ != begin_) {
+      double_byte_ = part.double_byte_;
+    } else {
+      part.close();
+    }
     at_ += part.at_;
   }
 
@@ -119,12 +126,8 @@ class TimeOutput {
     if constexpr (Kind::kShifted) {
       ShiftedWalker walker(*page_, bytes_of(text), length, 0);
       for (Character character; walker.next(character);) {
-        if (!put(text + (walker.at - bytes_of(text)) - character.units, character.units)) {
-          close();
-          return false;
-        }
+        if (!put(text + (walker.at - bytes_of(text)) - character.units, character.units)) return false;
       }
-      close();
     }
     return true;
   }
@@ -180,8 +183,10 @@ template <class Kind>
 
 template <class Kind>
 uint32_t write_word(TimeOutput<Kind>& out, const LXLocale& locale, uint32_t item, uint32_t text_option) {
-  const LXUChar* name = language_name(locale, item);
-  if (name != nullptr && !out.shifts()) return out.put_name(name) ? LX_OK : LX_E_BUFFER;
+  // Plain text of mixed pages has bytes for characters: a name is cut at any of them, as LXStrcpy does.
+  const bool by_characters = !Kind::kBytes || !page_of(locale).shift_sensitive;
+  const LXUChar* name = by_characters ? language_name(locale, item) : nullptr;
+  if (name != nullptr) return out.put_name(name) ? LX_OK : LX_E_BUFFER;
   LocalText<Kind, kTimeTextRoom> word(locale, item, text_option);
   return out.put_text(word.begin(), word.length()) ? LX_OK : LX_E_BUFFER;
 }
@@ -274,6 +279,7 @@ class TimeWriter {
   // A date or time of the locale begins at the start of the output, whatever is there already.
   uint32_t write_laid_over(const Request& request, Output& out) {
     const Directive& directive = *request.directive;
+    if (out.at() != 0) out.close();  // nothing goes on with what is there
     return write_format(request.alternate ? directive.alternate_item : directive.item, out, out.laid_over());
   }
 
@@ -285,7 +291,6 @@ class TimeWriter {
     ++depth_;
     Kind::with_walker(page_, {format.begin(), format.length(), 0}, [&](auto walker) { write(walker, part); });
     --depth_;
-    part.close();
     out.advance(part);
     return endless_ ? LX_E_FORMAT : LX_OK;
   }

@@ -205,6 +205,8 @@ TEST(WrittenNumbers, LengthsAndTextsFollowShiftStates) {
   Locale locale = locale_of("IBM930");
   set(locale.get(), {LX_ITEM_CURRENCY, u"円"});
   EXPECT_EQ(hex(written(Form::shifted, locale.get(), {money, 1})).substr(0, 10), "0E46450FF1");
+  set(locale.get(), {LX_ITEM_POSITIVE_SIGN, u"円"});
+  EXPECT_EQ(hex(written(Form::shifted, locale.get(), {money, 1})).substr(0, 14), "0E464546450FF1");
   static char buffer[1000];
   // Digits inside a double-byte run count in pairs; an integer's sign counts for itself.
   EXPECT_EQ(LXLongToStringEx(locale.get(), -123456, buffer, 1, 3, LX_NUM_CHARLEN), 5);
@@ -281,8 +283,10 @@ TEST(WrittenNumbers, FitTheRoom) {
     const size_t ending = variant / 160 != 0 ? 1 : 0;
     const uint32_t flags = (ending != 0 ? LX_NUM_TERMINATE : 0) | (in_characters ? LX_NUM_CHARLEN : 0);
     Locale locale = locale_of(page.name);
-    set(locale.get(), {LX_ITEM_CURRENCY, u"$円名x"});
+    set(locale.get(), {LX_ITEM_CURRENCY, u"$円x名"});
+    set(locale.get(), {LX_ITEM_NEGATIVE_SIGN, u"円-"});
     set(locale.get(), {LX_ITEM_N_CS_PRECEDES, kNumber, 0});
+    set(locale.get(), {LX_ITEM_N_SIGN_POSN, kNumber, 4});
     set(locale.get(), {LX_ITEM_FRACTION_DIGITS, kNumber, 9});
     const std::string all = written(form, locale.get(), job);
 

@@ -2,6 +2,7 @@
 // Times written and read, in all kinds of text.
 #include <gtest/gtest.h>
 
+#include <lexaro/lexaro.hpp>
 #include <random>
 #include <sstream>
 
@@ -111,8 +112,10 @@ TEST(FormatTime, IsWhatPeopleExpect) {
   for (const People& people : kPeople) {
     const std::u16string date_time = people.date + u" " + people.time, half = u"03 " + people.half;
     const std::pair<const char16_t*, std::u16string> kTexts[] = {
-        {u"%x", people.date},    {u"%X", people.time},  {u"%#x", people.long_date}, {u"%c", date_time},
-        {u"%A", people.weekday}, {u"%B", people.month}, {u"%I %p", half},
+        {u"%x", people.date},       {u"%X", people.time},
+        {u"%#x", people.long_date}, {u"%c", date_time},
+        {u"%A", people.weekday},    {u"%B", people.month},
+        {u"%I %p", half},           {u"%#x%A", people.long_date + people.weekday},
     };
     each_form(people.place, people.pages, [&](const Place& place, const Form& form) {
       if (!can_hold(form, people.long_date)) return;
@@ -271,7 +274,7 @@ TEST(FormatTime, EveryRoomIsFilledWithWholeCharacters) {
     };
   };
   each_form("French_France", "Latin1 IBM037", is_filled(u"xü%H%A, %B%%%a", u"xü15samedi, août%sam."));
-  each_form("Japanese_Japan", "UTF-8 MS932 IBM930", is_filled(u"x日%H%A, %B%%%a", u"x日15土曜日, 8月%土"));
+  each_form("Japanese_Japan", "UTF-8 MS932 IBM930", is_filled(u"x日%H%A%a日, %B%%%a", u"x日15土曜日土日, 8月%土"));
 }
 
 TEST(FormatTime, AnythingIsSurvived) {
@@ -301,6 +304,58 @@ TEST(FormatTime, AnythingIsSurvived) {
       ASSERT_LE(place.read(form, time, text, format).count, static_cast<int32_t>(text.size()));
     }
   });
+}
+
+TEST(FormatTime, ATextThatEndsInsideACharacterIsSkippedBetweenDateAndTime) {
+  Place place("English.UTF-8");
+  ASSERT_EQ(LXSetLocaleTextInfo(place.locale.get(), LX_ITEM_SHORT_DATE, "%Y", -1, 0), 1);
+  LXTime time = kSaturday;
+  for (const char* text : {"2018\xE5", "2018?"}) {
+    EXPECT_EQ(LXStringToTime(place.locale.get(), &time, text, -1, "%c", -1, 0), 5) << text;
+  }
+}
+
+TEST(FormatTime, EmptyTextsNeedNoAddress) {
+  Place place("English.UTF-8");
+  LXTime time = kSaturday;
+  char out[] = "x";
+  EXPECT_EQ(LXTimeToString(place.locale.get(), &time, out, 1, nullptr, 0, LX_NUM_TERMINATE), 1);
+  EXPECT_EQ(LXStringToTime(place.locale.get(), &time, nullptr, 0, "a", 1, 0), 0);
+  EXPECT_EQ(LXStringToTime(place.locale.get(), &time, "a", 1, nullptr, 0, 0), 0);
+  EXPECT_EQ(LXGetError(place.locale.get()), LX_OK);
+  EXPECT_EQ(LXTimeToString(place.locale.get(), &time, out, 1, nullptr, -1, 0), -1);
+  EXPECT_EQ(LXStringToTime(place.locale.get(), &time, nullptr, 1, "a", 1, 0), -1);
+}
+
+TEST(FormatTime, WhatALocalesFormatLeavesOutIsSeenByTheWrapper) {
+  Session session;
+  lexaro::Locale greek("Greek.UTF-8");
+  for (int64_t day = 0; day < 366; ++day) {
+    LXTime time = time_of(day * 86400 + 85473);
+    char all[500];
+    int32_t count = LXTimeToStringEx(greek.get(), &time, all, 0, 500, "%#c", 0, -1, 0);
+    ASSERT_EQ(greek.format_time(time, "%#c"), std::string(all, static_cast<size_t>(count)));
+  }
+}
+
+TEST(FormatTime, WordsOfMixedPagesAreCompleteAndCutAsTheirTextIs) {
+  Place place("Japanese.IBM930");
+  char word[32], out[32];
+  int32_t length = LXGetLocaleTextInfo(place.locale.get(), LX_ITEM_DAY_1, word, 32, 0) - 1;
+  for (int32_t room = 0, at = 0; room <= length; ++room, at = 0) {
+    EXPECT_EQ(LXStrWriteWord(place.locale.get(), out, &at, room, LX_ITEM_DAY_1, 0), room < length ? 40u : 0u);
+    EXPECT_EQ(std::string(out, static_cast<size_t>(at)), std::string(word, static_cast<size_t>(room)));
+  }
+  uint32_t state = 0, format_state = 0;
+  int32_t at = 0, format_at = 0;
+  for (int32_t end : {4, 8}) {  // each word with its shift bytes
+    EXPECT_EQ(LXStrWriteWordEx(place.locale.get(), out, &state, &at, 32, LX_ITEM_ABDAY_1, 0), LX_OK);
+    EXPECT_EQ(std::pair(at, state), std::pair(end, 0u));
+  }
+  EXPECT_EQ(LXStrExpandTimeEx(place.locale.get(), &kSaturday, out, &state, &at, 32, "\x6C\x62", &format_state,
+                              &format_at, 0, 0, 0, 0),
+            LX_OK);
+  EXPECT_EQ(std::tuple(at, state, format_at), std::tuple(12, 0u, 2));
 }
 
 TEST(FormatTime, PiecesMoveTheirPositions) {

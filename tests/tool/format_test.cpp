@@ -18,6 +18,7 @@ TEST(Format, WritesAsTheLocaleDoes) {
        {"time --locale German --format %A,%x,%H:%M 2026-11-22T13:05", "", "Sonntag,22.11.26,13:05\n"},
        {"time --locale English --format %a:%j:%U%% 1970-01-01 2024-12-31", "", "Thu:000:00%\nTue:365:52%\n"},
        {"time --locale Japanese --format %Y年%#m月 @86400", "", "1970年1月\n"},
+       {{"time", "--locale", "German", "--format", "", "2026-11-22"}, "", "\n"},
        {"integer --locale English -t IBM037 -17", "", "\x60\xF1\xF7\x25"},
        {"time --locale Japanese -t IBM930 --format %Y年 2026-01-02", "", "\xF2\xF0\xF2\xF6\x0E\x45\x60\x0F\x25"}});
 }
