@@ -106,9 +106,11 @@ uint32_t read_text(const LXLocale& locale, uint32_t number, const TextTarget<Uni
   const CodePage& wanted = to.page != nullptr ? *to.page : own;
   bool separator = item.kind == ItemKind::separator;
   bool plain = std::same_as<Unit, char> && !to.shifts.followed;
-  // A separator that needs more than a byte is none in the plain form.
-  if (separator && plain && text.units != 0 && WideWriter(own, nullptr, 0).code(*text.ucs2) > 0xFF) text.units = 0;
   bool as_bytes = !std::same_as<Unit, LXUChar> && &own == &wanted && goes_as_bytes(text, separator, plain, own);
+  // A separator that needs more than a byte is none in the plain form, but for the byte that the locale keeps.
+  if (separator && plain && !as_bytes && text.units != 0 && WideWriter(own, nullptr, 0).code(*text.ucs2) > 0xFF) {
+    text.units = 0;
+  }
   Target target(to.buffer, to.size, LX_OPT_TERMINATE | (to.options & LX_OPT_CHARS));
   Delivery delivery = {own, text, target, as_bytes};
   count = write(delivery, to.buffer, wanted, to.shifts);

@@ -5,6 +5,8 @@
 #include <cstring>
 #include <lexaro/lexaro.hpp>
 
+#include "support/environment.hpp"
+
 namespace lexaro {
 namespace {
 
@@ -28,6 +30,16 @@ class Wrapper : public testing::Test {
   Locale host{"Japanese.IBM-930"};
   Locale utf8{"Japanese.UTF-8"};
 };
+
+TEST(WrapperLibrary, WantsItsData) {
+  const std::string too_long(300, 'x');  // the search for data ends there
+  lx::test::Variable place("LX_LOCALEDIR", too_long.c_str());
+  EXPECT_EQ(status_of([] { Library library("/nowhere"); }), LX_E_DEFAULTS);
+  EXPECT_EQ(LXGetObjManager(), nullptr) << "given back";
+  Library library("/nowhere", 0);
+  EXPECT_TRUE(library.on_defaults());
+  EXPECT_EQ(Locale("").name(), "English_UnitedStates.US-ASCII@Binary");
+}
 
 TEST_F(Wrapper, OwnersMoveAndConstructorsThrow) {
   Library second = std::move(library);
