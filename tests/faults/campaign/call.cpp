@@ -131,7 +131,7 @@ class Arguments {
     if (changed(i, Change::number)) units.assign(count, 'x');
     text_characters_ = characters_in(units, unit);
     text_length_ = measured ? -1 : characters_ ? text_characters_ : static_cast<int64_t>(units.size() / unit);
-    if (characters_ && has_state_ && !measured) units += '\x0F';  // a run that is counted is closed
+    if (unit == 1 && characters_ && has_state_ && !measured) units += '\x0F';  // a run that is counted is closed
     const size_t size = units.size();
     if (terminated || measured) units.append(unit, '\0');
     char* at = area(i, units.size() + (role.letter == 'D' ? 2 * kRoom * unit : 0));
