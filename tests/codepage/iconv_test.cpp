@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <fstream>
 #include <iterator>
+#include <map>
 #include <optional>
 #include <set>
 
@@ -62,8 +63,8 @@ struct Difference {
 // Neighbouring keys whose values run on in step are one line.
 class Lines {
  public:
-  Lines(uint16_t page, bool from_unicode)
-      : head_(std::to_string(page) + (from_unicode ? " from " : " to ")), from_unicode_(from_unicode) {}
+  Lines(uint16_t page, const std::string& way)
+      : head_(std::to_string(page) + " " + way + " "), from_unicode_(way == "from") {}
 
   void add(const Difference& next) {
     bool in_step = !run_.empty() && next.key == run_.back().key + 1 && follows(run_.back().ours, next.ours) &&
@@ -71,31 +72,24 @@ class Lines {
     if (!in_step) end_run();
     run_.push_back(next);
   }
+  // More lines than anybody would read are merely counted.
   std::set<std::string> take() {
+    static constexpr struct {
+      const char* what;
+      size_t most_lines;
+    } kSides[] = {{"both: ", 10}, {"only ours: ", 3}, {"only theirs: ", 3}};
     end_run();
     std::set<std::string> all;
-    tell(both_, 40, "both: ", all);
-    tell(ours_only_, 12, "only ours: ", all);
-    tell(theirs_only_, 12, "only theirs: ", all);
+    for (size_t i = 0; i < 3; ++i) {
+      if (lines_[i].size() > kSides[i].most_lines) lines_[i] = {head_ + kSides[i].what + std::to_string(counts_[i])};
+      all.merge(lines_[i]);
+    }
     return all;
   }
 
  private:
-  struct Side {
-    std::set<std::string> lines;
-    size_t count = 0;
-  };
-  // More lines than anybody would read are merely counted.
-  void tell(const Side& side, size_t most_lines, const std::string& what, std::set<std::string>& all) const {
-    if (side.lines.size() <= most_lines) {
-      all.insert(side.lines.begin(), side.lines.end());
-    } else {
-      all.insert(head_ + what + std::to_string(side.count));
-    }
-  }
-
   static bool follows(const std::string& last, const std::string& next) {
-    if (last == "-" || next == "-") return last == next;
+    if (last == "-" || next == "-" || last == next) return last == next;
     return std::stoul(next, nullptr, 16) == std::stoul(last, nullptr, 16) + 1;
   }
   static std::string range(const std::string& first, const std::string& last) {
@@ -109,18 +103,17 @@ class Lines {
     const Difference& last = run_.back();
     std::string line = head_ + range(key_text(first.key), key_text(last.key)) + " " + range(first.ours, last.ours) +
                        " " + range(first.theirs, last.theirs);
-    Side& side = first.ours == "-" ? theirs_only_ : first.theirs == "-" ? ours_only_ : both_;
-    side.lines.insert(line);
-    side.count += run_.size();
+    const size_t side = first.ours == "-" ? 2 : first.theirs == "-" ? 1 : 0;
+    lines_[side].insert(line);
+    counts_[side] += run_.size();
     run_.clear();
   }
 
   std::string head_;
   bool from_unicode_;
   std::vector<Difference> run_;
-  Side both_;
-  Side ours_only_;
-  Side theirs_only_;
+  std::set<std::string> lines_[3];  // in both; only ours; only theirs
+  size_t counts_[3] = {};
 };
 
 std::set<std::string> known_differences() {
@@ -145,24 +138,30 @@ class BesideIconv {
   }
   bool has_peer() const { return decode_.ok() && encode_.ok(); }
 
-  std::set<std::string> to_unicode() {
-    Lines lines(page_.id, false);
-    for (const std::string& bytes : sequences()) {
-      std::string ours = our_unicode(bytes);
-      std::string theirs = their_unicode(bytes);
-      if (ours != theirs) lines.add({packed(bytes), ours, theirs});
-    }
-    return lines.take();
-  }
-
-  std::set<std::string> from_unicode() {
-    Lines lines(page_.id, true);
+  std::set<std::string> differences() {
+    std::vector<Difference> from;
+    std::map<std::string, std::string> only_ours;
     for (uint32_t unicode = 0; unicode < 65536; ++unicode) {
-      std::string ours = our_bytes(unicode);
-      std::string theirs = their_bytes(unicode);
-      if (ours != theirs) lines.add({unicode, ours, theirs});
+      const Difference pair = {unicode, our_bytes(unicode), their_bytes(unicode)};
+      if (pair.ours != pair.theirs) from.push_back(pair);
+      if (pair.theirs == "-" && pair.ours != "-") only_ours[unicode_text(unicode)] = pair.ours;
     }
-    return lines.take();
+    Lines both_ways(page_.id, "round"), to_unicode(page_.id, "to"), from_unicode(page_.id, "from");
+    std::set<std::string> told;
+    for (const std::string& bytes : sequences()) {
+      const Difference pair = {packed(bytes), our_unicode(bytes), their_unicode(bytes)};
+      if (pair.ours == pair.theirs) continue;
+      const bool both = pair.theirs == "-" && only_ours[pair.ours] == hex(bytes);
+      if (both) told.insert(pair.ours);
+      (both ? both_ways : to_unicode).add(pair);
+    }
+    for (const Difference& pair : from) {
+      if (!told.contains(unicode_text(pair.key))) from_unicode.add(pair);
+    }
+    std::set<std::string> all = both_ways.take();
+    all.merge(to_unicode.take());
+    all.merge(from_unicode.take());
+    return all;
   }
 
  private:
@@ -235,8 +234,7 @@ TEST(BesideIconv, DiffersOnlyWhereMeantTo) {
   for (const std::string& file : PageSource::all_files()) {
     BesideIconv pair(file);
     if (!pair.has_peer()) continue;
-    found.merge(pair.to_unicode());
-    found.merge(pair.from_unicode());
+    found.merge(pair.differences());
   }
   std::set<std::string> known = known_differences();
   std::vector<std::string> fresh, gone;

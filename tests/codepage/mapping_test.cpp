@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: Apache-2.0
 // Every byte sequence and every UCS-2 value of every shipped code page, against its readable source; types, case and
 // widths of every multibyte character, against the compiled object read by a second reader.
+#include <algorithm>
 #include <filesystem>
-#include <functional>
-#include <sstream>
 
 #include "support/page_object.hpp"
-#include "support/page_source.hpp"
 #include "support/session.hpp"
+#include "support/text_model.hpp"
 
 namespace lx::test {
 namespace {
@@ -15,9 +14,8 @@ namespace {
 // Says how many values are wrong and which came first, instead of one failure for each.
 class Wrong {
  public:
-  void expect(bool right, const std::function<std::string()>& what) {
-    if (right) return;
-    if (++count_ <= 5) first_ += "\n  " + what();
+  void expect(bool right, const char* what, uint32_t of) {
+    if (!right && ++count_ <= 5) first_ += std::string("\n  ") + what + " of " + hex(unpacked(of));
   }
   ~Wrong() { EXPECT_EQ(count_, 0u) << first_; }
 
@@ -25,12 +23,6 @@ class Wrong {
   size_t count_ = 0;
   std::string first_;
 };
-
-std::string number(uint32_t value) {
-  std::ostringstream text;
-  text << std::hex << std::uppercase << value;
-  return text.str();
-}
 
 std::string bytes(std::initializer_list<unsigned> values) {
   std::string text;
@@ -40,17 +32,14 @@ std::string bytes(std::initializer_list<unsigned> values) {
 
 // What begins with these bytes, with all trail bytes or with samples of them.
 void add_sequences(std::vector<std::string>& all, const std::string& lead, size_t length, bool samples = false) {
-  static constexpr unsigned kSamples[] = {0x00, 0x0A, 0x40, 0x7F, 0x80, 0xA1, 0xFE, 0xFF};
-  if (lead.size() == length) {
-    all.push_back(lead);
-  } else if (samples) {
-    for (unsigned byte : kSamples) add_sequences(all, lead + static_cast<char>(byte), length, true);
-  } else {
-    for (unsigned byte = 0; byte < 256; ++byte) add_sequences(all, lead + static_cast<char>(byte), length);
+  static const std::string kSamples("\x00\x0A\x40\x7F\x80\xA1\xFE\xFF", 8);
+  if (lead.size() == length) return all.push_back(lead);
+  for (size_t i = 0; i < (samples ? kSamples.size() : 256); ++i) {
+    add_sequences(all, lead + (samples ? kSamples[i] : static_cast<char>(i)), length, samples);
   }
 }
 
-// All sequences of two and three bytes that the first byte allows; of the four-byte ones those of the planes in use,
+// All sequences of two and three bytes that the first byte allows; of the four-byte ones those of the plane in use,
 // and samples of the others.
 std::vector<std::string> long_sequences(const PageSource& page) {
   std::vector<std::string> all;
@@ -59,12 +48,10 @@ std::vector<std::string> long_sequences(const PageSource& page) {
     if (code.size() == 4) plane_in_use = code.substr(0, 2);
   }
   for (unsigned first = 0; first < 256; ++first) {
-    std::string lead = bytes({first});
-    size_t length = page.mixed() ? 2 : page.length_of(static_cast<uint8_t>(first));
-    if (length == 2 || length == 3) add_sequences(all, lead, length);
-    if (length != 4) continue;
-    for (unsigned second = 0; second < 256; ++second) {
-      std::string plane = lead + static_cast<char>(second);
+    const size_t length = page.mixed() ? 2 : page.length_of(static_cast<uint8_t>(first));
+    if (length == 2 || length == 3) add_sequences(all, bytes({first}), length);
+    for (unsigned second = 0; second < 256 && length == 4; ++second) {
+      const std::string plane = bytes({first, second});
       add_sequences(all, plane, length, plane != plane_in_use);
     }
   }
@@ -91,35 +78,29 @@ std::unique_ptr<Session> Mapping::session;
 TEST_P(Mapping, Header) {
   LXCodePageInfo info = {};
   ASSERT_EQ(LXGetCodePageInfo(record, &info), LX_OK);
-  EXPECT_EQ(info.id, page.id);
-  EXPECT_EQ(info.max_length, page.max_length);
-  EXPECT_EQ(info.substitution, page.substitution);
-  for (size_t i = 0; i < 4; ++i) EXPECT_EQ(info.line_bytes[i], page.line_ends[i]);
-  EXPECT_EQ(info.ascii_family, page.ascii_family ? 1 : 0);
-  EXPECT_EQ(info.shift_sensitive, page.mixed() ? 1 : 0);
-  EXPECT_EQ(info.enter_byte, page.enter);
-  EXPECT_EQ(info.leave_byte, page.leave);
+  const std::vector<uint32_t> found = {info.id,           info.max_length,      info.substitution,
+                                       info.ascii_family, info.shift_sensitive, info.enter_byte,
+                                       info.leave_byte};
+  EXPECT_EQ(found, (std::vector<uint32_t>{page.id, page.max_length, page.substitution, page.ascii_family, page.mixed(),
+                                          page.enter, page.leave}));
+  EXPECT_TRUE(std::equal(info.line_bytes, info.line_bytes + 4, page.line_ends.begin()));
   EXPECT_STREQ(LXGetObjName(record), page.name.c_str());
 }
 
 TEST_P(Mapping, SingleBytesToUnicode) {
   Wrong wrong;
   for (unsigned first = 0; first < 256; ++first) {
-    std::string text = bytes({first});
-    auto length = page.lengths[first];
-    std::string longest = text + "\1\2\3";
-    LXWChar expected = packed(std::string_view(longest).substr(0, length));
-    wrong.expect(LXMbToW(record, longest.data()) == expected, [&] { return "LXMbToW " + number(first); });
-    wrong.expect(LXMbToWS(record, longest.data(), 0) == first, [&] { return "LXMbToWS " + number(first); });
+    std::string text = bytes({first}), longest = text + "\1\2\3";
+    LXWChar expected = packed(std::string_view(longest).substr(0, page.lengths[first]));
+    wrong.expect(LXMbToW(record, longest.data()) == expected, "LXMbToW", first);
+    wrong.expect(LXMbToWS(record, longest.data(), 0) == first, "LXMbToWS", first);
     if (page.length_of(static_cast<uint8_t>(first)) != 1) continue;
-    LXUChar unicode = 0;
-    int32_t count = LXStringToUnicode(locale.get(), &unicode, 1, text.data(), 1, 0);
-    wrong.expect(count == 1 && unicode == page.decode(text), [&] { return hex(text) + " " + number(unicode); });
-    count = LXCpStrToUnicode(record, &unicode, 1, text.data(), 1, 0);
-    wrong.expect(count == 1 && unicode == page.decode(text), [&] { return hex(text) + " " + number(unicode); });
     LXWChar wide = first;
-    count = LXStringToUnicodeW(locale.get(), &unicode, 1, &wide, 1, 0);
-    wrong.expect(count == 1 && unicode == page.decode(text), [&] { return "W " + hex(text) + " " + number(unicode); });
+    LXUChar units[3] = {};
+    int32_t count = LXStringToUnicode(locale.get(), &units[0], 1, text.data(), 1, 0) +
+                    LXCpStrToUnicode(record, &units[1], 1, text.data(), 1, 0) +
+                    LXStringToUnicodeW(locale.get(), &units[2], 1, &wide, 1, 0);
+    wrong.expect(count == 3 && std::count(units, units + 3, page.decode(text)) == 3, "Unicode", first);
   }
 }
 
@@ -128,32 +109,23 @@ TEST_P(Mapping, LongSequencesToUnicode) {
   std::string text;
   std::vector<LXUChar> expected;
   for (const std::string& sequence : long_sequences(page)) {
-    char whole[4] = {};
+    char whole[4] = {}, out[4];
     sequence.copy(whole, sizeof whole);
-    uint16_t unicode = page.decode(sequence);
-    LXWChar value = packed(sequence);
-    wrong.expect(LXCpMbToUnicode(record, whole) == unicode,
-                 [&] { return hex(sequence) + " is not " + number(unicode); });
-    bool zero_inside = sequence.find('\0') < sequence.size() - 1;
-    if (!zero_inside) {
-      wrong.expect(LXCpMbToUnicodeW(record, value) == unicode, [&] { return "W of " + hex(sequence); });
-    }
-    if (!page.mixed()) wrong.expect(LXMbToW(record, whole) == value, [&] { return "LXMbToW of " + hex(sequence); });
-    if (sequence.size() == page.max_length) {
-      wrong.expect(LXMbToWS(record, whole, 1) == value, [&] { return "LXMbToWS of " + hex(sequence); });
-    }
+    const uint16_t unicode = page.decode(sequence);
+    const LXWChar value = packed(sequence);
+    wrong.expect(LXCpMbToUnicode(record, whole) == unicode, "LXCpMbToUnicode", value);
+    const bool zero_inside = sequence.find('\0') < sequence.size() - 1;
+    wrong.expect(zero_inside || LXCpMbToUnicodeW(record, value) == unicode, "LXCpMbToUnicodeW", value);
+    wrong.expect(page.mixed() || LXMbToW(record, whole) == value, "LXMbToW", value);
+    wrong.expect(sequence.size() != page.max_length || LXMbToWS(record, whole, 1) == value, "LXMbToWS", value);
     // Zero bytes before the last are not written.
-    std::string written;
-    for (char byte : sequence.substr(0, sequence.size() - 1)) {
-      if (byte != 0) written += byte;
-    }
+    std::string written = sequence.substr(0, sequence.size() - 1);
+    std::erase(written, '\0');
     written += sequence.back();
-    char out[4];
-    bool right = LXWToMb(out, value) == written.size() && std::string_view(out, written.size()) == written;
-    wrong.expect(right, [&] { return "LXWToMb of " + hex(sequence); });
-    bool shift =
-        page.mixed() && (sequence[0] == static_cast<char>(page.enter) || sequence[0] == static_cast<char>(page.leave));
-    if (shift) continue;
+    const bool right = LXWToMb(out, value) == written.size() && std::string_view(out, written.size()) == written;
+    wrong.expect(right, "LXWToMb", value);
+    const auto lead = static_cast<uint8_t>(sequence[0]);
+    if (page.mixed() && (lead == page.enter || lead == page.leave)) continue;
     text += sequence;
     expected.push_back(unicode);
   }
@@ -163,43 +135,38 @@ TEST_P(Mapping, LongSequencesToUnicode) {
   int32_t count = page.mixed() ? LXStringToUnicodeEx(locale.get(), converted.data(), room, text.data(), 1, length, 0)
                                : LXStringToUnicode(locale.get(), converted.data(), room, text.data(), length, 0);
   ASSERT_EQ(static_cast<size_t>(count), expected.size());
-  for (size_t i = 0; i < expected.size(); ++i) {
-    wrong.expect(converted[i] == expected[i],
-                 [&] { return "character " + std::to_string(i) + " of the text: " + number(converted[i]); });
-  }
-  wrong.expect(converted.back() == 0xABCD, [] { return std::string("written past the text"); });
+  expected.push_back(0xABCD);
+  const auto [got, wanted] = std::mismatch(converted.begin(), converted.end(), expected.begin());
+  EXPECT_EQ(got, converted.end()) << "character " << got - converted.begin() << " of the text";
 }
 
 TEST_P(Mapping, UnicodeToBytes) {
   Wrong wrong;
   std::string text;
-  std::string shifted;
-  bool inside = false;
   std::vector<LXUChar> all(65536);
   std::vector<LXWChar> values(65536);
+  Writer shifted{{Form::shifted, &page}};
   for (uint32_t unicode = 0; unicode < 65536; ++unicode) {
     auto character = static_cast<LXUChar>(unicode);
     all[unicode] = character;
-    std::string code = page.encode(character);
+    const std::string code = page.encode(character);
     char out[4] = {};
     int32_t count = LXCpUnicodeToChar(record, character, out);
-    bool right = count == static_cast<int32_t>(code.size()) && code == std::string_view(out, code.size());
-    wrong.expect(right, [&] { return "U+" + number(unicode) + " is not " + hex(code); });
+    wrong.expect(count == static_cast<int32_t>(code.size()) && code == std::string_view(out, code.size()),
+                 "LXCpUnicodeToChar", unicode);
     values[unicode] = packed(code);
-    wrong.expect(LXCpUnicodeToCharW(record, character) == values[unicode], [&] { return "W of U+" + number(unicode); });
+    wrong.expect(LXCpUnicodeToCharW(record, character) == values[unicode], "LXCpUnicodeToCharW", unicode);
     text += code;
-    if (inside != (code.size() > 1)) shifted += static_cast<char>(inside ? page.leave : page.enter);
-    inside = code.size() > 1;
-    shifted += code;
+    shifted.add(shifted.piece_of_bytes(code));
   }
-  if (inside) shifted += static_cast<char>(page.leave);
+  if (shifted.inside) shifted.units.push_back(page.leave);
 
-  std::string out(shifted.size() + text.size(), '\x5A');
+  std::string out(shifted.units.size() + text.size(), '\x5A');
   auto room = static_cast<int32_t>(out.size());
   int32_t count = LXUnicodeToString(locale.get(), out.data(), room, all.data(), 65536, 0);
   EXPECT_TRUE(out.substr(0, static_cast<size_t>(count)) == text) << "LXUnicodeToString";
   count = LXUnicodeToStringEx(locale.get(), out.data(), 0, room, all.data(), 65536, 0);
-  EXPECT_TRUE(out.substr(0, static_cast<size_t>(count)) == (page.mixed() ? shifted : text)) << "LXUnicodeToStringEx";
+  EXPECT_TRUE(out.substr(0, static_cast<size_t>(count)) == bytes_of_units(shifted.units)) << "LXUnicodeToStringEx";
   std::vector<LXWChar> wide(65536);
   EXPECT_EQ(LXUnicodeToStringW(locale.get(), wide.data(), 65536, all.data(), 65536, 0), 65536);
   EXPECT_TRUE(wide == values) << "LXUnicodeToStringW";
@@ -224,26 +191,24 @@ TEST_P(Characters, TypesAndCase) {
   Wrong wrong;
   for (const std::string& code : page.long_codes()) {
     auto [flags, delta] = object.type(code);
-    LXWChar value = packed(code);
-    char source[4] = {};
+    const LXWChar value = packed(code);
+    char source[4] = {}, out[4] = {};
     code.copy(source, sizeof source);
-    const LXCharType* type = LXGetMbCtype(record, source);
-    wrong.expect(type->flags == flags && type->delta == delta, [&] { return "type of " + hex(code); });
-    type = LXGetMbCtypeW(record, value);
-    wrong.expect(type->flags == flags && type->delta == delta, [&] { return "W type of " + hex(code); });
+    for (const LXCharType* type : {LXGetMbCtype(record, source), LXGetMbCtypeW(record, value)}) {
+      wrong.expect(type->flags == flags && type->delta == delta, "type", value);
+    }
     for (uint32_t mask : {LX_CT_LOWER, LX_CT_UPPER, LX_CT_LOWER | LX_CT_UPPER, LX_CT_DIGIT, 0u}) {
-      LXWChar partner = (flags & mask) == 0 ? value : value + static_cast<uint32_t>(delta);
-      std::string expected = (flags & mask) == 0 ? code : unpacked(partner);
-      wrong.expect(LXCpMbCaseConvW(record, value, mask) == partner, [&] { return "W case of " + hex(code); });
-      char out[4] = {};
+      const LXWChar partner = (flags & mask) == 0 ? value : value + static_cast<uint32_t>(delta);
+      const std::string expected = (flags & mask) == 0 ? code : unpacked(partner);
+      wrong.expect(LXCpMbCaseConvW(record, value, mask) == partner, "W case", value);
       if (!page.mixed()) {  // there the first byte does not tell the length
         LXCpMbCaseConv(record, source, out, mask);
-        wrong.expect(expected == std::string_view(out, expected.size()), [&] { return "case of " + hex(code); });
+        wrong.expect(expected == std::string_view(out, expected.size()), "case", value);
       }
       if (code.size() != page.max_length) continue;
-      bool right = LXCpMbCaseConvS(record, source, out, mask) == static_cast<int32_t>(expected.size()) &&
-                   expected == std::string_view(out, expected.size());
-      wrong.expect(right, [&] { return "fixed-length case of " + hex(code); });
+      const bool right = LXCpMbCaseConvS(record, source, out, mask) == static_cast<int32_t>(expected.size()) &&
+                         expected == std::string_view(out, expected.size());
+      wrong.expect(right, "fixed-length case", value);
     }
   }
 }
@@ -255,9 +220,9 @@ TEST_P(Characters, Widths) {
   for (const std::string& code : page.long_codes()) values.push_back(packed(code));
   size_t pairs = 0;
   for (LXWChar value : values) {
-    wrong.expect(LXCpMbHalfToFullW(record, value) == object.full_width(value), [&] { return "full " + number(value); });
-    wrong.expect(LXCpFullToHalfW(record, value) == object.half_width(value), [&] { return "half " + number(value); });
-    if (object.half_width(value) != 0) ++pairs;
+    wrong.expect(LXCpMbHalfToFullW(record, value) == object.full_width(value), "full width", value);
+    wrong.expect(LXCpFullToHalfW(record, value) == object.half_width(value), "half width", value);
+    pairs += object.half_width(value) != 0;
   }
   EXPECT_GT(pairs, 0u);
 }

@@ -65,42 +65,32 @@ SortSpec test_sort(const std::string& name) {
   sort.pages[0x4E] = {kPrimaryPage | kSpecialPage, 0xF7, 0xFFFC};  // its weights pass the highest number
   sort.pages[0x50] = {kSpecialPage, 0x0E, 0x0600};
   sort.pages[0x51] = {kEmptyPage | kPrimaryPage, 15, 0x0700};
-  sort.entries = {
-      // One weight a level, in order.
-      {u' ', {0x0100, 0x20, 2, kAll}},
-      {u'a', {0x0110, 0x20, 2, kAll}},
-      {u'A', {0x0110, 0x20, 4, kAll}},
-      {u'b', {0x0112, 0x20, 2, kAll}},
-      {u'B', {0x0112, 0x21, 2, kAll}},
-      {u'c', {0x0114, 0x20, 2, kAll}},
-      {u'S', {0x0130, 0x20, 4, kAll}},
-      {u's', {0x0130, 0x20, 2, kAll}},
-      {u'I', {0x0120, 0x20, 4, kAll}},
-      {u'i', {0x0120, 0x20, 2, kAll}},
-      {0x130, {0x0121, 0x20, 4, kAll}},
-      {0xDF, {0x0135, 0x20, 2, kAll}},
-      // Levels stored backwards.
-      {u'e', {0x0116, 0x24, 3, mask_flags(0xB)}},
-      {u'f', {0x0116, 0x25, 4, mask_flags(0x9)}},
-      {u'p', {0x0117, 0x20, 2, mask_flags(0x7)}},
-      {u'q', {0x0118, 0x22, 3, mask_flags(0x7)}},
-      {u'Q', {0x0117, 0x22, 4, mask_flags(0x0)}},
-      // Nothing at some levels.
-      {u'-', {0x0011, 9, 9, kIsSpecial | kAll}},
-      {u'+', {0x0012, 0, 0, kIsSpecial | kAll}},
-      {u'*', {0x0013, 0, 0, kIsSpecial | mask_flags(0xE)}},
-      {u'm', {0, 0x30, 3, kAll}},
-      {0x307, {0, 0x34, 3, kAll}},
-      {u'n', {0, 0x31, 2, mask_flags(0xB)}},
-      {u'd', {0, 0x20, 0, kAll}},
-      {u't', {0, 0, 7, kAll}},
-      {u'0', {0, 0, 0, kAll}},
-      // Expansions.
-      {u'x', {0x7777, 7, 7, kExpands | kIsSpecial | kAll}},
-      {u'y', {0, 0, 0, kExpands | mask_flags(0x7)}},
-      {u'w', {0, 0, 0, kExpands | kAll}},
-      {u'z', {0x0119, 0x20, 2, kExpands | mask_flags(0xA)}},  // has no row
-  };
+  constexpr unsigned k7 = mask_flags(7), k9 = mask_flags(9), k10 = mask_flags(10), k11 = mask_flags(11);
+  constexpr unsigned kSpecial = kIsSpecial | kAll, kSpecial14 = kIsSpecial | mask_flags(14);
+  constexpr unsigned kExpandsAll = kExpands | kAll, kExpandsSpecial = kExpandsAll | kIsSpecial,
+                     kExpands7 = kExpands | k7;
+  using Entries = std::map<char16_t, SortSpec::Entry>;
+  const Entries in_order = {
+      {u' ', {0x100, 0x20, 2, kAll}}, {u'a', {0x110, 0x20, 2, kAll}},  {u'A', {0x110, 0x20, 4, kAll}},
+      {u'b', {0x112, 0x20, 2, kAll}}, {u'B', {0x112, 0x21, 2, kAll}},  {u'c', {0x114, 0x20, 2, kAll}},
+      {u'S', {0x130, 0x20, 4, kAll}}, {u's', {0x130, 0x20, 2, kAll}},  {u'I', {0x120, 0x20, 4, kAll}},
+      {u'i', {0x120, 0x20, 2, kAll}}, {0x130, {0x121, 0x20, 4, kAll}}, {0xDF, {0x135, 0x20, 2, kAll}}};
+  const Entries backwards = {{u'e', {0x116, 0x24, 3, k11}},
+                             {u'f', {0x116, 0x25, 4, k9}},
+                             {u'p', {0x117, 0x20, 2, k7}},
+                             {u'q', {0x118, 0x22, 3, k7}},
+                             {u'Q', {0x117, 0x22, 4, 0}}};
+  const Entries without_some = {
+      {u'-', {0x11, 9, 9, kSpecial}}, {u'+', {0x12, 0, 0, kSpecial}}, {u'*', {0x13, 0, 0, kSpecial14}},
+      {u'm', {0, 0x30, 3, kAll}},     {0x307, {0, 0x34, 3, kAll}},    {u'n', {0, 0x31, 2, k11}},
+      {u'd', {0, 0x20, 0, kAll}},     {u't', {0, 0, 7, kAll}},        {u'0', {0, 0, 0, kAll}}};
+  const Entries expanding = {{u'x', {0x7777, 7, 7, kExpandsSpecial}},
+                             {u'y', {0, 0, 0, kExpands7}},
+                             {u'w', {0, 0, 0, kExpandsAll}},
+                             {u'z', {0x119, 0x20, 2, kExpands | k10}}};  // has no row
+  for (const Entries& entries : {in_order, backwards, without_some, expanding}) {
+    sort.entries.insert(entries.begin(), entries.end());
+  }
   sort.expansions = {{u'y', {0x0110, 0x20, 2}, {0x0112, 0x21, 2}},
                      {u'x', {0x0110, 0x20, 2}, {0x0112, 0x21, 2}},
                      {u'x', {0x0999, 0x20, 2}, {0x0999, 0x21, 2}},
@@ -345,10 +335,10 @@ std::u16string Collation::mapped(const Form& in, std::u16string_view text, uint3
 
 int32_t Collation::compare(const Units& a, const Units& b, uint32_t options) const {
   static EdgeBuffer edge_a(1 << 16), edge_b(1 << 16);
+  const auto length_a = static_cast<int32_t>(a.size()), length_b = static_cast<int32_t>(b.size());
   return with_calls(form, [&](auto calls) {
     using U = typename decltype(calls)::Unit;
-    const U *x = place<U>(edge_a, a, 0), *y = place<U>(edge_b, b, 0);
-    return calls(kStrcoll, locale(), x, static_cast<int32_t>(a.size()), State{0}, y, static_cast<int32_t>(b.size()),
+    return calls(kStrcoll, locale(), place<U>(edge_a, a, 0), length_a, State{0}, place<U>(edge_b, b, 0), length_b,
                  State{0}, options);
   });
 }
@@ -357,8 +347,7 @@ int32_t Collation::transform(void* key, int32_t size, const Units& text, int32_t
   static EdgeBuffer edge(1 << 16);
   return with_calls(form, [&](auto calls) {
     using U = typename decltype(calls)::Unit;
-    const U* x = place<U>(edge, text, length);
-    return calls(kStrxfrm, locale(), key, size, x, length, State{0}, options);
+    return calls(kStrxfrm, locale(), key, size, place<U>(edge, text, length), length, State{0}, options);
   });
 }
 
@@ -384,23 +373,26 @@ ModelWeights Collation::next_weight(const Units& text, Reading& reading) const {
     reading.offset = static_cast<int32_t>(at - begin);
     return result;
   });
-  ModelWeights weights;
-  weights.mask = mask == 0xEE ? -1 : mask;
-  for (int i = 0; i < count; ++i) weights.sets.push_back({primary[i], secondary[i], tertiary[i], special[i]});
-  for (int i = count; i < 2; ++i) {
-    EXPECT_EQ(primary[i] + secondary[i] + tertiary[i] + special[i], 36) << "a set that is none was written";
+  ModelWeights weights = {{}, mask == 0xEE ? -1 : mask};
+  for (int i = 0; i < 2; ++i) {
+    const ModelSet set = {primary[i], secondary[i], tertiary[i], special[i]};
+    if (i < count) {
+      weights.sets.push_back(set);
+    } else {
+      EXPECT_EQ(set, ModelSet({9, 9, 9, 9})) << "a set that is none was written";
+    }
   }
   return weights;
 }
 
-std::vector<Collation> own_forms(const std::string& sort) {
+std::vector<Collation> own_forms(const std::string& sort, LanguageIndex language) {
   std::vector<Collation> forms;
   forms.reserve(5);
-  forms.emplace_back(Form::plain, 954, sort);
-  forms.emplace_back(Form::shifted, 930, sort);
-  forms.emplace_back(Form::shifted, 57352, sort);
-  forms.emplace_back(Form::wide, 954, sort);
-  forms.emplace_back(Form::ucs2, 819, sort);
+  forms.emplace_back(Form::plain, 954, sort, language);
+  forms.emplace_back(Form::shifted, 930, sort, language);
+  forms.emplace_back(Form::shifted, 57352, sort, language);
+  forms.emplace_back(Form::wide, 954, sort, language);
+  forms.emplace_back(Form::ucs2, 819, sort, language);
   return forms;
 }
 

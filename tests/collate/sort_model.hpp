@@ -150,19 +150,19 @@ class Collation {
 };
 
 // Every form of text, with that sort.
-std::vector<Collation> own_forms(const std::string& sort);
+std::vector<Collation> own_forms(const std::string& sort, LanguageIndex language = kEnglish);
 // All texts of up to `length` letters.
 std::vector<std::u16string> all_texts(std::u16string_view letters, size_t length);
 
 // The library on the collation directory, for all cases of a program.
 class CollationTest : public testing::Test {
  private:
-  static const DataDirectory& directory() {
+  static const char* directory() {
     static const DataDirectory directory;
     static const bool written = [] { return write_collation_directory(directory), true; }();
-    return written ? directory : directory;
+    return written ? directory.path() : "";
   }
-  Session session_{directory().path()};
+  Session session_{directory()};
 };
 
 }  // namespace lx::test

@@ -112,18 +112,14 @@ TEST_F(CatalogCompilerTest, FaultsHaveTheirPlaces) {
 
 TEST_F(CatalogCompilerTest, DamagedCatalogsAreNamedNotRead) {
   ASSERT_EQ(catalog("$set 1\n1 one\n2 two\n$set 7\n1 seven\n").exit_code, 0);
-  std::string sound = content(work("out.cat"));
+  const std::string sound = content(work("out.cat"));
+  std::vector<std::string> damaged;
   for (size_t i = 0; i < sound.size(); i += 3) {
-    std::string broken = sound;
-    broken[i] = static_cast<char>(broken[i] ^ 0xFF);
-    for (const std::string& bytes : {broken, sound.substr(0, i)}) {
-      write(work("bad.cat"), bytes);
-      for (const char* command : {"check ", "dump --locale-dir " LEXARO_DATA " "}) {
-        Outcome outcome = lexaroc(command + quoted(work("bad.cat")));
-        EXPECT_TRUE(outcome.exit_code == 0 || outcome.exit_code == 1) << outcome.exit_code << " at " << i;
-      }
-    }
+    damaged.push_back(sound);
+    damaged.back()[i] = static_cast<char>(damaged.back()[i] ^ 0xFF);
+    damaged.push_back(sound.substr(0, i));
   }
+  expect_harmless("bad.cat", damaged);
 }
 
 }  // namespace

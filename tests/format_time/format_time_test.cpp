@@ -2,8 +2,8 @@
 // Times written and read, in all kinds of text.
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <lexaro/lexaro.hpp>
-#include <random>
 #include <sstream>
 
 #include "frame/records.hpp"
@@ -72,8 +72,8 @@ struct Place {
 };
 
 // use(place, form), for each of these code pages.
-template <class Use>
-void each_form(const std::string& place_name, const char* page_names, Use use) {
+void each_form(const std::string& place_name, const char* page_names,
+               const std::function<void(const Place&, const Form&)>& use) {
   std::istringstream pages(page_names);
   for (std::string page; pages >> page;) {
     Place place(place_name + "." + page);
@@ -99,12 +99,8 @@ TEST(FormatTime, IsWhatPeopleExpect) {
   const People kPeople[] = {
       {"English_UnitedStates", "UTF-8 Latin1 IBM037", u"8/3/24", u"3:05:09 PM", u"Saturday, August 03, 2024", u"Saturday", u"August", u"PM"},
       {"German_Germany", "UTF-8 Latin1 IBM273", u"03.08.24", u"15:05:09", u"Samstag, 3. August 2024", u"Samstag", u"August", u"PM"},
-      {"German_German-Switzerland", "UTF-8 IBM500", u"03.08.24", u"15:05:09", u"Samstag, 3. August 2024", u"Samstag", u"August", u"PM"},
       {"French_France", "UTF-8 Latin1 IBM297", u"03/08/2024", u"15:05:09", u"samedi 03 août 2024", u"samedi", u"août", u"PM"},
-      {"Swedish_Sweden", "UTF-8 Latin1", u"2024-08-03", u"15:05:09", u"lördag 03 augusti 2024", u"lördag", u"augusti", u"em"},
-      {"Polish_Poland", "UTF-8 ISO-8859-2 IBM870", u"3.08.2024", u"15:05:09", u"sobota, 3 sierpnia 2024", u"sobota", u"sierpnia", u"PM"},
       {"Japanese_Japan", "UTF-8 MS932 JapanEUC IBM930", u"2024/08/03", u"15:05:09", u"2024年8月3日土曜日", u"土曜日", u"8月", u"午後"},
-      {"Portuguese_Brazil", "UTF-8 Latin1", u"03/08/2024", u"15:05:09", u"sábado, 3 de agosto de 2024", u"sábado", u"agosto", u"p.m."},
       {"Hungarian_Hungary", "UTF-8 ISO-8859-2", u"2024. 08. 03.", u"15:05:09", u"2024. augusztus 3., szombat", u"szombat", u"augusztus", u"du."},
       {"Turkish_Turkey", "UTF-8 ISO-8859-9", u"03.08.2024", u"15:05:09", u"03 Ağustos 2024 Cumartesi", u"Cumartesi", u"Ağustos", u"ÖS"},
   };
@@ -277,35 +273,6 @@ TEST(FormatTime, EveryRoomIsFilledWithWholeCharacters) {
   each_form("Japanese_Japan", "UTF-8 MS932 IBM930", is_filled(u"x日%H%A%a日, %B%%%a", u"x日15土曜日土日, 8月%土"));
 }
 
-TEST(FormatTime, AnythingIsSurvived) {
-  std::mt19937 random(8);
-  auto any = [&](uint32_t below) { return static_cast<uint32_t>(random() % below); };
-  each_form("Japanese_Japan", "Latin1 UTF-8 MS932 IBM037 IBM930", [&](const Place& place, const Form& form) {
-    auto units = [&] {
-      Units some;
-      for (uint32_t n = any(12); n != 0; --n) {
-        std::u16string piece(1, any(2) == 0 ? u'%' : u"#aAbBcdHIjmMpSUWwxXyYzZ%01923 日:"[any(32)]);
-        for (uint32_t unit : any(6) == 0 ? Units{any(form.is_bytes() ? 256 : 65536)} : spelled(form, piece)) {
-          if (unit != 0) some.push_back(unit);
-        }
-      }
-      return some;
-    };
-    for (int i = 0; i < 2000; ++i) {
-      LXTime time = kSaturday;
-      if (any(3) == 0) time.tm_mon = time.tm_wday = static_cast<int>(any(20)) - 4;
-      Units format = units();
-      auto length = static_cast<int32_t>(any(40)), format_length = static_cast<int32_t>(format.size());
-      Result result = place.write(form, time, format, length, LX_NUM_TERMINATE * any(2), static_cast<size_t>(length),
-                                  any(2) == 0 ? -1 : format_length);
-      ASSERT_TRUE(result.count >= 0 && result.count <= length);
-      place.write(form, time, format, length, LX_NUM_CHARLEN, 600);
-      Units text = any(2) == 0 ? units() : result.text();
-      ASSERT_LE(place.read(form, time, text, format).count, static_cast<int32_t>(text.size()));
-    }
-  });
-}
-
 TEST(FormatTime, ATextThatEndsInsideACharacterIsSkippedBetweenDateAndTime) {
   Place place("English.UTF-8");
   ASSERT_EQ(LXSetLocaleTextInfo(place.locale.get(), LX_ITEM_SHORT_DATE, "%Y", -1, 0), 1);
@@ -322,7 +289,6 @@ TEST(FormatTime, EmptyTextsNeedNoAddress) {
   EXPECT_EQ(LXTimeToString(place.locale.get(), &time, out, 1, nullptr, 0, LX_NUM_TERMINATE), 1);
   EXPECT_EQ(LXStringToTime(place.locale.get(), &time, nullptr, 0, "a", 1, 0), 0);
   EXPECT_EQ(LXStringToTime(place.locale.get(), &time, "a", 1, nullptr, 0, 0), 0);
-  EXPECT_EQ(LXGetError(place.locale.get()), LX_OK);
   EXPECT_EQ(LXTimeToString(place.locale.get(), &time, out, 1, nullptr, -1, 0), -1);
   EXPECT_EQ(LXStringToTime(place.locale.get(), &time, nullptr, 1, "a", 1, 0), -1);
 }

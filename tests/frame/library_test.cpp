@@ -74,41 +74,5 @@ TEST_F(Library, StartsCleanlyAgainAndAgain) {
   EXPECT_EQ(open_descriptors(), before);
 }
 
-TEST_F(Library, ReportsHowItStarted) {
-  // The allocations are those of the global area, the object manager, and later the directory of objects.
-  for (auto [failing, status] : {std::pair(-1, LX_OK), {0, LX_E_MEMORY}, {1, LX_E_MANAGER}, {3, LX_E_DEFAULTS}}) {
-    SCOPED_TRACE(failing);
-    allocator_.arm(failing, false);
-    EXPECT_EQ(allocator_.init(directory_.path()), status);
-    allocator_.disarm();
-    const bool running = status == LX_OK || status == LX_E_DEFAULTS;
-    EXPECT_EQ(LXGetObjManager() != nullptr, running);
-    if (!running) {  // what is there of the library is used by the next attempt
-      EXPECT_EQ(LXTerm(), LX_OK);
-      EXPECT_EQ(allocator_.init(directory_.path()), LX_OK);
-    }
-    EXPECT_EQ(LXTerm(), LX_OK);
-    EXPECT_EQ(allocator_.live, 0);
-  }
-}
-
-// Without data it stands on built-in objects, or on nothing when told so.
-TEST_F(Library, StandsWithoutData) {
-  for (uint32_t options : {0u, LX_INIT_NO_DEFAULTS}) {
-    ASSERT_EQ(init("/does/not/exist", options), LX_E_DEFAULTS);
-    const uint32_t expected = options == 0 ? LX_OK : LX_E_NOTFOUND;
-    uint32_t rc = 99;
-    for (auto [type, name] :
-         {std::pair(LX_LANGUAGE, "english"), {LX_TERRITORY, "UnitedStates"}, {LX_CODEPAGE, "us-ascii"}}) {
-      LXObjEntry* entry = LXGetObjFromName(LXGetObjManager(), static_cast<uint8_t>(type), name, -1, 0, &rc);
-      EXPECT_EQ(rc, expected) << name;
-      EXPECT_EQ(LXGetObjId(entry), options == 0 ? 1 : 0) << name;
-    }
-    Locale(LXGetLocale("English", 0, &rc)).reset();
-    EXPECT_EQ(rc, options == 0 ? LX_OK : LX_E_LANGUAGE);
-    EXPECT_EQ(LXTerm(), LX_OK);
-  }
-}
-
 }  // namespace
 }  // namespace lx::test

@@ -4,11 +4,13 @@
 #include <lexaro/host.h>
 
 #include <atomic>
+#include <barrier>
 #include <cerrno>
 #include <cstddef>
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
+#include <functional>
 #include <string>
 #include <thread>
 #include <vector>
@@ -17,14 +19,13 @@ namespace {
 
 using Lines = std::vector<std::string>;
 
-template <typename Body>
-void race(int count, Body body) {
-  std::atomic<int> waiting{count};
+// All threads begin together.
+void race(int count, const std::function<void(int)>& body) {
+  std::barrier start(count);
   std::vector<std::thread> threads;
   for (int i = 0; i < count; ++i) {
     threads.emplace_back([&, i] {
-      --waiting;
-      while (waiting.load() > 0) std::this_thread::yield();
+      start.arrive_and_wait();
       body(i);
     });
   }
@@ -39,8 +40,7 @@ class Trace : public testing::Test {
     file_ = std::string("host_") + testing::UnitTest::GetInstance()->current_test_info()->name() + ".trace";
   }
 
-  template <typename Body>
-  Lines traced(const char* flags, Body body) {
+  Lines traced(const char* flags, const std::function<void()>& body) {
     auto child = [&] {
       std::remove(file_.c_str());
       setenv("TRC1_FLAGS", flags, 1);
@@ -61,21 +61,19 @@ class Trace : public testing::Test {
 };
 
 TEST_F(Trace, WritesEachMessageAsOneLine) {
-  const Lines lines = traced("c0", [this] {
-    EXPECT_EQ(unit_.flags, TRC1_LEVEL_FLOW | TRC1_LEVEL_ERROR);
+  const Lines lines = traced("d0", [this] {
+    EXPECT_EQ(unit_.flags, TRC1_LEVEL_FLOW | TRC1_LEVEL_ERROR | 0x10u);
     TRC1_Event(&unit_, 12, TRC1_ENTRY, "LXSample", 0);
     TRC1_Printf(&unit_, 13, "rc = %d, name %s\n", -5, "a\nb");
     TRC1_Event(&unit_, 14, TRC1_EXIT_RESULT, "LXSample", -1);
     TRC1_Event(&unit_, 15, TRC1_EXIT, "LXSample", 99);
+    TRC1_Dump(&unit_, 7, "key", "0123456789\xC1 bcd~\x7F", 18);
   });
-  const Lines expected = {"Lexaro sample(12): LXSample: entry", "Lexaro sample(13): rc = -5, name a b",
-                          "Lexaro sample(14): LXSample: exit, result -1", "Lexaro sample(15): LXSample: exit"};
-  EXPECT_EQ(lines, expected);
-}
-
-TEST_F(Trace, DumpsBytesInRows) {
-  const Lines lines = traced("10", [this] { TRC1_Dump(&unit_, 7, "key", "0123456789\xC1 bcd~\x7F", 18); });
-  const Lines expected = {"Lexaro sample(7): key: 18 bytes",
+  const Lines expected = {"Lexaro sample(12): LXSample: entry",
+                          "Lexaro sample(13): rc = -5, name a b",
+                          "Lexaro sample(14): LXSample: exit, result -1",
+                          "Lexaro sample(15): LXSample: exit",
+                          "Lexaro sample(7): key: 18 bytes",
                           "Lexaro sample(7): key 000000: 30 31 32 33 34 35 36 37 38 39 C1 20 62 63 64 7E"
                           "  |0123456789. bcd~|",
                           "Lexaro sample(7): key 000010: 7F 00" + std::string(14 * 3, ' ') + "  |..|"};
@@ -214,10 +212,9 @@ TEST(Storage, MayBeResolvedWhileItStartsAndEnds) {
 }
 
 TEST(Storage, SaysWhenThereIsNoMemory) {
-  static HSV1_Descriptor all = {SIZE_MAX, init_block, nullptr, nullptr},
-                         nearly_all = {SIZE_MAX - 8, init_block, nullptr, nullptr};
-  EXPECT_EQ(HSV1_ResolveThread(&all, "test"), nullptr);
-  EXPECT_EQ(HSV1_ResolveThread(&nearly_all, "test"), nullptr);
+  static HSV1_Descriptor descriptors[] = {{SIZE_MAX, init_block, nullptr, nullptr},
+                                          {SIZE_MAX - 8, init_block, nullptr, nullptr}};
+  for (HSV1_Descriptor& descriptor : descriptors) EXPECT_EQ(HSV1_ResolveThread(&descriptor, "test"), nullptr);
 }
 
 }  // namespace

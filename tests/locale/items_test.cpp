@@ -4,8 +4,9 @@
 
 #include <cstring>
 #include <set>
+#include <tuple>
 
-#include "locale/native_rows.hpp"
+#include "locale/native_list.hpp"
 #include "support/locale_model.hpp"
 #include "support/object_builder.hpp"
 #include "support/session.hpp"
@@ -23,14 +24,12 @@ Locale get(const std::string& name, uint32_t options = 0) {
 TEST(Items, OfAllSystemLocales) {
   Session session;
   std::set<std::string> languages;
-  for (const NativeRow& row : kNativeRows) {
-    char name[132];
-    Locale locale = get(LXMapNativeLocale(row.native, name, sizeof name), LX_GET_SUBSTITUTE);
-    ASSERT_EQ(LXSetLocaleNumInfo(locale.get(), LX_ITEM_SORT_ID, 0), 1);
-    const LocaleModel model(row.language, row.territory, row.code_page);
-    ASSERT_EQ(model.difference(locale.get(), languages.insert(row.language).second), "") << row.native;
-    Locale binary = get(row.locale_name().substr(0, row.locale_name().find('@')) + "@BINARY");
-    ASSERT_EQ(model.difference(binary.get()), "") << row.native;
+  for (const auto& [native, name] : native_names()) {
+    const size_t territory = name.find('_') + 1, page = name.find('.') + 1, sort = name.find('@');
+    const std::string language = name.substr(0, territory - 1);
+    const LocaleModel model(language, name.substr(territory, page - territory - 1), name.substr(page, sort - page));
+    Locale binary = get(name.substr(0, sort) + "@BINARY");
+    ASSERT_EQ(model.difference(binary.get(), languages.insert(language).second), "") << native;
   }
 }
 
@@ -44,19 +43,18 @@ TEST(Items, BadArguments) {
   Locale locale = get("German.UTF-8");
   for (const TextForm& form : text_forms()) {
     uint32_t buffer[4] = {};
-    for (uint32_t options : {2u, 8u, 0x4002u, 0x80000000u}) {
+    for (uint32_t options : {2u, 8u, 0x80000000u}) {
       EXPECT_EQ(form.get(locale.get(), 64, buffer, 4, options), -1) << form.name;
       EXPECT_EQ(LXGetError(locale.get()), LX_E_ARGUMENT) << form.name;
     }
     EXPECT_EQ(form.get(locale.get(), 64, nullptr, 4, 0), -1) << form.name;
-    EXPECT_EQ(LXGetError(locale.get()), LX_E_ARGUMENT) << form.name;
-    for (int32_t size : {-1, INT32_MIN}) EXPECT_EQ(form.get(locale.get(), 88, buffer, size, 0), 0) << form.name;
+    EXPECT_EQ(form.get(locale.get(), 88, buffer, -1, 0), 0) << form.name;
     EXPECT_EQ(buffer[0], 0u);
     EXPECT_EQ(form.get(nullptr, 64, buffer, 4, 0), -1) << "no default locale";
   }
   EXPECT_EQ(LXGetLocaleNumInfo(locale.get(), LX_ITEM_TERRITORY_ID, 2), -1);
   EXPECT_EQ(LXGetError(locale.get()), LX_E_ARGUMENT);
-  char buffer[136];
+  char buffer[8];
   const LXObjEntry* no_page = LXGetLocaleObject(locale.get(), LX_TERRITORY);
   EXPECT_EQ(LXGetLocaleTextInfoEx(locale.get(), LX_ITEM_AM, buffer, 8, no_page, 0), -1);
   ASSERT_EQ(LXSetLocale("Japanese.IBM930", 0), LX_OK);
@@ -88,27 +86,22 @@ TEST(Items, SeparatorsOfSeveralBytes) {
   parts.currency = u"a\u3041\u5001\u6000z";
   directory.write_object(LX_TERRITORY, 2, territory_file(parts));
   Session session(directory.path());
-  struct Case {
-    const char* page;
-    const char* currency;
-    const char* own_decimal;
-  };
-  for (const Case& one :
-       {Case{"Small", "a\x81\x41\x8F\xA1\xA1\xA1\x1Az", ""}, {"US-ASCII", "a\x1A\x1A\x1Az", "\x1A"}}) {
-    Locale locale = get(std::string("English_Germany.") + one.page);
+  auto text_of = [](LXLocale* locale, uint32_t item, uint32_t options) -> std::string {
     char text[16];
-    LXUChar units[8];
-    EXPECT_EQ(LXGetLocaleTextInfo(locale.get(), LX_ITEM_CURRENCY, text, 16, 0),
-              static_cast<int32_t>(std::strlen(one.currency)) + 1);
-    EXPECT_STREQ(text, one.currency);
-    EXPECT_EQ(LXGetLocaleTextInfo(locale.get(), LX_ITEM_DECIMAL, text, 16, 0), 2);
-    EXPECT_STREQ(text, "\x1A") << "a lone lead byte would spoil the text";
-    for (uint32_t options : {LX_OPT_OBJECT, LX_OPT_OBJECT | LX_OPT_CHARS}) {
-      EXPECT_EQ(LXGetLocaleTextInfo(locale.get(), LX_ITEM_DECIMAL, text, 16, options),
-                static_cast<int32_t>(std::strlen(one.own_decimal)) + 1);
-      EXPECT_STREQ(text, one.own_decimal);
+    const int32_t count = LXGetLocaleTextInfo(locale, item, text, 16, options);
+    EXPECT_EQ(count, static_cast<int32_t>(std::strlen(text)) + 1);
+    return text;
+  };
+  for (auto [page, currency, own_decimal] :
+       {std::tuple("Small", "a\x81\x41\x8F\xA1\xA1\xA1\x1Az", ""), {"US-ASCII", "a\x1A\x1A\x1Az", "\x1A"}}) {
+    Locale locale = get(std::string("English_Germany.") + page);
+    EXPECT_EQ(text_of(locale.get(), LX_ITEM_CURRENCY, 0), currency);
+    EXPECT_EQ(text_of(locale.get(), LX_ITEM_DECIMAL, 0), "\x1A") << "a lone lead byte would spoil the text";
+    for (uint32_t options : {0u, LX_OPT_CHARS}) {
+      EXPECT_EQ(text_of(locale.get(), LX_ITEM_DECIMAL, LX_OPT_OBJECT | options), own_decimal);
     }
     for (uint32_t options : {0u, LX_OPT_OBJECT}) {
+      LXUChar units[8];
       EXPECT_EQ(LXGetLocaleTextInfoU(locale.get(), LX_ITEM_DECIMAL, units, 8, options), 2);
       EXPECT_EQ(units[0], 0x3041);
     }

@@ -5,11 +5,12 @@
 #include <cerrno>
 #include <filesystem>
 
-#include "faults/each_allocation.hpp"
 #include "faults/failing_calls.hpp"
 #include "support/descriptors.hpp"
 #include "support/edge_buffer.hpp"
 #include "support/environment.hpp"
+#include "support/object_builder.hpp"
+#include "support/session.hpp"
 
 namespace lx::test {
 namespace {
@@ -217,22 +218,29 @@ TEST_F(CatalogTest, SameTextsAsTheCLibrary) {
 const std::string kSound = catalog_image("English_UnitedStates.Small@BINARY",
                                          {{1, {{1, "one"}, {2, "two"}, {9, "nine"}}}, {4, {{1, "four"}}}});
 
-// The worst status of opening a catalog and reading every message of it.
-uint32_t status_of(const std::string& image, uint32_t mode) {
-  small_directory().write("catalog", std::string_view(image));
-  Locale locale(LXGetLocale("English_UnitedStates.US-ASCII@BINARY", 0, nullptr));
-  CatalogPtr catalog(LXOpenCatalog(locale.get(), small_directory().path(), "catalog", mode));
-  uint32_t worst = LXGetError(locale.get());
-  for (auto [set, number] : {std::pair(1u, 1), {1u, 2}, {1u, 9}, {4u, 1}}) {
-    char out[16];
-    uint32_t rc = catalog ? LXGetMessage(catalog.get(), set, number, out, 16, nullptr, 0) : worst;
-    if (rc != LX_OK && worst != LX_E_CATALOG) worst = rc;
-  }
-  return worst;
-}
+class CatalogFaults : public testing::Test {
+ protected:
+  CatalogFaults() : session_((write_small_directory(directory_), directory_.path())) {}
 
-TEST(CatalogFaults, DamagedFiles) {
-  Session session(small_directory().path());
+  // The worst status of opening a catalog and reading every message of it.
+  uint32_t status_of(const std::string& image, uint32_t mode) const {
+    directory_.write("catalog", std::string_view(image));
+    Locale locale(LXGetLocale("English_UnitedStates.US-ASCII@BINARY", 0, nullptr));
+    CatalogPtr catalog(LXOpenCatalog(locale.get(), directory_.path(), "catalog", mode));
+    uint32_t worst = LXGetError(locale.get());
+    for (auto [set, number] : {std::pair(1u, 1), {1u, 2}, {1u, 9}, {4u, 1}}) {
+      char out[16];
+      uint32_t rc = catalog ? LXGetMessage(catalog.get(), set, number, out, 16, nullptr, 0) : worst;
+      if (rc != LX_OK && worst != LX_E_CATALOG) worst = rc;
+    }
+    return worst;
+  }
+
+  DataDirectory directory_;
+  Session session_;
+};
+
+TEST_F(CatalogFaults, DamagedFiles) {
   struct {
     const char* name;
     size_t at;
@@ -274,29 +282,7 @@ TEST(CatalogFaults, DamagedFiles) {
   }
 }
 
-TEST(CatalogFaults, EachAllocationFails) {
-  small_directory().write("catalog", std::string_view(kSound));
-  std::string path = small_directory().file("catalog");
-  std::basic_string<LXUChar> name(path.begin(), path.end());
-  LXLocale* locale = nullptr;
-  LXCatalog* catalog = nullptr;
-  LXUChar text[16], directory[] = {'%', 'L', 0};
-  auto prepare = [&] { locale = LXGetLocale("German_Germany.US-ASCII@BINARY", 0, nullptr); };
-  auto clean_up = [&] { LXReleaseLocale(locale, 0); };
-  auto close = [&] { EXPECT_EQ(LXCloseCatalog(catalog, 0), LX_OK); };
-  for (uint32_t mode : kModes) {
-    auto open = [&] { return catalog = LXOpenCatalogU(locale, directory, name.c_str(), mode), LXGetError(locale); };
-    auto read = [&] { return LXGetMessageU(catalog, 4, 1, text, 16, nullptr, 0); };
-    auto undo = [] {};
-    fail_each_allocation({"LXOpenCatalogU", open, close, LX_E_MEMORY, undo}, prepare, clean_up);
-    if (mode == LX_CAT_LOAD) continue;
-    fail_each_allocation(
-        {"LXGetMessage", read, undo, LX_E_MEMORY, undo}, [&] { prepare(), open(); }, [&] { close(), clean_up(); });
-  }
-}
-
-TEST(CatalogFaults, EachSystemCallFails) {
-  Session session(small_directory().path());
+TEST_F(CatalogFaults, EachSystemCallFails) {
   ASSERT_EQ(status_of(kSound, 0), LX_OK);  // now all objects are loaded
   long descriptors = open_descriptors();
   for (Call call : {Call::open, Call::read, Call::seek, Call::close, Call::status}) {

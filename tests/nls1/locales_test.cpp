@@ -32,7 +32,6 @@ TEST_F(Locales, FromIds) {
       {0, 0, 0, "", LX_OK, ""},
       {1, 0, 0, "English", LX_OK, ""},
       {both(0, 276), 0, 0, "_Germany", LX_OK, ""},
-      {both(2, 276), 37, 0, "German_Germany.IBM037", LX_OK, ""},
       {both(2, 40), 0, LX_GET_SUBSTITUTE, "German_Austria", LX_OK, ""},
       {0, LX_CP_UTF8, kThread | kProcess, ".UTF-8", LX_OK, ""},
       {0xFFFF, 9999, 0, nullptr, LX_E_LANGUAGE, "Invalid Language 65535"},
@@ -48,10 +47,8 @@ TEST_F(Locales, FromIds) {
     Locale locale(NLS1_GetLocale(one.language_territory, one.page, one.options, &rc));
     EXPECT_EQ(rc, one.rc) << std::hex << one.language_territory;
     EXPECT_EQ(full_name(locale.get()), one.name != nullptr ? complete(one.name) : "-");
-    EXPECT_EQ(trace.all().find("Invalid ") != std::string::npos, *one.message != '\0') << trace.all();
-    if (*one.message != '\0') {
-      EXPECT_TRUE(trace.has(one.message)) << trace.all();
-    }
+    const std::string messages = trace.all();
+    EXPECT_TRUE(messages.find(one.message) != messages.npos) << messages;
   }
   Locale locale(NLS1_GetLocale(0, 0, 0, nullptr));
   EXPECT_NE(locale, nullptr) << "the status is optional";
@@ -59,45 +56,28 @@ TEST_F(Locales, FromIds) {
 
 TEST_F(Locales, AreSetWhereTheScopeSays) {
   const std::string german = complete("German_Germany.IBM037");
-  const struct {
-    uint32_t options;
-    bool thread, process;
-  } cases[] = {{0, false, true},
-               {kProcess, false, true},
-               {LX_GET_SUBSTITUTE, false, true},
-               {kThread, true, false},
-               {kThread | LX_GET_SUBSTITUTE, true, false},
-               {kThread | kProcess, true, true}};
-  for (const auto& one : cases) {
+  for (uint32_t options : {0u, kProcess, LX_GET_SUBSTITUTE, kThread, kThread | LX_GET_SUBSTITUTE, kThread | kProcess}) {
     SetUp();
-    EXPECT_EQ(NLS1_SetLocale(both(2, 276), 37, one.options), LX_OK);
-    EXPECT_EQ(thread_name(), one.thread ? german : kBefore) << std::hex << one.options;
-    EXPECT_EQ(full_name(lxglocale), one.process ? german : kBefore) << std::hex << one.options;
+    const bool of_thread = (options & kThread) != 0, of_process = !of_thread || (options & kProcess) != 0;
+    EXPECT_EQ(NLS1_SetLocale(both(2, 276), 37, options), LX_OK);
+    EXPECT_EQ(thread_name(), of_thread ? german : kBefore) << std::hex << options;
+    EXPECT_EQ(full_name(lxglocale), of_process ? german : kBefore) << std::hex << options;
     std::thread([&] { EXPECT_EQ(thread_name(), complete("French_France.Latin1@BINARY")); }).join();
   }
 }
 
 TEST_F(Locales, FailuresChangeNothing) {
-  const struct {
-    int32_t language_territory;
-    uint16_t page;
-    uint32_t rc;
-  } cases[] = {{500, 0, LX_E_LANGUAGE}, {both(1, 1), 0, LX_E_TERRITORY}, {1, 9999, LX_E_CODEPAGE}};
-  for (const auto& one : cases) {
-    for (uint32_t options : {0u, kThread, kProcess, kThread | kProcess}) {
-      EXPECT_EQ(NLS1_SetLocale(one.language_territory, one.page, options), one.rc);
-    }
+  for (uint32_t options : {0u, kThread, kProcess, kThread | kProcess}) {
+    EXPECT_EQ(NLS1_SetLocale(500, 0, options), LX_E_LANGUAGE);
+    EXPECT_EQ(NLS1_SetLocale(1, 9999, options), LX_E_CODEPAGE);
   }
   EXPECT_EQ(NLS1_SetLocale(2, 0, kThread | 8), LX_E_ARGUMENT);
   EXPECT_EQ(thread_name(), kBefore);
   EXPECT_EQ(full_name(lxglocale), kBefore);
   EXPECT_EQ(NLS1_SetLocale(2, 0, 8), LX_OK) << "of the process's options only those of LXSetLocale are looked at";
   EXPECT_EQ(full_name(lxglocale), complete("German"));
-}
-
-TEST_F(Locales, UserLocale) {
   EXPECT_EQ(NLS1_SetLocale(both(2, 276), 37, LX_GET_USER | LX_GET_SUBSTITUTE), LX_OK);
-  EXPECT_EQ(full_name(lxglocale), complete("French_France.Latin1@BINARY"));
+  EXPECT_EQ(full_name(lxglocale), complete("French_France.Latin1@BINARY")) << "the user's";
 }
 
 TEST_F(Locales, Numbers) {

@@ -35,7 +35,6 @@ TEST(Aliases, OfAFile) {
     uint32_t result;
   };
   const Case cases[] = {
-      {"no final newline", "Latin1 l1\nGreek el", "L1>Latin1 EL>Greek ", 0},
       {"continuation", "Latin1 l1\n  iso x\n\ty\n", "L1>Latin1 ISO>Latin1 X>Latin1 Y>Latin1 ", 0},
       {"comments and blank lines between", "Latin1 l1\n# c\n \t\n\n  iso\n", "L1>Latin1 ISO>Latin1 ", 0},
       {"comment sign inside", "Latin1 l#1 #x\n", "L#1>Latin1 #X>Latin1 ", 0},

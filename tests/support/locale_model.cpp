@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <sstream>
 
 #include "support/edge_buffer.hpp"
 
@@ -13,9 +14,13 @@ constexpr size_t kRoom = 4096;
 
 bool is_name(uint32_t item) { return item == 2 || item == 6 || item == 10 || (item >= 12 && item <= 15); }
 
-std::u16string ascii(std::string_view text) { return std::u16string(text.begin(), text.end()); }
+// One that a locale has a copy of.
+bool is_own_text(uint32_t item) {
+  return is_separator(item) || item == 62 || item == 64 || item == 68 || item == 71 || item == 72 ||
+         (item >= 79 && item <= 81);
+}
 
-std::string cut_short(const std::string& text) { return text.substr(0, 120); }
+std::u16string ascii(std::string_view text) { return std::u16string(text.begin(), text.end()); }
 
 // The largest number of characters that leave room for the terminator.
 size_t that_fit(const std::vector<Units>& prefixes, size_t room, bool characters) {
@@ -43,9 +48,11 @@ std::string delivery_difference(LXLocale* locale, uint32_t item, const TextForm&
   char* at = buffer.room(room);
   int32_t got = form.get(locale, item, at, size, options);
   if (got == count && std::memcmp(at, bytes.data(), bytes.size()) == 0 && LXGetError(locale) == LX_OK) return "";
-  return "text " + std::to_string(item) + " options " + std::to_string(options) + " size " + std::to_string(size) +
-         ": " + std::to_string(got) + " " + cut_short(hex(std::string_view(at, room))) + ", error " +
-         std::to_string(LXGetError(locale)) + ", not " + std::to_string(count) + " " + cut_short(hex(bytes));
+  std::ostringstream text;
+  text << "text " << item << " options " << options << " size " << size << ": " << got << " "
+       << hex(std::string_view(at, room)).substr(0, 120) << ", error " << LXGetError(locale) << ", not " << count << " "
+       << hex(bytes).substr(0, 120);
+  return text.str();
 }
 
 }  // namespace
@@ -86,11 +93,6 @@ std::vector<TextForm> text_forms(bool pages) {
 
 bool is_separator(uint32_t item) { return item >= 59 && item <= 67 && (item <= 61 || item >= 66); }
 
-bool is_own_text(uint32_t item) {
-  return is_separator(item) || item == 62 || item == 64 || item == 68 || item == 71 || item == 72 ||
-         (item >= 79 && item <= 81);
-}
-
 // ---- What a locale must report --------------------------------------------------------------------------------------
 
 LocaleModel::LocaleModel(std::string_view language_name, std::string_view territory_name, std::string_view page_name)
@@ -110,51 +112,34 @@ std::string LocaleModel::name() const { return language->name + "_" + territory-
 
 std::optional<std::u16string> LocaleModel::text(uint32_t item, bool own) const {
   if (own && texts.contains(item)) return texts.at(item);
-  switch (item) {
-    case 2:
-      return ascii(language->name);
-    case 6:
-      return ascii(territory->name);
-    case 10:
-      return ascii(page->name);
-    case 13:
-      return ascii(LocaleSource::name_of(LX_TERRITORY, language->default_id(LX_TERRITORY)));
-    case 14:
-      return ascii(ids_[0] != 0 ? "US-ASCII" : LocaleSource::name_of(LX_CODEPAGE, language->default_id(LX_CODEPAGE)));
-    case 12:
-      return u"Binary";
-    case 15:
-      return ascii(ids_[0] != 0 || language->default_id(LX_SORT) == 0
-                       ? "Binary"
-                       : LocaleSource::name_of(LX_SORT, language->default_id(LX_SORT)));
-    case 88:
-      return ascii(name());
-    default:
-      std::optional<std::u16string> text = language->text(item);
-      return text ? text : territory->text(item);
+  if (is_name(item) || item == kLastItem) {
+    auto standard = [&](uint8_t type) { return LocaleSource::name_of(type, language->default_id(type)); };
+    const bool built_in = ids_[0] != 0;
+    const std::map<uint32_t, std::string> names = {
+        {2, language->name},
+        {6, territory->name},
+        {10, page->name},
+        {12, "Binary"},
+        {13, standard(LX_TERRITORY)},
+        {14, built_in ? "US-ASCII" : standard(LX_CODEPAGE)},
+        {15, built_in || language->default_id(LX_SORT) == 0 ? "Binary" : standard(LX_SORT)},
+        {kLastItem, name()}};
+    return ascii(names.at(item));
   }
+  const std::optional<std::u16string> text = language->text(item);
+  return text ? text : territory->text(item);
 }
 
 std::optional<int32_t> LocaleModel::number(uint32_t item, bool own) const {
   if (own && numbers.contains(item)) return numbers.at(item);
-  switch (item) {
-    case 1:
-      return ids_[0] != 0 ? ids_[0] : language->id;
-    case 5:
-      return ids_[1] != 0 ? ids_[1] : territory->id;
-    case 9:
-      return ids_[2] != 0 ? ids_[2] : page->id;
-    case 11:
-      return 0;
-    case 85:
-      return page->max_length;
-    case 86:
-      return page->ascii_family ? 1 : 0;
-    case 87:
-      return page->mixed() ? 1 : 0;
-    default:
-      return territory->number(item);
-  }
+  const std::map<uint32_t, int32_t> others = {{1, ids_[0] != 0 ? ids_[0] : language->id},
+                                              {5, ids_[1] != 0 ? ids_[1] : territory->id},
+                                              {9, ids_[2] != 0 ? ids_[2] : page->id},
+                                              {11, 0},
+                                              {85, page->max_length},
+                                              {86, page->ascii_family},
+                                              {87, page->mixed()}};
+  return others.contains(item) ? others.at(item) : territory->number(item);
 }
 
 std::u16string LocaleModel::through_page(std::u16string_view text) const {
@@ -249,23 +234,6 @@ std::string LocaleModel::found_text_difference(LXLocale* locale, uint32_t item) 
     }
   }
   return "";
-}
-
-std::string snapshot(LXLocale* locale) {
-  std::string all;
-  char buffer[kRoom * 4];
-  for (uint32_t item = 1; item <= kLastItem; ++item) {
-    for (uint32_t source : {0u, 1u}) all += std::to_string(LXGetLocaleNumInfo(locale, item, source)) + " ";
-    for (const TextForm& form : text_forms()) {
-      for (uint32_t options : {0u, LX_OPT_OBJECT}) {
-        std::memset(buffer, 0, sizeof buffer);
-        int32_t count = form.get(locale, item, buffer, kRoom, options);
-        if (count > 0) all += hex(std::string_view(buffer, static_cast<size_t>(count) * form.unit_size())) + " ";
-      }
-    }
-    all += "\n";
-  }
-  return all;
 }
 
 }  // namespace lx::test

@@ -37,7 +37,6 @@ struct TextForm {
 std::vector<TextForm> text_forms(bool pages = true);
 
 bool is_separator(uint32_t item);
-bool is_own_text(uint32_t item);  // one that a locale has a copy of
 
 class LocaleModel {
  public:
@@ -71,8 +70,5 @@ class LocaleModel {
   std::string found_text_difference(LXLocale* locale, uint32_t item) const;
   uint16_t ids_[3];
 };
-
-// Everything that a locale reports.
-std::string snapshot(LXLocale* locale);
 
 }  // namespace lx::test

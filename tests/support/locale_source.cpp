@@ -18,12 +18,10 @@ std::u16string unquoted(std::string_view value) {
   if (text.size() > 1 && text.front() == u'"') text = text.substr(1, text.size() - 2);
   std::u16string plain;
   for (size_t i = 0; i < text.size(); ++i) {
-    if (text[i] != u'\\') {
-      plain += text[i];
-    } else if (text[++i] == u'u') {
-      plain += static_cast<char16_t>(std::stoul(
-          std::string(text.begin() + static_cast<ptrdiff_t>(i) + 1, text.begin() + static_cast<ptrdiff_t>(i) + 5),
-          nullptr, 16));
+    if (text[i] == u'\\' && text[++i] == u'u') {
+      const std::string digits(text.begin() + static_cast<ptrdiff_t>(i) + 1,
+                               text.begin() + static_cast<ptrdiff_t>(i) + 5);
+      plain += static_cast<char16_t>(std::stoul(digits, nullptr, 16));
       i += 4;
     } else {
       plain += text[i];
@@ -59,16 +57,14 @@ const std::map<std::string, Object, std::less<>>& objects(uint8_t type) {
   return all[type];
 }
 
-std::string numbered(const char* key, uint32_t number) { return key + std::to_string(number); }
-
 std::string language_key(uint32_t item) {
   static const char* const kDays[] = {"sun", "mon", "tue", "wed", "thu", "fri", "sat"};
   if (item == 3) return "abbreviation";
   if (item == 4) return "own-name";
   if (item >= 16 && item <= 22) return std::string("day.") + kDays[item - 16];
   if (item >= 23 && item <= 29) return std::string("abday.") + kDays[item - 23];
-  if (item >= 30 && item <= 42) return numbered("month.", item - 29);
-  if (item >= 43 && item <= 55) return numbered("abmonth.", item - 42);
+  if (item >= 30 && item <= 42) return "month." + std::to_string(item - 29);
+  if (item >= 43 && item <= 55) return "abmonth." + std::to_string(item - 42);
   return item == 56 ? "am" : item == 57 ? "pm" : "";
 }
 

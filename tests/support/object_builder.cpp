@@ -51,14 +51,15 @@ Bytes object_file(const std::vector<Bytes>& sections, uint32_t format) {
 
 Bytes control_file(const std::vector<ObjectRecord>& records) {
   Image directory(records.size() * 38);
-  for (size_t i = 0; i < records.size(); ++i) {
-    const ObjectRecord& record = records[i];
-    directory.u16(i * 38, record.id);
-    directory.u8(i * 38 + 2, record.type);
-    directory.u8(i * 38 + 3, record.flags);
-    for (size_t j = 0; j < record.name.size() && j < 34; ++j) {
-      directory.u8(i * 38 + 4 + j, static_cast<uint8_t>(record.name[j]));
+  size_t at = 0;
+  for (const ObjectRecord& record : records) {
+    directory.u16(at, record.id);
+    directory.u8(at + 2, record.type);
+    directory.u8(at + 3, record.flags);
+    for (size_t i = 0; i < record.name.size() && i < 34; ++i) {
+      directory.u8(at + 4 + i, static_cast<uint8_t>(record.name[i]));
     }
+    at += 38;
   }
   return object_file({directory.bytes()});
 }
@@ -154,20 +155,21 @@ void put_from_page(Image& image, const Layout& layout, const FromPage& page) {
   image.u16(at + 6, page.high_parts);
 }
 
-Bytes to_unicode_section(const Layout& layout, const std::vector<State>& states, const std::vector<unsigned>& values) {
-  Image image;
+void put_states(Image& image, const std::vector<State>& states, bool bounds) {
   for (const State& state : states) {
-    size_t at = image.size();
-    image.u8(at, state.final);
-    image.u8(at + 1, state.mask);
-    if (layout.bounds) {
-      image.u8(at + 2, state.low);
-      image.u8(at + 3, state.high);
+    for (unsigned value : {state.final, state.mask}) image.u8(image.size(), value);
+    for (unsigned value : {state.low, state.high}) {
+      if (bounds) image.u8(image.size(), value);
     }
     image.u16(image.size(), state.index);
   }
-  for (unsigned value : values) image.u16(image.size(), value);
-  return image.bytes();
+}
+
+// Values of one or two bytes, one behind the other.
+void put_run(Image& image, size_t size, unsigned first, unsigned count, unsigned step = 1) {
+  for (unsigned value = first; count-- > 0; value += step) {
+    size == 1 ? image.u8(image.size(), value) : image.u16(image.size(), value);
+  }
 }
 
 // States that work with and without their bounds.
@@ -184,25 +186,15 @@ std::vector<State> multibyte_states() {
   return states;
 }
 
-std::vector<unsigned> multibyte_values() {
-  std::vector<unsigned> values;
-  for (unsigned i = 0; i < 16; ++i) values.push_back(0x3040 + i);
-  for (unsigned i = 0; i < 16; ++i) values.push_back(0x4E00 + i);
-  for (unsigned i = 0; i < 8; ++i) values.push_back(0x5000 + i);
-  values.push_back(0xFFFD);
-  return values;
-}
-
 // The tables behind the fixed part, and their offsets.
 void put_types_and_widths(Image& image, const Layout& layout) {
-  size_t full_width = image.size();
+  const size_t full_width = image.size();
   image.u32(full_width + 255 * 4, 0);
   image.u32(full_width + 4 * ' ', 0x8140);
   image.u32(full_width + 4 * 'A', 0x8141);
-  size_t pairs = image.size();
+  const size_t pairs = image.size();
   image.u16(6, 2);
-  const uint32_t widths[] = {0x8142, 0x8EA0A0, 0x8143, 0x8EA0A1};
-  for (size_t i = 0; i < 4; ++i) image.u32(pairs + 4 * i, widths[i]);
+  for (uint32_t width : {0x8142u, 0x8EA0A0u, 0x8143u, 0x8EA0A1u}) image.u32(image.size(), width);
 
   std::vector<State> states = {{0, 0x0F, 0, 0, 1}};
   for (unsigned first = 0; first < 16; ++first) states.push_back({1, 0, 0, 0, 0});
@@ -211,14 +203,9 @@ void put_types_and_widths(Image& image, const Layout& layout) {
   states[1 + 0xF] = {0, 0, 0, 0, 18};
   states.push_back({1, 0, 0, 0, 0});
   states.push_back({0, 0, 0, 0, 17});
-  size_t type_states = image.size();
-  for (const State& state : states) {
-    size_t at = image.size();
-    image.u8(at, state.final);
-    image.u8(at + 1, state.mask);
-    image.u16(at + 2, state.index);
-  }
-  size_t type_entries = image.size();
+  const size_t type_states = image.size();
+  put_states(image, states, false);
+  const size_t type_entries = image.size();
   image.u32(type_entries, 1024);
   image.u32(type_entries + 4, 0);
   for (unsigned i = 0; i < 16; ++i) {  // U+3040-U+304F: pairs of a capital and a small letter
@@ -227,24 +214,6 @@ void put_types_and_widths(Image& image, const Layout& layout) {
   }
   const size_t offsets[] = {full_width, pairs, type_states, type_entries};
   for (size_t i = 0; i < 4; ++i) image.u16(layout.offsets + 2 * i, static_cast<unsigned>(offsets[i]));
-}
-
-Bytes multibyte_values_section() {
-  Image image;
-  for (unsigned i = 0; i < 128; ++i) image.u8(image.size(), i);
-  for (unsigned i = 0; i < 16; ++i) image.u16(image.size(), 0x8140 + i);
-  for (unsigned i = 0; i < 4; ++i) image.u8(image.size(), 0x40 + i);
-  for (unsigned i = 0; i < 16; ++i) image.u16(image.size(), i < 8 ? 0xA0A0 + i : 0xA1A0 + i - 8);
-  for (unsigned i = 0; i < 8; ++i) image.u16(image.size(), 0xA1A0 + i);
-  return image.bytes();
-}
-
-Bytes multibyte_high_parts() {
-  Image image;
-  for (unsigned i = 0; i < 4; ++i) image.u8(image.size(), 0x81);
-  for (unsigned i = 0; i < 16; ++i) image.u8(image.size(), 0x8E);
-  for (unsigned i = 0; i < 8; ++i) image.u16(image.size(), 0x8FA1);
-  return image.bytes();
 }
 
 }  // namespace
@@ -274,10 +243,23 @@ Bytes multibyte_page_file(bool older_layout) {
                             {0x50, 3, 0x07, 0, 7, 196, 20}};
   for (const FromPage& page : pages) put_from_page(section1, layout, page);
   put_types_and_widths(section1, layout);
-  std::vector<State> states = multibyte_states();
-  section1.u16(layout.offsets + 8, static_cast<unsigned>(states.size() * (layout.bounds ? 6 : 4)));
-  return object_file({section1.bytes(), to_unicode_section(layout, states, multibyte_values()),
-                      multibyte_values_section(), multibyte_high_parts()},
+  Image unicode, values, high_parts;
+  put_states(unicode, multibyte_states(), layout.bounds);
+  section1.u16(layout.offsets + 8, static_cast<unsigned>(unicode.size()));
+  put_run(unicode, 2, 0x3040, 16);
+  put_run(unicode, 2, 0x4E00, 16);
+  put_run(unicode, 2, 0x5000, 8);
+  put_run(unicode, 2, 0xFFFD, 1);
+  put_run(values, 1, 0, 128);
+  put_run(values, 2, 0x8140, 16);
+  put_run(values, 1, 0x40, 4);
+  put_run(values, 2, 0xA0A0, 8);
+  put_run(values, 2, 0xA1A0, 8);
+  put_run(values, 2, 0xA1A0, 8);
+  put_run(high_parts, 1, 0x81, 4, 0);
+  put_run(high_parts, 1, 0x8E, 16, 0);
+  put_run(high_parts, 2, 0x8FA1, 8, 0);
+  return object_file({section1.bytes(), unicode.bytes(), values.bytes(), high_parts.bytes()},
                      older_layout ? kFormatV1 : kFormatV2);
 }
 
@@ -289,16 +271,14 @@ Bytes mixed_page_file() {
   section1.u16(kCurrent.flags, 1 | 2);
   put_from_page(section1, kCurrent, {0x00, 0, 0x7F, 0, 0x7F, 0, 0});
   put_from_page(section1, kCurrent, {0x30, 1, 0x1F, 0x40, 0x5F, 128, 0});
-  const std::vector<State> states = {{0, 0x03, 0x41, 0x42, 0}, {1, 0x0F, 0x40, 0x4F, 0}, {1, 0x0F, 0x40, 0x4F, 16}};
-  section1.u16(kCurrent.offsets + 8, static_cast<unsigned>(states.size() * 6));
-  std::vector<unsigned> unicode;
-  Image values;
-  for (unsigned i = 0; i < 128; ++i) values.u8(values.size(), i);
-  for (unsigned i = 0; i < 32; ++i) {
-    unicode.push_back(0x3040 + i);
-    values.u16(values.size(), i < 16 ? 0x4140 + i : 0x4240 + i - 16);
-  }
-  return object_file({section1.bytes(), to_unicode_section(kCurrent, states, unicode), values.bytes()});
+  Image unicode, values;
+  put_states(unicode, {{0, 0x03, 0x41, 0x42, 0}, {1, 0x0F, 0x40, 0x4F, 0}, {1, 0x0F, 0x40, 0x4F, 16}}, true);
+  section1.u16(kCurrent.offsets + 8, static_cast<unsigned>(unicode.size()));
+  put_run(unicode, 2, 0x3040, 32);
+  put_run(values, 1, 0, 128);
+  put_run(values, 2, 0x4140, 16);
+  put_run(values, 2, 0x4240, 16);
+  return object_file({section1.bytes(), unicode.bytes(), values.bytes()});
 }
 
 // ---- Directories ----------------------------------------------------------------------------------------------------

@@ -23,40 +23,28 @@ std::string bytes_of_hex(std::string_view digits) {
 
 uint8_t byte_at(std::string_view bytes, size_t index) { return static_cast<uint8_t>(bytes[index]); }
 
-// The next UTF-8 character of a source file, which is well-formed.
-uint32_t take_utf8(std::string_view& text) {
-  uint8_t first = byte_at(text, 0);
-  size_t length = first < 0x80 ? 1 : first < 0xE0 ? 2 : 3;
-  uint32_t value = length == 1 ? first : length == 2 ? first & 0x1Fu : first & 0x0Fu;
-  for (size_t i = 1; i < length; ++i) value = value << 6 | (byte_at(text, i) & 0x3Fu);
-  text.remove_prefix(length);
-  return value;
-}
-
 std::string utf8(uint16_t c) {
-  std::string bytes;
-  if (c < 0x80) {
-    bytes += static_cast<char>(c);
-  } else if (c < 0x800) {
-    bytes += static_cast<char>(0xC0 | c >> 6);
-    bytes += static_cast<char>(0x80 | (c & 0x3F));
-  } else {
-    bytes += static_cast<char>(0xE0 | c >> 12);
-    bytes += static_cast<char>(0x80 | (c >> 6 & 0x3F));
-    bytes += static_cast<char>(0x80 | (c & 0x3F));
-  }
-  return bytes;
+  auto rest = [](unsigned bits) { return static_cast<char>(0x80 | (bits & 0x3F)); };
+  if (c < 0x80) return {static_cast<char>(c)};
+  if (c < 0x800) return {static_cast<char>(0xC0 | c >> 6), rest(c)};
+  return {static_cast<char>(0xE0 | c >> 12), rest(c >> 6), rest(c)};
 }
 
 uint16_t utf8_value(std::string_view bytes) {
-  if (bytes.size() == 1) return byte_at(bytes, 0) < 0x80 ? byte_at(bytes, 0) : kNoCharacter;
-  uint32_t value = 0;
-  if (byte_at(bytes, 0) < 0xE0) {
-    value = (byte_at(bytes, 0) & 0x1Fu) << 6 | (byte_at(bytes, 1) & 0x3Fu);
-  } else {
-    value = (byte_at(bytes, 0) & 0x0Fu) << 12 | (byte_at(bytes, 1) & 0x3Fu) << 6 | (byte_at(bytes, 2) & 0x3Fu);
-  }
+  const uint32_t first = byte_at(bytes, 0);
+  if (bytes.size() == 1) return first < 0x80 ? static_cast<uint16_t>(first) : kNoCharacter;
+  uint32_t value = first & (first < 0xE0 ? 0x1Fu : 0x0Fu);
+  for (size_t i = 1; i < (first < 0xE0 ? 2u : 3u); ++i) value = value << 6 | (byte_at(bytes, i) & 0x3Fu);
   return static_cast<uint16_t>(value);
+}
+
+// The next character of a source file, which is well-formed.
+uint32_t take_utf8(std::string_view& text) {
+  const uint8_t first = byte_at(text, 0);
+  const size_t length = first < 0x80 ? 1 : first < 0xE0 ? 2 : 3;
+  const uint32_t value = utf8_value(text.substr(0, length));
+  text.remove_prefix(length);
+  return value;
 }
 
 }  // namespace
@@ -83,19 +71,18 @@ const PageSource& PageSource::of(uint16_t id) {
   static std::map<uint16_t, std::unique_ptr<PageSource>> pages;
   auto& page = pages[id];
   if (!page) {
-    std::string number = std::to_string(id);
-    number.insert(0, 5 - number.size(), '0');
+    const std::string number = std::to_string(100000u + id).substr(1);
     page = std::make_unique<PageSource>(LEXARO_SOURCE_DATA "/codepage/cp_" + number + ".txt");
   }
   return *page;
 }
 
 void PageSource::read_line(std::string_view line) {
-  size_t space = line.find(' ');
-  std::string_view key = line.substr(0, space);
-  std::string_view rest = line.substr(space + 1);
+  const size_t space = line.find(' ');
+  const std::string_view key = line.substr(0, space), rest = line.substr(space + 1);
   std::istringstream words{std::string(rest)};
-  std::string word;
+  auto next = [&words, word = std::string()]() mutable { return words >> word, word; };
+  auto next_byte = [&] { return static_cast<uint8_t>(hex_number(next())); };
   if (key == "id") {
     id = static_cast<uint16_t>(std::stoul(std::string(rest)));
   } else if (key == "name") {
@@ -108,22 +95,15 @@ void PageSource::read_line(std::string_view line) {
            : rest == "mixed"     ? Kind::mixed
                                  : Kind::utf8;
   } else if (key == "substitution") {
-    substitution = static_cast<uint8_t>(hex_number(rest));
+    substitution = next_byte();
   } else if (key == "line-ends") {
-    for (uint8_t& byte : line_ends) {
-      words >> word;
-      byte = static_cast<uint8_t>(hex_number(word));
-    }
+    for (uint8_t& byte : line_ends) byte = next_byte();
   } else if (key == "shift") {
-    words >> word;
-    enter = static_cast<uint8_t>(hex_number(word));
-    words >> word;
-    leave = static_cast<uint8_t>(hex_number(word));
+    enter = next_byte();
+    leave = next_byte();
   } else if (key == "from" || key == "prefer") {
-    words >> word;
-    uint32_t unicode = hex_number(word.substr(2));
-    words >> word;
-    from_unicode_[unicode] = bytes_of_hex(word);
+    const std::string unicode = next();
+    from_unicode_[hex_number(unicode.substr(2))] = bytes_of_hex(next());
   } else {
     read_row(key, rest);
   }
@@ -226,10 +206,7 @@ std::string unpacked(uint32_t value) {
 std::string hex(std::string_view bytes) {
   static const char kDigits[] = "0123456789ABCDEF";
   std::string text;
-  for (size_t i = 0; i < bytes.size(); ++i) {
-    text += kDigits[byte_at(bytes, i) >> 4];
-    text += kDigits[byte_at(bytes, i) & 0xF];
-  }
+  for (size_t i = 0; i < bytes.size(); ++i) text += {kDigits[byte_at(bytes, i) >> 4], kDigits[byte_at(bytes, i) & 0xF]};
   return text;
 }
 

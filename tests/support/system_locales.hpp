@@ -2,9 +2,11 @@
 // Locales of the operating system, made with its own tool in a directory that LOCPATH names as long as this lives.
 #pragma once
 
+#include <gtest/gtest.h>
+#include <unistd.h>
+
 #include <bit>
 #include <cstdlib>
-#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -29,14 +31,14 @@ class SystemLocales {
     }
     made_ = std::system((command + "wait; } >log 2>&1").c_str()) == 0;
     for (const SystemLocale& one : locales) {
-      made_ = made_ && std::filesystem::exists(directory_.file(one.native) + "/LC_MONETARY");
+      made_ = made_ && access((directory_.file(one.native) + "/LC_MONETARY").c_str(), F_OK) == 0;
     }
   }
   // False where the tool or its sources are not installed.
   bool made() const { return made_; }
   // A further name for one of them.
   void add_name(const char* native, const std::string& name) const {
-    std::filesystem::create_directory_symlink(directory_.file(native), directory_.file(name));
+    EXPECT_EQ(symlink(directory_.file(native).c_str(), directory_.file(name).c_str()), 0) << name;
   }
 
  private:

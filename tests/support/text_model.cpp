@@ -159,11 +159,9 @@ StringResult convert_model(const Form& to, const Form& from, const Units& text, 
   }
 
   if ((!measured && source.empty()) || size == 0) {
-    if (!options.terminate || size == 0) return result;
-    if (out.inside) {
-      if (!by_characters && size < 2) return result;
-      out.units.push_back(to.page->leave);
-    }
+    const bool room = size > 1 || (size == 1 && (!out.inside || by_characters));
+    if (!options.terminate || !room) return result;
+    if (out.inside) out.units.push_back(to.page->leave);
     out.units.push_back(0);
     result.written = out.units;
     result.count = by_characters ? 1 : static_cast<int32_t>(out.units.size());

@@ -7,23 +7,6 @@ namespace {
 
 class TextFunctions : public testing::Test {
  protected:
-  // Units of a page's text in a form.
-  static Units letters(const Form& form, std::string_view units) {
-    if (form.kind == Form::wide) return {0x81, 0x4181, 0x81000000, 0x25, 0x0D, 0};
-    if (form.kind == Form::ucs2) return {'a', 0x2028, 0x0A, 0x0D, 0x2029, 0};
-    return units_of(units);
-  }
-  // Packed and UCS-2 characters are some that the page has.
-  static Units mapping_letters(const Form& form, std::string_view units) {
-    if (form.is_bytes()) return units_of(units);
-    Units result = {0, 0x20};
-    for (size_t i = 0; i < kMappingCharacters.size() && result.size() < 9; i += 7) {
-      if (form.page->has(kMappingCharacters[i]) || form.kind == Form::ucs2) {
-        result.push_back(spelled(form, kMappingCharacters.substr(i, 1))[0]);
-      }
-    }
-    return result;
-  }
   Units random_units(const Units& letters, size_t longest) {
     Units text(choice_.below(longest + 1));
     for (uint32_t& unit : text) unit = choice_.one_of(letters);
@@ -39,36 +22,19 @@ class TextFunctions : public testing::Test {
     }
     return out.units;
   }
-  template <class Use>
-  static void for_all_forms(const std::vector<Alphabet>& alphabets, bool all_kinds, Use use) {
-    for (const Alphabet& alphabet : alphabets) {
-      for (const Form& form : forms_of(PageSource::of(alphabet.page), all_kinds)) use(form, alphabet.units);
-    }
-  }
-  template <class Use>
-  static void for_text_forms(Use use) {
-    for_all_forms({std::begin(kAlphabets), std::end(kAlphabets)}, false,
-                  [&](const Form& form, std::string_view units) { use(form, letters(form, units)); });
-  }
-  template <class Use>
-  static void for_mapping_forms(Use use) {
-    for_all_forms({std::begin(kMappingAlphabets), std::end(kMappingAlphabets)}, true,
-                  [&](const Form& form, std::string_view units) { use(form, mapping_letters(form, units)); });
-  }
   const TestLanguage* any_language() { return &test_languages()[choice_.below(test_languages().size())]; }
 
   // Lengths, states and options as they come.
   void check_pair(Function function, const Form& form, const Units& text, const Units& other) {
-    TextCall call = {function, form, text};
-    if (form.follows_shifts()) call.other_state = static_cast<uint32_t>(choice_.below(2));
-    call.other = other;
-    call.options = choice_.below(2) != 0 ? LX_OPT_CHARS : 0;
+    TextCall call = {function, form, text, -1, other};
+    if (form.follows_shifts()) call.other_state = choice_.half();
+    call.options = choice_.half() ? LX_OPT_CHARS : 0;
     if (function == Function::chr) {
       if (form.is_shift(other[0])) return;
-      call.options = choice_.below(2) != 0 ? LX_STR_LAST : 0;
+      call.options = choice_.half() ? LX_STR_LAST : 0;
     }
     if (function == Function::cat && std::find(text.begin(), text.end(), 0u) != text.end()) return;
-    if (function == Function::cat && choice_.below(2) != 0) call.options |= LX_OPT_TERMINATE;
+    if (function == Function::cat && choice_.half()) call.options |= LX_OPT_TERMINATE;
     check_lengths(call);
   }
   void check_lengths(TextCall call) {
@@ -87,9 +53,10 @@ class TextFunctions : public testing::Test {
                                  1, 0x40,          0x41,          0x80000000,     0x80000001};
     TextCall call = {Function::cmp, form, text, 0, other};
     call.language = any_language();
-    call.options =
-        choice_.one_of(kFolds) | (choice_.below(3) == 0 ? LX_CMP_TRIM : 0) | (choice_.below(3) == 0 ? LX_OPT_CHARS : 0);
-    if (form.follows_shifts()) call.other_state = static_cast<uint32_t>(choice_.below(2));
+    call.options = choice_.one_of(kFolds);
+    if (!choice_.often()) call.options |= LX_CMP_TRIM;
+    if (!choice_.often()) call.options |= LX_OPT_CHARS;
+    if (form.follows_shifts()) call.other_state = choice_.half();
     check_lengths(call);
   }
   void check_mappings(const Form& form, const Units& text, bool every_size) {
@@ -97,13 +64,13 @@ class TextFunctions : public testing::Test {
          {0u, LX_MAP_H2F, LX_MAP_F2H, LX_MAP_COPY, LX_MAP_LOWER, LX_MAP_UPPER, LX_MAP_LOWER | LX_MAP_PLAIN,
           LX_MAP_UPPER | LX_MAP_PLAIN, LX_MAP_DIGITS, LX_MAP_UPPER | LX_MAP_DIGITS}) {
       // Counted copies of text with shift bytes are LXStrcpyEx's.
-      bool copy = flags == 0 || flags == LX_MAP_COPY;
-      if (choice_.below(3) == 0 && !(copy && form.follows_shifts())) flags |= LX_OPT_CHARS;
+      const bool copy = flags == 0 || flags == LX_MAP_COPY;
       TextCall call = {Function::map, form, text};
       call.options = flags;
-      auto most = static_cast<int32_t>(2 * text.size() + 3);
+      if (!choice_.often() && !(copy && form.follows_shifts())) call.options |= LX_OPT_CHARS;
+      const auto most = static_cast<int32_t>(2 * text.size() + 3);
       for (int32_t size = every_size ? -1 : most - 1; size <= most; ++size) {
-        call.size = every_size || size == most ? size : static_cast<int32_t>(choice_.below(static_cast<size_t>(most)));
+        call.size = every_size || size == most ? size : static_cast<int32_t>(choice_.below(2 * text.size() + 3));
         call.language = any_language();
         call.length = choice_.length(form, text, call.counts_characters());
         runner_.check(call);
@@ -116,68 +83,68 @@ class TextFunctions : public testing::Test {
 };
 
 TEST_F(TextFunctions, CopiesAndLineEndsOfAllShortTexts) {
-  for_text_forms([&](const Form& form, const Units& letters) {
-    for_all_strings(letters, 4, [&](const Units& text) {
-      auto all = static_cast<int32_t>(text.size());
+  for (const auto& [form, letters] : text_forms()) {
+    for_all_strings(letters, 4, [&, &form = form](const Units& text) {
+      const auto all = static_cast<int32_t>(text.size());
       TextCall call = {Function::cpy, form, text};
       for (call.length = all < 4 ? -1 : all; call.length <= all; ++call.length) {
         for (call.size = all < 4 ? -1 : 1; call.size <= all + 1; ++call.size) runner_.check(call);
       }
-      auto characters = static_cast<int32_t>(characters_of(form, text).list.size());
+      const auto characters = static_cast<int32_t>(characters_of(form, text).list.size());
       call.options = LX_OPT_CHARS;
       for (call.size = 0; call.size <= characters + 1; ++call.size) {
-        call.length = choice_.below(2) != 0 || ends_inside(form, text) ? -1 : characters;
+        call.length = choice_.half() || ends_inside(form, text) ? -1 : characters;
         runner_.check(call);
       }
       call.function = Function::eol;
       call.size = 0;
       for (uint32_t kinds = 0; kinds < 16; ++kinds) {
         if (all == 4 && choice_.often()) continue;
-        call.options = kinds << 8 | (choice_.below(2) != 0 ? LX_OPT_CHARS : 0);
+        call.options = kinds << 8 | (choice_.half() ? LX_OPT_CHARS : 0);
         call.length = choice_.length(form, text, call.counts_characters());
         runner_.check(call);
       }
     });
-  });
+  }
 }
 
 TEST_F(TextFunctions, AllPairsOfShortTexts) {
-  for_text_forms([&](const Form& form, const Units& letters) {
-    for_all_strings(letters, 3, [&](const Units& text) {
-      for_all_strings(letters, 2, [&](const Units& other) {
-        if (text.size() < 3 || other.size() < 2 || choice_.below(8) == 0) check_pairs(form, text, other);
+  for (const Lettered& one : text_forms()) {
+    for_all_strings(one.letters, 3, [&](const Units& text) {
+      for_all_strings(one.letters, 2, [&](const Units& other) {
+        if (text.size() < 3 || other.size() < 2 || choice_.below(8) == 0) check_pairs(one.form, text, other);
       });
     });
-  });
-  for_mapping_forms([&](const Form& form, const Units& letters) {
-    for_all_strings(letters, 3, [&](const Units& text) {
-      for_all_strings(letters, text.size() < 3 ? 2 : 1,
-                      [&](const Units& other) { check_comparison(form, text, other); });
-      check_comparison(form, text, text);
-      if (text.size() < 3 || choice_.below(4) == 0) check_mappings(form, text, text.size() < 3);
+  }
+  for (const Lettered& one : mapping_forms()) {
+    for_all_strings(one.letters, 3, [&](const Units& text) {
+      for_all_strings(one.letters, text.size() < 3 ? 2 : 1,
+                      [&](const Units& other) { check_comparison(one.form, text, other); });
+      check_comparison(one.form, text, text);
+      if (text.size() < 3 || choice_.below(4) == 0) check_mappings(one.form, text, text.size() < 3);
     });
-  });
+  }
 }
 
 TEST_F(TextFunctions, RandomTexts) {
-  for_text_forms([&](const Form& form, const Units& letters) {
+  for (const auto& [form, letters] : text_forms()) {
     for (int i = 0; i < 1000; ++i) check_pairs(form, random_units(letters, 40), random_units(letters, 4));
-  });
-  for_mapping_forms([&](const Form& form, const Units& letters) {
+  }
+  for (const auto& [form, letters] : mapping_forms()) {
     for (int i = 0; i < 100; ++i) check_mappings(form, mapping_text(form, letters, 40), i < 2);
     for (int i = 0; i < 600; ++i) {  // texts that begin alike
-      Units text = mapping_text(form, letters, 20);
+      const Units text = mapping_text(form, letters, 20);
       Units other = text;
       TextCall call = {Function::map, form, text, static_cast<int32_t>(text.size())};
       call.size = 3 * call.length;
-      call.options = choice_.below(2) != 0 ? LX_MAP_F2H : LX_MAP_UPPER;
-      Outcome mapped = map_model(call);
+      call.options = choice_.half() ? LX_MAP_F2H : LX_MAP_UPPER;
+      const Outcome mapped = map_model(call);
       if (choice_.often()) other = first_units(mapped.memory, static_cast<size_t>(mapped.result));
-      if (choice_.below(2) != 0 && !other.empty()) other[choice_.below(other.size())] = choice_.one_of(letters);
+      if (choice_.half() && !other.empty()) other[choice_.below(other.size())] = choice_.one_of(letters);
       for (size_t blanks = choice_.below(4); form.page->ascii_family && blanks > 1; --blanks) other.push_back(0x20);
       check_comparison(form, text, other);
     }
-  });
+  }
 }
 
 TEST_F(TextFunctions, FoldedSearches) {
@@ -187,13 +154,13 @@ TEST_F(TextFunctions, FoldedSearches) {
     auto random_text = [&](size_t longest) {
       std::u16string text;
       for (size_t n = 1 + choice_.below(longest); n > 0;) {
-        char16_t c = kLetters[choice_.below(kLetters.size())];
+        const char16_t c = kLetters[choice_.below(kLetters.size())];
         if (page.has(c)) text += c, --n;
       }
       return text;
     };
     for (int i = 0; i < 1000; ++i) {
-      std::u16string text = random_text(9), pattern = random_text(2);
+      const std::u16string text = random_text(9), pattern = random_text(2);
       for (Form form : {Form{Form::plain, &page}, {Form::shifted, &page}, {Form::wide, &page}, {Form::ucs2, &page}}) {
         if (form.kind == Form::plain && page.mixed()) continue;
         TextCall call = {Function::str, form, spelled(form, text), -1, spelled(form, pattern)};
@@ -207,22 +174,20 @@ TEST_F(TextFunctions, FoldedSearches) {
 
 // Where no character grows, and where the output is made elsewhere first.
 TEST_F(TextFunctions, MappingInPlace) {
-  for (uint16_t id : {uint16_t{819}, uint16_t{932}, uint16_t{954}, uint16_t{930}}) {
-    for (const Form& form : forms_of(PageSource::of(id), true)) {
-      for (int i = 0; i < 200; ++i) {
-        TextCall call = {Function::map, form, mapping_text(form, {0x20}, 30)};
-        for (uint32_t flags :
-             {0u, LX_MAP_UPPER | LX_MAP_PLAIN, LX_MAP_LOWER | LX_MAP_PLAIN, LX_MAP_DIGITS, LX_MAP_H2F | LX_OPT_CHARS}) {
-          call.options = flags;
-          bool counted = call.counts_characters();
-          if (!counted && (form.follows_shifts() || flags == (LX_MAP_H2F | LX_OPT_CHARS))) continue;
-          call.length = static_cast<int32_t>(counted ? characters_of(form, call.text).list.size() : call.text.size());
-          call.size = counted ? call.length / 3 : call.length;
-          Outcome expected = map_model(call);
-          if (!counted) expected.memory.resize(static_cast<size_t>(expected.result));
-          if (expected.memory.size() > call.text.size()) continue;
-          EXPECT_EQ(runner_.run(call, expected.memory.size(), true), expected) << call.describe();
-        }
+  for (const auto& [form, letters] : mapping_forms()) {
+    for (int i = 0; i < 100; ++i) {
+      TextCall call = {Function::map, form, mapping_text(form, {0x20}, 30)};
+      for (uint32_t flags :
+           {0u, LX_MAP_UPPER | LX_MAP_PLAIN, LX_MAP_LOWER | LX_MAP_PLAIN, LX_MAP_DIGITS, LX_MAP_H2F | LX_OPT_CHARS}) {
+        call.options = flags;
+        const bool counted = call.counts_characters();
+        if (!counted && (form.follows_shifts() || flags == (LX_MAP_H2F | LX_OPT_CHARS))) continue;
+        call.length = static_cast<int32_t>(counted ? characters_of(form, call.text).list.size() : call.text.size());
+        call.size = counted ? call.length / 3 : call.length;
+        Outcome expected = map_model(call);
+        if (!counted) expected.memory.resize(static_cast<size_t>(expected.result));
+        if (expected.memory.size() > call.text.size()) continue;
+        EXPECT_EQ(runner_.run(call, expected.memory.size(), true), expected) << call.describe();
       }
     }
   }
@@ -231,29 +196,30 @@ TEST_F(TextFunctions, MappingInPlace) {
 // Every bit alone and beside others, in every kind of text.
 TEST_F(TextFunctions, OptionBits) {
   using enum Function;
-  auto accepted = [](Function function, uint32_t options) {
-    uint32_t others = options & ~LX_OPT_CHARS;
-    if (function == cat) return (others & ~LX_OPT_TERMINATE) == 0;
-    if (function == chr) return options == 0 || options == LX_STR_LAST;
-    if (function == str) return (others & ~LX_CMP_NOWIDTH) == 0;
-    if (function == cmp) return (others & ~(LX_CMP_NOWIDTH | LX_CMP_TRIM | LX_CMP_NOCASE)) == 0;
-    if (function == eol) return (others & ~0xF00u) == 0;
-    return others == 0;
-  };
-  for (const PageSource* page : {&PageSource::of(819), &PageSource::of(932), &PageSource::of(930)}) {
-    for (const Form& form : forms_of(*page, true)) {
-      for (Function function : {cpy, cat, chr, str, spn, cspn, tok, eol, cmp, map}) {
-        for (unsigned bit = 0; bit <= 32; ++bit) {
-          for (uint32_t others : {0u, LX_OPT_CHARS, LX_CMP_NOWIDTH, LX_STR_LAST, LX_MAP_UPPER}) {
-            TextCall call = {function, form, {'a', 'a'}, 1, {'a', 'a'}, 1, 0, 2, others | (bit == 32 ? 0 : 1u << bit)};
-            if (ends_inside(form, call.text)) call.text.push_back(page->leave);
-            Outcome got = runner_.run(call, 8);
-            bool good = function == map ? map_model(call).status == LX_OK : accepted(function, call.options);
-            EXPECT_EQ(got.status, good ? LX_OK : LX_E_ARGUMENT) << call.describe();
-            if (good) continue;
-            EXPECT_LE(got.result, 0) << call.describe();
-            EXPECT_TRUE(function != eol || (got.type == LX_EOL_BAD && got.rest == 0));
-          }
+  constexpr uint32_t kChars = LX_OPT_CHARS, kFolds = LX_CMP_NOWIDTH | kChars;
+  const std::pair<Function, uint32_t> accepted[] = {{cpy, kChars},      {cat, kChars | LX_OPT_TERMINATE},
+                                                    {str, kFolds},      {cmp, kFolds | LX_CMP_TRIM},
+                                                    {spn, kChars},      {cspn, kChars},
+                                                    {tok, kChars},      {eol, kChars | 0xF00},
+                                                    {chr, LX_STR_LAST}, {map, 0}};
+  std::vector<Form> forms;
+  for (uint16_t page : {uint16_t{819}, uint16_t{932}, uint16_t{930}}) {
+    for (const Form& form : forms_of(PageSource::of(page), true)) forms.push_back(form);
+  }
+  for (const Form& form : forms) {
+    for (const auto& [function, bits] : accepted) {
+      for (unsigned bit = 0; bit <= 32; ++bit) {
+        for (uint32_t others : {0u, LX_OPT_CHARS, LX_CMP_NOWIDTH, LX_STR_LAST, LX_MAP_UPPER}) {
+          TextCall call = {function, form, {'a', 'a'}, 1, {'a', 'a'}, 1, 0, 2, others | (bit == 32 ? 0 : 1u << bit)};
+          if (ends_inside(form, call.text)) call.text.push_back(form.page->leave);
+          bool good = (call.options & ~bits) == 0;
+          if (function == chr) good = call.options == 0 || call.options == LX_STR_LAST;
+          if (function == map) good = map_model(call).status == LX_OK;
+          const Outcome got = runner_.run(call, 8);
+          EXPECT_EQ(got.status, good ? LX_OK : LX_E_ARGUMENT) << call.describe();
+          if (good) continue;
+          EXPECT_LE(got.result, 0) << call.describe();
+          EXPECT_TRUE(function != eol || (got.type == LX_EOL_BAD && got.rest == 0));
         }
       }
     }

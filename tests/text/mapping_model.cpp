@@ -19,13 +19,8 @@ Glyph glyph_of(const Character& c) { return {c.code, c.size}; }
 
 const PageObject& object_of(uint16_t id) {
   static std::map<uint16_t, PageObject> objects;
-  auto at = objects.find(id);
-  if (at == objects.end()) {
-    std::string number = std::to_string(id);
-    number.insert(0, 5 - number.size(), '0');
-    at = objects.emplace(id, PageObject(LEXARO_DATA "/cp_" + number + ".nls")).first;
-  }
-  return at->second;
+  const std::string number = std::to_string(100000u + id).substr(1);
+  return objects.try_emplace(id, LEXARO_DATA "/cp_" + number + ".nls").first->second;
 }
 
 // What a character means in texts of a form.
@@ -110,33 +105,24 @@ struct Mapper {
     return nullptr;
   }
   Glyph mapped(Glyph glyph) const {
-    switch (flags & ~LX_MAP_PLAIN) {
-      case LX_MAP_H2F:
-        return meanings.full(glyph);
-      case LX_MAP_F2H:
-        return meanings.half(glyph);
-      case LX_MAP_LOWER:
-      case LX_MAP_UPPER:
-        return meanings.cased(glyph, (flags & ~LX_MAP_PLAIN) == LX_MAP_UPPER);
-      default:
-        return meanings.digit(glyph);
-    }
+    const uint32_t kind = flags & ~LX_MAP_PLAIN;
+    if (kind == LX_MAP_H2F) return meanings.full(glyph);
+    if (kind == LX_MAP_F2H) return meanings.half(glyph);
+    if (kind == LX_MAP_LOWER || kind == LX_MAP_UPPER) return meanings.cased(glyph, kind == LX_MAP_UPPER);
+    return meanings.digit(glyph);
   }
   std::vector<Glyph> mapped(const std::vector<Character>& text) const {
     std::vector<Glyph> out;
     for (size_t i = 0; i < text.size(); ++i) {
-      const Special* pair = special(meanings.unicode(glyph_of(text[i])), 0);
-      if (pair == nullptr && i + 1 < text.size()) {
-        uint16_t next = meanings.unicode(glyph_of(text[i + 1]));
-        if (next != 0) pair = special(meanings.unicode(glyph_of(text[i])), next);
-        if (pair != nullptr) ++i;
+      const Glyph glyph = glyph_of(text[i]);
+      const uint16_t next = i + 1 < text.size() ? meanings.unicode(glyph_of(text[i + 1])) : uint16_t{0};
+      const Special* pair = special(meanings.unicode(glyph), 0);
+      if (pair == nullptr && next != 0) {
+        pair = special(meanings.unicode(glyph), next);
+        i += pair != nullptr;
       }
-      if (pair == nullptr) {
-        out.push_back(mapped(glyph_of(text[i])));
-      } else {
-        out.push_back(meanings.glyph(pair->value1));
-        if (pair->value2 != 0) out.push_back(meanings.glyph(pair->value2));
-      }
+      out.push_back(pair != nullptr ? meanings.glyph(pair->value1) : mapped(glyph));
+      if (pair != nullptr && pair->value2 != 0) out.push_back(meanings.glyph(pair->value2));
     }
     return out;
   }
@@ -185,13 +171,27 @@ struct Comparer {
     Units units = told(form, text, length, call.counts_characters());
     if (length > 0) units = first_units(units, characters_of(form, units).whole);
     if ((call.options & LX_CMP_TRIM) == 0 || units.empty()) return units;
-    return trimmed(form, form.is_bytes() ? told(form, units, -1, false) : units, width);
+    return trimmed(form, form.is_bytes() ? told(form, units, -1, false) : units);
+  }
+  Units trimmed(const Form& form, const Units& text) const {
+    const Glyph blank = {form.kind == Form::ucs2 || form.page->ascii_family ? 0x20u : 0x40u, 1};
+    const Glyph wide = width ? meanings.full(blank) : blank;
+    const Characters all = characters_of(form, text);
+    auto is_blank = [&](size_t i) { return glyph_of(all.list[i]) == blank || glyph_of(all.list[i]) == wide; };
+    size_t kept = all.list.size();
+    // On multibyte pages a byte that ends the text goes with the blanks before it.
+    const bool odd =
+        form.is_bytes() && form.page->max_length > 1 && kept > 1 && all.list[kept - 1].at + 1 == text.size();
+    if (odd && !is_blank(kept - 1) && is_blank(kept - 2)) --kept;
+    while (kept != 0 && is_blank(kept - 1)) --kept;
+    return first_units(text, kept == all.list.size() ? all.whole : all.list[kept].at);
   }
   Outcome bytes(const Units& a, const Units& b) const {
-    size_t common = std::min(a.size(), b.size());
-    auto [x, y] = std::mismatch(a.begin(), a.begin() + static_cast<ptrdiff_t>(common), b.begin());
-    if (x == a.begin() + static_cast<ptrdiff_t>(common)) return decided(a.size(), b.size());
-    Outcome outcome = decided(*x, *y);
+    const size_t common = std::min(a.size(), b.size());
+    size_t i = 0;
+    while (i < common && a[i] == b[i]) ++i;
+    if (i == common) return decided(a.size(), b.size());
+    Outcome outcome = decided(a[i], b[i]);
     outcome.sign_only = true;
     return outcome;
   }
@@ -201,36 +201,33 @@ struct Comparer {
   int64_t difference(Glyph a, Glyph b) const {
     if (call.form.kind == Form::wide) return a.code == b.code ? 0 : a.code < b.code ? -1 : 1;
     if (call.form.kind == Form::ucs2) return decided(a.code, b.code).result;
-    std::string x = bytes_of_code(a.code, a.size), y = bytes_of_code(b.code, b.size);
+    Units x = units_of(bytes_of_code(a.code, a.size)), y = units_of(bytes_of_code(b.code, b.size));
     x.resize(4), y.resize(4);
-    for (size_t i = 0; i < 4; ++i) {
-      if (x[i] != y[i]) return decided(static_cast<uint8_t>(x[i]), static_cast<uint8_t>(y[i])).result;
-    }
-    return 0;
+    size_t i = 0;
+    while (i < 3 && x[i] == y[i]) ++i;
+    return decided(x[i], y[i]).result;
   }
   Outcome characters(const Units& a, const Units& b, bool fold) const {
     const Form form_b = call.other_form();
-    Characters x = characters_of(call.form, a);
-    Characters y = characters_of(form_b, b);
-    size_t common = std::min(x.list.size(), y.list.size());
+    const Characters x = characters_of(call.form, a), y = characters_of(form_b, b);
+    const size_t common = std::min(x.list.size(), y.list.size());
     for (size_t i = 0; i < common; ++i) {
-      Glyph p = glyph_of(x.list[i]), q = glyph_of(y.list[i]);
-      Glyph p_folded = fold ? folded(p) : p, q_folded = fold ? folded(q) : q;
-      Outcome lengths = width ? decided(p_folded.size, q_folded.size) : decided(p.size, q.size);
+      const Glyph p = glyph_of(x.list[i]), q = glyph_of(y.list[i]);
+      const Glyph p_folded = fold ? folded(p) : p, q_folded = fold ? folded(q) : q;
+      const Outcome lengths = width ? decided(p_folded.size, q_folded.size) : decided(p.size, q.size);
       if (lengths.result != 0) return lengths;
       if (int64_t result = difference(p_folded, q_folded)) return {result};
     }
     // One of them ends here, perhaps inside a character; that has the length that it should have.
-    auto rest = [&](const Characters& text) { return common < text.list.size() ? text.list[common].at : text.whole; };
-    auto state = [&](const Characters& text) {
-      return common < text.list.size() ? text.list[common].state : text.state;
+    auto next = [&](const Characters& text) {
+      return common < text.list.size() ? text.list[common] : Character{text.whole, 0, 0, 0, text.state};
     };
-    size_t at_a = rest(x), at_b = rest(y);
-    if (at_a < a.size() && at_b < b.size()) {
-      Outcome lengths = decided(call.form.length_of(a[at_a], state(x)), form_b.length_of(b[at_b], state(y)));
+    const Character p = next(x), q = next(y);
+    if (p.at < a.size() && q.at < b.size()) {
+      const Outcome lengths = decided(call.form.length_of(a[p.at], p.state), form_b.length_of(b[q.at], q.state));
       if (lengths.result != 0) return lengths;
     }
-    Outcome outcome = decided(a.size() - at_a, b.size() - at_b);
+    Outcome outcome = decided(a.size() - p.at, b.size() - q.at);
     outcome.sign_only = call.form.follows_shifts();  // of shift bytes some may count, but they decide nothing
     return outcome;
   }
@@ -276,40 +273,26 @@ const std::vector<TestLanguage>& test_languages() {
 }
 
 Outcome map_model(const TextCall& call) {
-  uint32_t flags = call.options & ~LX_OPT_CHARS;
-  bool copy = flags == 0 || flags == LX_MAP_COPY;
-  bool plain = flags == (LX_MAP_LOWER | LX_MAP_PLAIN) || flags == (LX_MAP_UPPER | LX_MAP_PLAIN);
-  bool known = (flags >= LX_MAP_H2F && flags <= LX_MAP_UPPER) || flags == LX_MAP_DIGITS || copy || plain;
+  const uint32_t flags = call.options & ~LX_OPT_CHARS;
+  const bool copy = flags == 0 || flags == LX_MAP_COPY;
+  const bool plain = flags == (LX_MAP_LOWER | LX_MAP_PLAIN) || flags == (LX_MAP_UPPER | LX_MAP_PLAIN);
+  const bool known = (flags >= LX_MAP_H2F && flags <= LX_MAP_UPPER) || flags == LX_MAP_DIGITS || copy || plain;
   if (!known) return {-1, LX_E_ARGUMENT};
-  bool by_characters = call.counts_characters();
+  const bool counted = call.counts_characters();
   Outcome outcome;
   if (copy) {
     TextCall copying = call;
     copying.function = Function::cpy;
-    copying.options = by_characters ? LX_OPT_CHARS : 0;
+    copying.options = counted ? LX_OPT_CHARS : 0;
     outcome = model(copying);
   } else {
-    outcome = Mapper{call}.write(
-        characters_of(call.form, told(call.form, call.text, call.length, by_characters, false, false)));
+    const Units text = told(call.form, call.text, call.length, counted, false, false);
+    outcome = Mapper{call}.write(characters_of(call.form, text));
   }
-  if (!by_characters) outcome.memory.resize(static_cast<size_t>(std::max(call.size, 0)), kUnwritten);
+  if (!counted) outcome.memory.resize(static_cast<size_t>(std::max(call.size, 0)), kUnwritten);
   return outcome;
 }
 
 Outcome compare_model(const TextCall& call) { return Comparer{call}.compare(); }
-
-Units trimmed(const Form& form, const Units& text, bool full_width) {
-  uint32_t blank = form.kind == Form::ucs2 || form.page->ascii_family ? 0x20 : 0x40;
-  Glyph wide = full_width ? Meanings{form}.full({blank, 1}) : Glyph{blank, 1};
-  std::vector<Character> list = characters_of(form, text).list;
-  auto is_blank = [&](const Character& c) { return glyph_of(c) == Glyph{blank, 1} || glyph_of(c) == wide; };
-  size_t kept = list.size();
-  // On multibyte pages a byte that ends the text goes with the blanks before it.
-  bool odd = form.is_bytes() && form.page->max_length > 1 && kept > 1 && list[kept - 1].at + 1 == text.size();
-  if (odd && !is_blank(list[kept - 1]) && is_blank(list[kept - 2])) --kept;
-  while (kept != 0 && is_blank(list[kept - 1])) --kept;
-  if (kept == list.size()) return first_units(text, characters_of(form, text).whole);
-  return first_units(text, kept == 0 ? list[0].at : list[kept].at);
-}
 
 }  // namespace lx::test

@@ -17,29 +17,33 @@ auto call(const Form& form, Function function, Args... args) {
 }
 
 // A text without zeros cut to fit: the result, and the memory with its terminator.
-std::pair<int32_t, Units> truncated(const Form& form, const Units& text, size_t size, bool strip) {
-  const PageSource& page = *form.page;
-  const uint32_t blank = page.ascii_family ? 0x20 : 0x40;
+std::pair<int32_t, Units> truncated(const Form& form, const Units& text, size_t size, uint32_t flags) {
+  const bool strip = (flags & LX_TRUNC_STRIP) != 0, full_width = (flags & LX_CMP_NOWIDTH) == LX_CMP_NOWIDTH;
   Units memory = text;
   memory.push_back(0);
-  bool fits = text.size() < size;
+  const bool fits = text.size() < size;
   if (fits && !strip) return {0, memory};
-  std::vector<Character> list = characters_of(form, text).list;
-  size_t kept = 0;  // characters
+  const std::vector<Character> list = characters_of(form, text).list;
   auto end = [&](size_t count) { return count == 0 ? 0 : list[count - 1].own_end(); };
-  auto open = [&](size_t count) { return count == 0 ? form.state != 0 : list[count - 1].state != 0; };
-  bool closes = form.follows_shifts();
-  while (kept < list.size() && (fits || end(kept + 1) + (closes && open(kept + 1)) < size)) ++kept;
-  auto is_blank = [&](size_t i) { return list[i].size == 1 && list[i].code == blank; };
-  size_t run = strip ? kept : 0;  // where trailing blanks begin; a last byte of long pages belongs to them
-  if (strip && kept != 0 && page.max_length > 1 && list[kept - 1].size == 1 && end(kept) == text.size() && kept > 1 &&
-      is_blank(kept - 2)) {
-    --run;
+  auto leaves = [&](size_t count) {
+    return form.follows_shifts() && (count == 0 ? form.state : list[count - 1].state) != 0;
+  };
+  size_t kept = 0;  // characters
+  while (kept < list.size() && (fits || end(kept + 1) + leaves(kept + 1) < size)) ++kept;
+  if (strip) {
+    const std::string blank = form.page->ascii_family ? " " : "\x40", wide = form.page->encode(0x3000);
+    auto is_blank = [&](size_t count) {
+      const std::string bytes = bytes_of_code(list[count - 1].code, list[count - 1].size);
+      return bytes == blank || (full_width && bytes == wide && wide.size() > 1);
+    };
+    // On long pages a byte that ends the text goes with the blanks before it.
+    const bool last_byte =
+        form.page->max_length > 1 && kept > 1 && list[kept - 1].size == 1 && end(kept) == text.size();
+    if (last_byte && is_blank(kept - 1)) --kept;
+    while (kept != 0 && is_blank(kept)) --kept;
   }
-  while (strip && run != 0 && is_blank(run - 1)) --run;
-  if (strip) kept = run;
   size_t at = end(kept);
-  if (closes && open(kept) && at != text.size() && at + 1 < size) memory[at++] = page.leave;
+  if (leaves(kept) && at != text.size() && at + 1 < size) memory[at++] = form.page->leave;
   memory[at] = 0;
   return {static_cast<int32_t>(at + 1), memory};
 }
@@ -47,22 +51,18 @@ std::pair<int32_t, Units> truncated(const Form& form, const Units& text, size_t 
 class Navigation : public testing::Test {
  protected:
   // For all short texts, which stand terminated at the edge of memory; use(form, text, s).
-  template <class Use>
-  void for_all_texts(Use use) {
-    for (const Alphabet& alphabet : kAlphabets) {
-      const PageSource& page = PageSource::of(alphabet.page);
-      locale_ = runner_.locale(page);
-      Units units = units_of(alphabet.units);
+  void for_all_texts(const std::function<void(const Form&, const Units&, char*)>& use) {
+    for (const auto& [form, letters] : text_forms()) {
+      if (!form.is_bytes()) continue;
+      locale_ = runner_.locale(*form.page);
+      Units units = letters;
       std::erase(units, 0u);
-      units.push_back(page.ascii_family ? 0x20 : 0x40);
-      for (const Form& form : forms_of(page, false)) {
-        if (!form.is_bytes()) continue;
-        for_all_strings(units, 4, [&](const Units& text) {
-          if (HasFailure()) return;  // one fault makes many
-          SCOPED_TRACE(form.name() + ": " + hex_units(text));
-          use(form, text, place<char>(edge_, text, -1));
-        });
-      }
+      units.push_back(form.page->ascii_family ? 0x20 : 0x40);
+      for_all_strings(units, 4, [&, &form = form](const Units& text) {
+        if (HasFailure()) return;  // one fault makes many
+        SCOPED_TRACE(form.name() + ": " + hex_units(text));
+        use(form, text, place<char>(edge_, text, -1));
+      });
     }
   }
 
@@ -142,13 +142,12 @@ TEST_F(Navigation, StepsOverCharacters) {
 
 TEST_F(Navigation, CutsToEverySize) {
   for_all_texts([&](const Form& form, const Units& text, char*) {
-    for (bool strip : {false, true}) {
+    for (uint32_t flags : {0u, LX_TRUNC_STRIP, LX_TRUNC_STRIP | LX_CMP_NOWIDTH}) {
       for (size_t size = 1; size <= text.size() + 2; ++size) {
         char* at = place<char>(edge_, text, -1);
-        auto expected = truncated(form, text, size, strip);
-        int32_t result = call(form, kTruncate, locale_, at, State{form.state}, static_cast<int32_t>(size),
-                              strip ? LX_TRUNC_STRIP : 0);
-        EXPECT_EQ(std::pair(result, units_of({at, expected.second.size()})), expected) << size << strip;
+        const auto expected = truncated(form, text, size, flags);
+        const int32_t result = call(form, kTruncate, locale_, at, State{form.state}, static_cast<int32_t>(size), flags);
+        EXPECT_EQ(std::pair(result, units_of({at, expected.second.size()})), expected) << size << ' ' << flags;
       }
     }
   });

@@ -93,33 +93,26 @@ struct Model {
   }
 
   void str() {
-    Units wanted = other_units();
-    bool terminator = std::find(wanted.begin(), wanted.end(), 0u) != wanted.end();
-    Units units = told(form, call.text, call.length, by_characters, terminator);
-    auto list = characters_of(form, units).list;
-    Characters pattern = other();
-    size_t count = pattern.list.size();
-    if (call.length == 0) return;
-    if (count == 0) {
-      if (pattern.cut) return;
-      outcome.result = 0;
-      if (form.follows_shifts()) outcome.state = form.state;
-      return;
-    }
-    bool folds = (call.options & ~LX_OPT_CHARS) != 0;
+    const Units wanted = other_units();
+    const bool terminator = std::find(wanted.begin(), wanted.end(), 0u) != wanted.end();
+    const Units units = told(form, call.text, call.length, by_characters, terminator);
+    const auto list = characters_of(form, units).list;
+    const Characters pattern = other();
+    const size_t count = pattern.list.size();
+    if (call.length == 0 || (count == 0 && pattern.cut)) return;
+    if (count == 0) return found_at({0, 0, 0, 0, form.state});
+    const bool folds = (call.options & ~LX_OPT_CHARS) != 0;
     for (size_t i = 0; i + count <= list.size(); ++i) {
-      bool same =
-          !folds && std::equal(pattern.list.begin(), pattern.list.end(), list.begin() + static_cast<ptrdiff_t>(i),
-                               [](const Character& a, const Character& b) { return a.same(b); });
+      bool same = true;
+      for (size_t k = 0; k < count && !folds; ++k) same = same && list[i + k].same(pattern.list[k]);
       if (folds) {  // as many characters compare equal
-        Units part(units.begin() + static_cast<ptrdiff_t>(list[i].at),
-                   units.begin() + static_cast<ptrdiff_t>(list[i + count - 1].own_end()));
         TextCall compared = call;
         compared.form.state = list[i].state;
-        compared.text = part;
-        compared.length = static_cast<int32_t>(part.size());
-        compared.other = other_units();
-        compared.other_length = static_cast<int32_t>(compared.other.size());
+        compared.text.assign(units.begin() + static_cast<ptrdiff_t>(list[i].at),
+                             units.begin() + static_cast<ptrdiff_t>(list[i + count - 1].own_end()));
+        compared.length = static_cast<int32_t>(compared.text.size());
+        compared.other = wanted;
+        compared.other_length = static_cast<int32_t>(wanted.size());
         compared.options &= ~LX_OPT_CHARS;
         same = compare_model(compared).result == 0;
       }
@@ -128,20 +121,23 @@ struct Model {
   }
 
   void span(bool wanted) {
-    Characters found = text(false);
-    Characters set = other();
+    const Characters found = text(false), set = other();
     size_t passed = 0;
     while (passed < found.list.size() && contains(set, found.list[passed]) == wanted) ++passed;
     size_t end = passed == 0 ? 0 : found.list[passed - 1].end;
     outcome.result = static_cast<int64_t>(by_characters ? passed : end);
   }
 
+  void spn() { span(true); }
+  void cspn() { span(false); }
+  void map() { outcome = map_model(call); }
+  void cmp() { outcome = compare_model(call); }
+
   void tok() {
     outcome.memory = call.text;
     if (call.length < 0) outcome.memory.push_back(0);
-    Characters found = text(false);
-    size_t all = told(form, call.text, call.length, by_characters).size();
-    Characters set = other();
+    const Characters found = text(false), set = other();
+    const size_t all = told(form, call.text, call.length, by_characters).size();
     size_t first = 0;
     while (first < found.list.size() && contains(set, found.list[first])) ++first;
     if (first == found.list.size()) return;
@@ -184,23 +180,13 @@ struct Model {
   }
 };
 
-const char* const kNames[] = {"cpy", "cat", "chr", "str", "spn", "cspn", "tok", "eol", "map", "cmp"};
-
 }  // namespace
 
 Outcome model(const TextCall& call) {
-  static constexpr void (*kFunctions[])(Model&) = {[](Model& m) { m.cpy(); },
-                                                   [](Model& m) { m.cat(); },
-                                                   [](Model& m) { m.chr(); },
-                                                   [](Model& m) { m.str(); },
-                                                   [](Model& m) { m.span(true); },
-                                                   [](Model& m) { m.span(false); },
-                                                   [](Model& m) { m.tok(); },
-                                                   [](Model& m) { m.eol(); },
-                                                   [](Model& m) { m.outcome = map_model(m.call); },
-                                                   [](Model& m) { m.outcome = compare_model(m.call); }};
+  static constexpr void (Model::*kFunctions[])() = {&Model::cpy,  &Model::cat, &Model::chr, &Model::str, &Model::spn,
+                                                    &Model::cspn, &Model::tok, &Model::eol, &Model::map, &Model::cmp};
   Model doing{call};
-  kFunctions[static_cast<size_t>(call.function)](doing);
+  (doing.*kFunctions[static_cast<size_t>(call.function)])();
   return doing.outcome;
 }
 
@@ -215,16 +201,19 @@ TextCall TextCall::swapped() const {
 }
 
 std::string TextCall::describe() const {
-  return std::string(kNames[static_cast<size_t>(function)]) + " " + language->name + form.name() + ": text " +
-         hex_units(text) + "length " + std::to_string(length) + ", other " + hex_units(other) + "length " +
-         std::to_string(other_length) + " state " + std::to_string(other_state) + ", size " + std::to_string(size) +
-         " options " + hex(unpacked(options));
+  static const char* const kNames[] = {"cpy", "cat", "chr", "str", "spn", "cspn", "tok", "eol", "map", "cmp"};
+  return kNames[static_cast<size_t>(function)] + (" " + (language->name + form.name())) + ": text " + hex_units(text) +
+         "length " + std::to_string(length) + ", other " + hex_units(other) + "length " + std::to_string(other_length) +
+         " state " + std::to_string(other_state) + ", size " + std::to_string(size) + " options " +
+         hex(unpacked(options));
 }
 
 std::string Outcome::describe() const {
-  return "result " + std::to_string(result) + " status " + std::to_string(status) + " memory " + hex_units(memory) +
-         "next " + std::to_string(next) + " rest " + std::to_string(rest) + " type " + hex(unpacked(type)) + " state " +
-         std::to_string(state);
+  std::string text = "memory " + hex_units(memory) + "result, status, next, rest, type, state";
+  for (int64_t number : {result, int64_t{status}, next, int64_t{rest}, int64_t{type}, int64_t{state}}) {
+    text += " " + std::to_string(number);
+  }
+  return text;
 }
 
 }  // namespace lx::test

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 // The text functions done slowly, on lists of characters that are looked up in the readable source of the page, in its
-// compiled object read by a second reader, and in the Unicode tables. Shares no code with the library.
+// compiled object read by a second reader. Shares no code with the library but what single characters are in Unicode.
 #pragma once
 
 #include "support/page_object.hpp"
@@ -65,10 +65,8 @@ Outcome compare_model(const TextCall& call);
 // The part of a text that a length tells. Counted characters come with the shift byte that closes their run, or alone.
 Units told(const Form& form, Units text, int32_t length, bool by_characters, bool with_terminator = false,
            bool run_closed = true);
-// What trailing blanks leave.
-Units trimmed(const Form& form, const Units& text, bool full_width);
 
-// ---- Unicode: the exported tables, and the rules for what is in none ----
+// ---- Unicode: what the library says of single characters, which has tests of its own ----
 
 uint32_t type_model(uint32_t character);
 uint16_t lower_model(uint32_t character);

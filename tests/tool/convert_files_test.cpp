@@ -55,12 +55,9 @@ TEST_F(ConvertFiles, FailureLeavesTheOutputAlone) {
 TEST_F(ConvertFiles, SpecialFilesAreWrittenDirectly) {
   check_runs("convert -f 37", {{"-o /dev/null", bytes("C1")}, {"-o /dev/stdout", bytes("C1"), "A"}});
   EXPECT_TRUE(fs::is_character_file("/dev/null"));
-  ToolInput full;
-  full.text = bytes("C1");
-  full.output_path = "/dev/full";
-  const ToolResult result = run_tool("convert -f 37", full);
-  EXPECT_EQ(result.status, 3);
-  expect_told(result, "standard output: write error at byte 0: No space left");
+  const ToolResult full = run_in_shell("echo A | \"$0\" convert -f 37 > /dev/full");
+  EXPECT_EQ(full.status, 3);
+  expect_told(full, "standard output: write error at byte 0: No space left");
 
   ASSERT_EQ(::mkfifo(path("fifo").c_str(), 0600), 0);
   const int reader = ::open(path("fifo").c_str(), O_RDWR | O_NONBLOCK | O_CLOEXEC);  // nobody waits for the other side
@@ -83,15 +80,10 @@ TEST_F(ConvertFiles, OutputThatIsNone) {
   }
   // Nor may an input file become the output, being opened in its place or being both.
   const std::string file = write("text", bytes("C1 C2"));
-  ToolInput closed;
-  closed.output_closed = true;
-  EXPECT_EQ(run_tool({"convert", "-f", "37", file}, closed).status, 3);
-  ToolInput appended;
-  appended.output_path = file;
-  appended.output_flags = O_APPEND;
-  const ToolResult result = run_tool({"convert", "-f", "37", file}, appended);
-  EXPECT_EQ(result.status, 3);
-  expect_told(result, "both input and output");
+  EXPECT_EQ(run_in_shell("exec \"$0\" convert -f 37 " + file + " >&-").status, 3);
+  const ToolResult appended = run_in_shell("exec \"$0\" convert -f 37 " + file + " >> " + file);
+  EXPECT_EQ(appended.status, 3);
+  expect_told(appended, "both input and output");
   EXPECT_EQ(read("text"), bytes("C1 C2"));
 }
 

@@ -1,41 +1,35 @@
 // SPDX-License-Identifier: Apache-2.0
 // The audit, and converting back.
-#include <nlohmann/json.hpp>
-
 #include "tests/tool/tool_runner.hpp"
 
 namespace lx::test {
 namespace {
 
-using Json = nlohmann::json;
 using ConvertReport = ToolTest;
 
 TEST_F(ConvertReport, CountsAndPositions) {
-  const std::string one = write("one", "ab\xE2\x82\xAC\xFF\xE2\x82\xAC\xE2");
-  const std::string two = write("two", "c");
-  const ToolResult result = run_tool({"convert", "-t", "37", "-s", "-o", path("out"), "--report", "-", one, two});
-  ASSERT_EQ(result.status, 1) << result.errors;
+  write("one", "ab\xE2\x82\xAC\xFF\xE2\x82\xAC\xE2");
+  write("two", "c");
+  const ToolResult result =
+      run_in_shell("cd " + path("") + "; exec \"$0\" convert -f UTF-8 -t 37 -s -o out --report - one two");
   EXPECT_EQ(result.errors, "");
-  const Json report = Json::parse(result.output);
-  EXPECT_EQ(report["from"], (Json{{"name", "UTF-8"}, {"id", 57352}}));
-  EXPECT_EQ(report["to"], (Json{{"name", "IBM037"}, {"id", 37}}));
-  EXPECT_EQ(report["exit_status"], 1);
-  ASSERT_EQ(report["files"].size(), 2U);
+  expect_json(result.output, R"({
+      "from": {"name": "UTF-8", "id": 57352}, "to": {"name": "IBM037", "id": 37}, "exit_status": 1,
+      "files": [{
+        "name": "one", "bytes_in": 10, "bytes_out": 6, "substituted": 2, "malformed": 1, "cut": 1, "shifts": 0,
+        "substituted_characters": {"U+20AC": 2}, "malformed_sequences": {"FF": 1},
+        "first_problems": [
+          {"offset": 2, "kind": "substituted", "unicode": "U+20AC", "bytes": "E282AC"},
+          {"offset": 5, "kind": "malformed", "unicode": "U+FFFD", "bytes": "FF"},
+          {"offset": 6, "kind": "substituted", "unicode": "U+20AC", "bytes": "E282AC"},
+          {"offset": 9, "kind": "cut", "unicode": "U+FFFD", "bytes": "E2"}]}, {"bytes_out": 1}],
+      "totals": {"bytes_in": 11, "substituted": 2}})");
+}
 
-  const Json wanted = Json::parse(R"({
-      "bytes_in": 10, "bytes_out": 6, "substituted": 2, "malformed": 1, "cut": 1, "shifts": 0,
-      "substituted_characters": {"U+20AC": 2}, "malformed_sequences": {"FF": 1},
-      "first_problems": [
-        {"offset": 2, "kind": "substituted", "unicode": "U+20AC", "bytes": "E282AC"},
-        {"offset": 5, "kind": "malformed", "unicode": "U+FFFD", "bytes": "FF"},
-        {"offset": 6, "kind": "substituted", "unicode": "U+20AC", "bytes": "E282AC"},
-        {"offset": 9, "kind": "cut", "unicode": "U+FFFD", "bytes": "E2"}]})");
-  const Json& file = report["files"][0];
-  EXPECT_EQ(file["name"], one);
-  for (const auto& [key, value] : wanted.items()) EXPECT_EQ(file[key], value) << key;
-  EXPECT_EQ(report["files"][1]["bytes_out"], 1);
-  EXPECT_EQ(report["totals"]["bytes_in"], 11);
-  EXPECT_EQ(report["totals"]["substituted"], 2);
+std::size_t count(const std::string& text, const std::string& part) {
+  std::size_t found = 0;
+  for (std::size_t at = 0; (at = text.find(part, at)) != std::string::npos; ++at) ++found;
+  return found;
 }
 
 TEST_F(ConvertReport, StaysSmall) {
@@ -45,23 +39,18 @@ TEST_F(ConvertReport, StaysSmall) {
     text += static_cast<char>(0x80 | (c >> 6 & 0x3F));
     text += static_cast<char>(0x80 | (c & 0x3F));
   }
-  const ToolResult result = run_tool("convert -t 37 -o /dev/null --report -", text);
-  const Json report = Json::parse(result.output);
-  const Json& file = report["files"][0];
-  EXPECT_EQ(file["name"], "standard input");
-  EXPECT_EQ(file["first_problems"].size(), 20U);
-  EXPECT_EQ(file["substituted"], 3000);
-  EXPECT_EQ(file["substituted_characters"].size(), 1001U);
-  EXPECT_EQ(file["substituted_characters"]["other"], 2000);
+  const std::string report = run_tool("convert -t 37 -o /dev/null --report -", text).output;
+  expect_json(report, R"({"files": [{"name": "standard input", "substituted": 3000,
+      "substituted_characters": {"U+3400": 1, "other": 2000}}]})");
+  EXPECT_EQ(count(report, "\"kind\""), 20U);
+  EXPECT_EQ(count(report, "\"U+"), 20U + 1000);
 }
 
 TEST_F(ConvertReport, WrittenWhenTheRunFails) {
   const std::string odd = write("odd\xFF\nname", "a");
   EXPECT_EQ(run_tool({"convert", "-t", "37", "-o", path("out"), "--report", path("r"), odd, path("no")}).status, 3);
-  const Json report = Json::parse(read("r"));
-  EXPECT_EQ(report["exit_status"], 3);
-  EXPECT_EQ(report["files"].size(), 1U);
-  EXPECT_NE(report["error"].get<std::string>().find("No such file"), std::string::npos);
+  expect_json(read("r"), R"({"exit_status": 3, "files": [{"bytes_in": 1}]})");
+  EXPECT_NE(read("r").find("No such file"), std::string::npos);
   EXPECT_EQ(files(), (std::vector<std::string>{"odd\xFF\nname", "r"}));
   EXPECT_EQ(run_tool({"convert", "-t", "37", "--report", path("no/r"), odd}).status, 3);
 }
@@ -88,9 +77,9 @@ TEST_F(ConvertReport, VerifyFindsTheFirstDifference) {
     const ToolResult result = run_tool(verify + c.pages, bytes(c.input));
     EXPECT_EQ(result.status, c.offset < 0 ? 0 : 1) << c.input;
     expect_told(result, c.message);
-    const Json file = Json::parse(result.output)["files"][0];
-    EXPECT_EQ(file["converts_back"], c.offset < 0) << c.input;
-    EXPECT_EQ(file.value("first_difference", -1), c.offset) << c.input;
+    const std::string difference = R"(false,"first_difference":)" + std::to_string(c.offset);
+    expect_json(result.output, R"({"files":[{"converts_back":)" + (c.offset < 0 ? "true" : difference) + "}]}");
+    EXPECT_EQ(result.output.find("first_difference") == std::string::npos, c.offset < 0) << c.input;
   }
 }
 

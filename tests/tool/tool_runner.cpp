@@ -15,6 +15,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <nlohmann/json.hpp>
 #include <sstream>
 #include <thread>
 
@@ -86,11 +87,9 @@ ToolResult run_tool(const Arguments& arguments, const ToolInput& input) {
   if (input.output_pipe_closed) ::close(std::exchange(out[0], -1));
   const pid_t pid = ::fork();
   if (pid == 0) {
-    const char* path = input.output_path ? input.output_path->c_str() : nullptr;
     ::dup2(in[0], STDIN_FILENO);
+    ::dup2(out[1], STDOUT_FILENO);
     ::dup2(errors[1], STDERR_FILENO);
-    ::dup2(path ? ::open(path, O_WRONLY | O_CREAT | O_CLOEXEC | input.output_flags, 0644) : out[1], STDOUT_FILENO);
-    if (input.output_closed) ::close(STDOUT_FILENO);
     std::signal(SIGPIPE, SIG_DFL);
     execute(arguments, input);
   }
@@ -132,6 +131,11 @@ ToolResult run_tool(const Arguments& arguments, const std::string& text) {
   ToolInput input;
   input.text = text;
   return run_tool(arguments, input);
+}
+
+ToolResult run_in_shell(const std::string& command, ToolInput input) {
+  input.program = "/bin/sh";
+  return run_tool({"-c", command, LEXARO_TOOL}, input);
 }
 
 Arguments::Arguments(const char* words) {
@@ -204,6 +208,30 @@ std::string bytes(const std::string& hexadecimal) {
     text.push_back(static_cast<char>(std::stoi(digits.substr(i, 2), nullptr, 16)));
   }
   return text;
+}
+
+void expect_json(const std::string& document, const std::string& part) {
+  using Json = nlohmann::json;
+  const Json wanted = Json::parse(part), whole = Json::parse(document, nullptr, false);
+  const std::function<bool(const Json&, const Json&)> has = [&](const Json& json, const Json& wants) {
+    if (!wants.is_structured()) return json == wants;
+    bool all = json.type() == wants.type() && (wants.is_object() || wants.size() == json.size());
+    for (const auto& [name, value] : wants.items()) {
+      all = all && (wants.is_array() || json.contains(name)) &&
+            has(wants.is_array() ? json[std::stoul(name)] : json[name], value);
+    }
+    return all;
+  };
+  EXPECT_TRUE(has(whole, wanted)) << "missing: " << wanted << "\nin: " << document;
+}
+
+std::vector<std::pair<std::string, std::string>> json_items(const std::string& document) {
+  const auto json = nlohmann::ordered_json::parse(document, nullptr, false);
+  std::vector<std::pair<std::string, std::string>> items;
+  for (const auto& [name, value] : json.items()) {
+    items.emplace_back(name, value.is_string() ? value.get<std::string>() : value.dump());
+  }
+  return items;
 }
 
 }  // namespace lx::test

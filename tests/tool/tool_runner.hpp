@@ -6,7 +6,6 @@
 
 #include <functional>
 #include <map>
-#include <optional>
 #include <string>
 #include <vector>
 
@@ -35,10 +34,7 @@ struct ToolInput {
   std::function<bool(std::string& piece)> next;  // ... or piece by piece, until it returns false
   bool wait_for_reader = false;                  // hand over the next piece when the last one was taken
   bool keep_output = true;                       // false: only count its bytes
-  std::optional<std::string> output_path;        // standard output goes to this file
-  int output_flags = 0;                          // how it is opened
   bool output_pipe_closed = false;               // nobody reads standard output
-  bool output_closed = false;                    // there is no standard output
   int signal = 0;                                // sent when all input was handed over
   bool unprivileged = false;                     // not as the superuser, whom permissions do not bind
   Environment environment = {};                  // beside PATH
@@ -50,6 +46,8 @@ ToolInput repeated(const std::string& piece, int times);
 
 ToolResult run_tool(const Arguments& arguments, const ToolInput& input = {});
 ToolResult run_tool(const Arguments& arguments, const std::string& text);
+// The shell's command, in which "$0" is the program.
+ToolResult run_in_shell(const std::string& command, ToolInput input = {});
 void expect_told(const ToolResult& result, const std::string& text);
 
 // One call of the program, and what it must do.
@@ -82,5 +80,10 @@ std::vector<std::string> lines_of(const std::string& text);
 
 // "C1 0E4481" as bytes; blanks are ignored.
 std::string bytes(const std::string& hexadecimal);
+
+// The JSON document has all that the part says: its objects may have more fields, all else is equal.
+void expect_json(const std::string& document, const std::string& part);
+// What a JSON object or array has, by names or numbers, in its order: texts as they are, all else as JSON.
+std::vector<std::pair<std::string, std::string>> json_items(const std::string& document);
 
 }  // namespace lx::test

@@ -17,4 +17,9 @@ inline std::string key_of(LXLocale* locale, const std::string& text) {
 
 inline int sign(int value) { return (value > 0) - (value < 0); }
 
+// Of two texts, compared directly.
+inline int order_of(LXLocale* locale, const std::string& a, const std::string& b) {
+  return sign(LXStrcoll(locale, a.data(), static_cast<int32_t>(a.size()), b.data(), static_cast<int32_t>(b.size()), 0));
+}
+
 }  // namespace lx::test
