@@ -71,14 +71,4 @@ auto with_walkers(const CodePage& page, const Text<Unit>& a, const Text<Unit>& b
   return Kind::with_walker(page, a, WithSecondWalker<Kind, Unit, Use>{page, b, use});
 }
 
-// The state that a walker has come to; 0 where there are none.
-template <class Walker>
-uint32_t state_of(const Walker& walker) {
-  if constexpr (requires { walker.double_byte; }) {
-    return walker.double_byte ? 1 : 0;
-  } else {
-    return 0;
-  }
-}
-
 }  // namespace lx

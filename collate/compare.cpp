@@ -156,11 +156,20 @@ int32_t compare_mapped(LocaleCall& call, const Text<Unit>& a, const Text<Unit>& 
 
 // ---- The calls ----
 
+// A shift byte that a text begins with is its state.
+void take_state(const CodePage& page, Text<char>& text) {
+  ShiftedWalker walker(page, bytes_of(text.at), text.length, text.state);
+  if (walker.skip_shift()) text = {text.at + 1, text.length - 1, shift_state(walker)};
+}
+
 template <class Kind, class Unit = typename Kind::Unit>
 Text<Unit> text_to_compare(const CodePage& page, const Unit* at, uint32_t state, int32_t length, uint32_t options) {
   Text<Unit> text = given_text<Kind>(page, at, state, length, options, Terminator::excluded);
   if (length > 0) text.length = Kind::with_walker(page, text, [](auto walker) { return whole_length(walker); });
   if ((options & LX_CMP_TRIM) != 0) trim<Kind>(trace_unit, page, text, (options & LX_CMP_NOWIDTH) == LX_CMP_NOWIDTH);
+  if constexpr (Kind::kShifted) {
+    if (page.shift_sensitive) take_state(page, text);
+  }
   return text;
 }
 

@@ -19,7 +19,7 @@ struct Found {
 
 template <class Walker>
 Found found_before(const Walker& begin, const Walker& behind, const Character& character) {
-  return {true, passed(begin, behind) - character.units, state_of(behind)};
+  return {true, passed(begin, behind) - character.units, shift_state(behind)};
 }
 
 // ---- Characters ----

@@ -53,13 +53,13 @@ Token next_token(Walker text, const Set& delimiters) {
   Character delimiter;
   if (!behind.next(delimiter)) return token;
   // The token keeps the shift byte that ends its double-byte run; others go with the delimiter.
-  if (state_of(text) != 0 && state_of(behind) == 0) {
+  if (shift_state(text) != 0 && shift_state(behind) == 0) {
     if constexpr (requires { text.skip_shift(); }) text.skip_shift();
   }
   behind.finish();
   token.token_end = passed(start, text);
   token.rest = passed(start, behind);
-  token.rest_state = state_of(behind);
+  token.rest_state = shift_state(behind);
   return token;
 }
 

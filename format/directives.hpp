@@ -120,13 +120,4 @@ Walker walker_over(Walker walker, const Text<Unit>& text) {
   return walker;
 }
 
-template <class Walker>
-uint32_t shift_state(const Walker& walker) {
-  if constexpr (requires { walker.double_byte; }) {
-    return walker.double_byte ? 1 : 0;
-  } else {
-    return 0;
-  }
-}
-
 }  // namespace lx

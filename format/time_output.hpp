@@ -33,7 +33,8 @@ class TimeOutput {
 
   size_t at() const { return at_; }
   size_t left() const { return at_ < room_ ? room_ - at_ : 0; }
-  bool full() const { return left() == 0; }
+  // An open double-byte run needs the last byte for its end.
+  bool full() const { return left() <= state(); }
   uint32_t state() const { return double_byte_ ? 1 : 0; }
 
   bool put(const Unit* character, size_t units) {
@@ -92,7 +93,7 @@ class TimeOutput {
   }
   // Returns to the single-byte state, for which there is room behind every double-byte character.
   void close() {
-    if (double_byte_ && !full()) turn();
+    if (double_byte_ && left() != 0) turn();
   }
 
   // What formats of the locale are written to: the room that is left, laid over the start of the output or behind what

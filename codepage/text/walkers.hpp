@@ -101,4 +101,14 @@ struct ShiftedWalker {
   }
 };
 
+// The state that a walker has come to; 0 where there are none.
+template <class Walker>
+uint32_t shift_state(const Walker& walker) {
+  if constexpr (requires { walker.double_byte; }) {
+    return walker.double_byte ? 1 : 0;
+  } else {
+    return 0;
+  }
+}
+
 }  // namespace lx

@@ -716,7 +716,8 @@ LX_API LXUChar LXUnicodeToF2H(LXLocale* locale, LXUChar ch) LX_NOEXCEPT;
 /*
  * Maps a whole text: LX_MAP_, or 0 (copy), with LX_OPT_CHARS. Case mapping follows the special pairs of the language,
  * unless LX_MAP_PLAIN is set. A measured length includes the terminator. Returns the units (characters) written; what
- * does not fit is left out, without a status. With LX_OPT_CHARS no more than 512 bytes of output are made.
+ * does not fit is left out, without a status. With LX_OPT_CHARS no more than 512 bytes of output are made, and the Ex
+ * form, where it copies, reads the shift byte behind characters that end inside a double-byte run.
  */
 LX_API int32_t LXMapString(LXLocale* locale, char* out, int32_t out_size, const char* in, int32_t in_len,
                            uint32_t flags) LX_NOEXCEPT;

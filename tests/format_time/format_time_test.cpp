@@ -322,6 +322,13 @@ TEST(FormatTime, WordsOfMixedPagesAreCompleteAndCutAsTheirTextIs) {
                               &format_at, 0, 0, 0, 0),
             LX_OK);
   EXPECT_EQ(std::tuple(at, state, format_at), std::tuple(12, 0u, 2));
+  // A room that a word fills is full, though the byte that ends its run is not written yet.
+  LXTime time = kSaturday;
+  time.tm_sec = 60;
+  for (const char16_t* format : {u"%A%x", u"%A%c", u"%A%q", u"%A%#", u"%A%S", u"%A%A"}) {
+    Result result = place.write({Form::shifted, place.page}, time, format, length, 0);
+    EXPECT_EQ(std::pair(result.count, result.error), std::pair(length, LX_E_BUFFER));
+  }
 }
 
 TEST(FormatTime, PiecesMoveTheirPositions) {
