@@ -106,8 +106,8 @@ class Texts : public Target {
       }
       case 1: {
         Text<U> target(other_bytes, true);
-        std::vector<U> joined(target.at(), target.at() + target.units + 1);
-        joined.resize(target.units + text.units + 1);
+        std::vector<U> joined(target.units + text.units + 1);
+        std::copy_n(target.at(), target.units + 1, joined.begin());
         int32_t result = Calls()(test::kStrcat, l_, joined.data(), s, state, text.length, options_);
         demand(result <= static_cast<int64_t>(joined.size()), "result of cat");
         return;
