@@ -5,7 +5,7 @@ find_package(CLI11 CONFIG REQUIRED)
 # compile_quickly(FILE...): sources that take in the parser of command lines, which is all headers, and run once.
 function(compile_quickly)
   set_source_files_properties(${ARGN} PROPERTIES COMPILE_OPTIONS
-    "$<$<NOT:$<CONFIG:Debug>>:-O1>;$<$<CONFIG:RelWithDebInfo>:-g1>")
+    "$<$<CONFIG:Release>:-O1>;$<$<CONFIG:RelWithDebInfo>:-O0;-g1>")
 endfunction()
 
 add_library(tools_shared OBJECT
