@@ -83,8 +83,10 @@ class TextFunctions : public testing::Test {
 };
 
 TEST_F(TextFunctions, CopiesAndLineEndsOfAllShortTexts) {
-  for (const auto& [form, letters] : text_forms()) {
-    for_all_strings(letters, 4, [&, &form = form](const Units& text) {
+  for (const Lettered& lettered : text_forms()) {
+    const Form& form = lettered.form;
+    const Units& letters = lettered.letters;
+    for_all_strings(letters, 4, [&](const Units& text) {
       const auto all = static_cast<int32_t>(text.size());
       TextCall call = {Function::cpy, form, text};
       for (call.length = all < 4 ? -1 : all; call.length <= all; ++call.length) {

@@ -52,13 +52,15 @@ class Navigation : public testing::Test {
  protected:
   // For all short texts, which stand terminated at the edge of memory; use(form, text, s).
   void for_all_texts(const std::function<void(const Form&, const Units&, char*)>& use) {
-    for (const auto& [form, letters] : text_forms()) {
+    for (const Lettered& lettered : text_forms()) {
+      const Form& form = lettered.form;
+      const Units& letters = lettered.letters;
       if (!form.is_bytes()) continue;
       locale_ = runner_.locale(*form.page);
       Units units = letters;
       std::erase(units, 0u);
       units.push_back(form.page->ascii_family ? 0x20 : 0x40);
-      for_all_strings(units, 4, [&, &form = form](const Units& text) {
+      for_all_strings(units, 4, [&](const Units& text) {
         if (HasFailure()) return;  // one fault makes many
         SCOPED_TRACE(form.name() + ": " + hex_units(text));
         use(form, text, place<char>(edge_, text, -1));
