@@ -2,7 +2,9 @@
 // Integers as the data files store them: most significant byte first, at any address.
 #pragma once
 
+#include <bit>
 #include <cstdint>
+#include <type_traits>
 
 namespace lx {
 
@@ -13,8 +15,8 @@ class Be {
   constexpr Be(T value) { store(value); }  // NOLINT: a field is assigned like a number
 
   constexpr operator T() const {  // NOLINT: and read like one
-    uint64_t value = 0;
-    for (uint8_t byte : bytes_) value = value << 8 | byte;
+    auto value = std::bit_cast<std::make_unsigned_t<T>>(bytes_);
+    if constexpr (std::endian::native == std::endian::little) value = swapped(value);
     return static_cast<T>(value);
   }
   constexpr Be& operator=(T value) {
@@ -23,6 +25,8 @@ class Be {
   }
 
  private:
+  static constexpr uint16_t swapped(uint16_t value) { return __builtin_bswap16(value); }
+  static constexpr uint32_t swapped(uint32_t value) { return __builtin_bswap32(value); }
   constexpr void store(T value) {
     auto rest = static_cast<uint64_t>(value);
     for (unsigned i = sizeof(T); i-- > 0; rest >>= 8) bytes_[i] = static_cast<uint8_t>(rest);
