@@ -12,17 +12,22 @@ namespace lx {
 // Whether a measured length takes the terminator in.
 enum class Terminator : bool { excluded, included };
 
+// Whether a text is read, or its units are copied.
+enum class Purpose : bool { reading, copying };
+
 // A text as a call gives it: a negative length is measured, with LX_OPT_CHARS a positive one counts characters.
 template <class Kind, class Unit = typename Kind::Unit>
 Text<Unit> given_text(const CodePage& page, const Unit* at, uint32_t state, int32_t length, uint32_t options,
-                      Terminator terminator) {
+                      Terminator terminator, Purpose purpose = Purpose::reading) {
   Text<Unit> text = {at, 0, state};
   if (at == nullptr || length == 0) return text;
   if (length < 0) {
     text.length = measured_length(at) + (terminator == Terminator::included ? 1 : 0);
   } else {
     text.length = static_cast<size_t>(length);
-    if ((options & LX_OPT_CHARS) != 0) text.length = length_of_counted<Kind>(page, text, text.length);
+    if ((options & LX_OPT_CHARS) == 0) return text;
+    text.length = purpose == Purpose::copying ? length_to_copy<Kind>(page, text, text.length)
+                                              : Kind::length_of_characters(page, text, text.length);
   }
   return text;
 }

@@ -24,7 +24,7 @@ int32_t join_call(const char* function, LXLocale* locale, Unit* dst, const Unit*
     if (dst == nullptr) return call.fail(LX_E_ARGUMENT, -1);
     const CodePage& page = page_of(call.locale);
     Text<Unit> before = {dst, measured_length(dst), 0};
-    Text<Unit> text = given_text<Kind>(page, src, state, src_len, options, Terminator::excluded);
+    Text<Unit> text = given_text<Kind>(page, src, state, src_len, options, Terminator::excluded, Purpose::copying);
     bool terminate = src_len < 0 || (options & LX_OPT_TERMINATE) != 0;
     int32_t length = counted<Kind>(page, before, options);
     if (src_len == 0 || src == nullptr) return length + 1;

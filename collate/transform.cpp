@@ -204,7 +204,9 @@ int32_t transform_call(const char* function, LXLocale* locale, void* key, int32_
   return locale_call(trace_unit, function, locale, options, kAny, int32_t{-1}, [&](LocaleCall& call) -> int32_t {
     uint32_t transform = options & ~LX_OPT_CHARS;
     if (!is_transform(transform)) return call.fail(LX_E_ARGUMENT, -1);
-    Text<Unit> text = given_text<Kind>(page_of(call.locale), str, state, length, options, Terminator::excluded);
+    const Purpose purpose = sort_of(call.locale) == nullptr && transform == 0 ? Purpose::copying : Purpose::reading;
+    Text<Unit> text =
+        given_text<Kind>(page_of(call.locale), str, state, length, options, Terminator::excluded, purpose);
     size_t size = key != nullptr && key_size > 0 ? static_cast<size_t>(key_size) : 0;
     return transform_text<Kind>(call, static_cast<uint8_t*>(key), size, text, transform);
   });

@@ -66,13 +66,15 @@ class Texts : public Target {
   }
 
  private:
-  // The length of a text as a call is told it: measured, all, a part, or a count of characters. Of counted characters
-  // that end inside a double-byte run the byte behind is read: it may close the run.
+  bool copies() const { return function_ < 2 || function_ > 9; }
+
+  // The length of a text as a call is told it: measured, all, a part, or a count of characters. Copies of counted
+  // characters that end inside a double-byte run read the byte behind, which may close the run.
   template <class Calls, class U = typename Calls::Unit>
   Text<U> given(std::string_view bytes, uint8_t choice) {
     const bool measured = choice % 4 == 0;
     const bool ex = std::is_same_v<Calls, test::Calls<Form::shifted>>;
-    Text<U> text(bytes, measured || (ex && (options_ & LX_OPT_CHARS) != 0));
+    Text<U> text(bytes, measured || (ex && copies() && (options_ & LX_OPT_CHARS) != 0));
     text.shift_state = choice >> 7;
     auto units = static_cast<int32_t>(text.units);
     if ((options_ & LX_OPT_CHARS) != 0 && sizeof(U) == 1) {

@@ -21,7 +21,7 @@ int32_t copy_text(const CodePage& page, typename Kind::Unit* out, int32_t out_si
   if (!characters) {
     text.length = std::min(text.length, room);
   } else if (in_length > 0) {
-    text.length = length_of_counted<Kind>(page, text, std::min(text.length, room));
+    text.length = length_to_copy<Kind>(page, text, std::min(text.length, room));
   }
   return Kind::with_walker(page, text, [&](auto walker) {
     auto begin = walker;

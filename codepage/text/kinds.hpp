@@ -55,8 +55,8 @@ struct ShiftedKind {
   static size_t length_of_characters(const CodePage& page, const Text<char>& text, size_t characters) {
     return bytes_of_characters(page, bytes_of(text.at), text.state, characters);
   }
-  // With the shift byte that closes the double-byte run in which they end, for it belongs to the last of them. Only
-  // such a run is looked at behind its characters: a caller that counts them has it closed there.
+  // With the shift byte that closes the double-byte run in which they end: it belongs to the last of them, and a copy
+  // without it would be broken. Only behind such a run is a byte read that the caller has not counted.
   static size_t length_with_run_closed(const CodePage& page, const Text<char>& text, size_t characters) {
     const size_t length = length_of_characters(page, text, characters);
     if (!page.shift_sensitive) return length;
@@ -88,7 +88,7 @@ using Ucs2Kind = UnitKind<LXUChar>;
 
 // Units of a text that is given as so many characters, where the units themselves count and not only what they mean.
 template <class Kind>
-size_t length_of_counted(const CodePage& page, const Text<typename Kind::Unit>& text, size_t characters) {
+size_t length_to_copy(const CodePage& page, const Text<typename Kind::Unit>& text, size_t characters) {
   if constexpr (Kind::kShifted) {
     return Kind::length_with_run_closed(page, text, characters);
   } else {

@@ -732,8 +732,8 @@ LX_API int32_t LXMapStringU(LXLocale* locale, LXUChar* out, int32_t out_size, co
 /*
  * No function here cuts a character. Lengths count units, with LX_OPT_CHARS characters; negative ones are measured,
  * with the terminator where the text is copied or searched, without it where it is spanned, joined or cut into tokens.
- * In the Ex forms, here and for collation, a text whose characters are counted must not end inside a double-byte run:
- * the shift byte that closes the run is read, and belongs to the last character.
+ * LXStrcpyEx, LXStrcatEx and, without a sort, LXStrxfrmEx read the byte behind counted characters that end inside a
+ * double-byte run: the shift byte that closes the run belongs to the last of them.
  */
 
 /*

@@ -286,7 +286,7 @@ Outcome map_model(const TextCall& call) {
     copying.options = counted ? LX_OPT_CHARS : 0;
     outcome = model(copying);
   } else {
-    const Units text = told(call.form, call.text, call.length, counted, false, false);
+    const Units text = told(call.form, call.text, call.length, counted);
     outcome = Mapper{call}.write(characters_of(call.form, text));
   }
   if (!counted) outcome.memory.resize(static_cast<size_t>(std::max(call.size, 0)), kUnwritten);

@@ -48,7 +48,7 @@ struct Model {
   void cpy() {
     size_t size = call.size > 0 ? static_cast<size_t>(call.size) : 0;
     int32_t length = by_characters && call.length > 0 ? std::min(call.length, std::max(call.size, 0)) : call.length;
-    Units source = told(form, call.text, length, by_characters, true);
+    Units source = told(form, call.text, length, by_characters, true, true);
     Characters found = characters_of(form, by_characters ? source : first_units(source, size));
     if (size == 0 || found.list.empty()) {
       found = {};
@@ -61,7 +61,7 @@ struct Model {
   }
 
   void cat() {
-    Units appended = other_units();
+    Units appended = told(call.other_form(), call.other, call.other_length, by_characters, false, true);
     if (call.other_length > 0) appended = first_units(appended, characters_of(call.other_form(), appended).whole);
     bool terminate = call.other_length < 0 || (call.options & LX_OPT_TERMINATE) != 0;
     if (call.other_length == 0) terminate = false;

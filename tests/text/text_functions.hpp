@@ -62,9 +62,10 @@ Outcome model(const TextCall& call);
 Outcome map_model(const TextCall& call);
 Outcome compare_model(const TextCall& call);
 
-// The part of a text that a length tells. Counted characters come with the shift byte that closes their run, or alone.
+// The part of a text that a length tells. Counted characters that are copied come with the shift byte that closes their
+// run.
 Units told(const Form& form, Units text, int32_t length, bool by_characters, bool with_terminator = false,
-           bool run_closed = true);
+           bool run_closed = false);
 
 // ---- Unicode: what the library says of single characters, which has tests of its own ----
 

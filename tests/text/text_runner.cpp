@@ -177,7 +177,7 @@ void for_all_strings(const Units& letters, size_t longest, const std::function<v
   }
 }
 
-bool ends_inside(const Form& form, const Units& text) {
+bool ends_inside_run(const Form& form, const Units& text) {
   const Characters all = characters_of(form, text);
   if (!form.follows_shifts() || all.list.empty() || all.cut || all.list.back().state == 0) return false;
   return std::find(text.begin() + static_cast<ptrdiff_t>(all.list.back().own_end()), text.end(), form.page->leave) ==
@@ -185,7 +185,7 @@ bool ends_inside(const Form& form, const Units& text) {
 }
 
 int32_t Choice::length(const Form& form, const Units& text, bool by_characters) {
-  if (below(3) == 0 || (by_characters && ends_inside(form, text))) return -1 - static_cast<int32_t>(below(2));
+  if (below(3) == 0) return -1 - static_cast<int32_t>(below(2));
   const size_t all = by_characters ? characters_of(form, text).list.size() : text.size();
   return static_cast<int32_t>(often() ? all : below(all + 1));
 }

@@ -60,8 +60,8 @@ inline constexpr std::u16string_view kMappingCharacters =
 
 void for_all_strings(const Units& letters, size_t longest, const std::function<void(const Units&)>& use);
 
-// Characters of a text that ends inside a double-byte run cannot be counted: behind the last one is nothing to look at.
-bool ends_inside(const Form& form, const Units& text);
+// The characters of such a text cannot be counted for a copy: behind the last one is nothing to look at.
+bool ends_inside_run(const Form& form, const Units& text);
 
 // The same choices for everybody, so that a failure can be repeated.
 class Choice {
