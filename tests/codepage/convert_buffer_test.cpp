@@ -181,53 +181,6 @@ TEST_F(ConvertBuffer, LongRunsBetweenOddCharacters) {
   });
 }
 
-// ---- Statuses ----
-
-// One call each, in order; every one of them says what is to be seen from outside.
-struct Call {
-  std::string in;
-  size_t room;
-  uint32_t status;
-  std::string out;
-  size_t unused = 0;  // bytes of the input that are left
-};
-
-void expect_calls(const char* name, LXLocale* target, LXLocale* source, const std::vector<Call>& calls) {
-  SCOPED_TRACE(name);
-  Conversion handle(LXOpenConversion(target, source, 0));
-  for (const Call& call : calls) {
-    Guarded text{std::string_view(call.in)}, room(call.room);
-    const char* in = text.data();
-    char* out = room.data();
-    auto in_left = static_cast<int32_t>(call.in.size()), out_room = static_cast<int32_t>(call.room);
-    EXPECT_EQ(LXConvertBuffer(handle.get(), &out, &out_room, &in, &in_left, 0), call.status) << hex(call.in);
-    EXPECT_EQ(hex({room.data(), static_cast<size_t>(out - room.data())}), hex(call.out));
-    EXPECT_EQ(static_cast<size_t>(in_left), call.unused);
-    EXPECT_EQ(static_cast<size_t>(out_room), call.room - call.out.size());
-  }
-}
-
-TEST_F(ConvertBuffer, Statuses) {
-  LXLocale* utf8 = locale(57352);
-  LXLocale* japanese = locale(932);
-  LXLocale* mixed = locale(930);
-  LXLocale* latin = locale(819);
-  expect_calls("nothing given, all consumed, room just enough", latin, latin, {{"", 0, 0, ""}, {"abc", 3, 0, "abc"}});
-  expect_calls("no room: one character is taken in", latin, latin,
-               {{"abc", 0, 52, "", 2}, {"bc", 0, 52, "", 2}, {"bc", 9, 0, "abc"}});
-  expect_calls("a third of a character is held", japanese, utf8,
-               {{"\xE3", 9, 53, ""}, {"", 9, 53, ""}, {"\x82", 9, 53, ""}, {"\xA2", 9, 0, "\x83\x41"}});
-  expect_calls(
-      "the rest is delivered before new text is looked at", utf8, japanese,
-      {{"\x83\x41", 2, 52, "\xE3\x82"}, {"xyz", 0, 52, "", 3}, {"xyz", 1, 52, "\xA2", 2}, {"yz", 9, 0, "xyz"}});
-  expect_calls("a shift byte goes out without its character, and the run stays open", mixed, utf8,
-               {{"\xE3\x80\x80", 1, 52, "\x0E"}, {"", 2, 0, "\x40\x40"}, {"a", 9, 0, "\x0F\x62"}});
-  expect_calls("shift bytes alone are consumed", utf8, mixed,
-               {{"\x0E", 0, 0, ""}, {"\x40\x40\x0F", 9, 0, "\xE3\x80\x80"}});
-  expect_calls("a second shift byte is text, also in the next call", utf8, mixed,
-               {{"\x0E\x0E\x41\x0F", 9, 0, "\xEF\xBF\xBD"}, {"\x0F\x0E", 9, 0, "\x0F"}});
-}
-
 TEST_F(ConvertBuffer, Arguments) {
   LXLocale* latin = locale(819);
   Conversion handle(LXOpenConversion(latin, latin, 0));

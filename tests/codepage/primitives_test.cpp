@@ -1,11 +1,6 @@
 // SPDX-License-Identifier: Apache-2.0
 // The primitives where they do what one would not expect: in UTF-8, on a page with changed bytes, and on pages of the
 // older layout.
-#include <cstdlib>
-#include <cstring>
-#include <fstream>
-#include <iterator>
-
 #include "support/object_builder.hpp"
 #include "support/page_source.hpp"
 #include "support/session.hpp"
@@ -13,27 +8,15 @@
 namespace lx::test {
 namespace {
 
-class Primitives : public testing::Test {
- protected:
-  const LXObjEntry* page(const char* name) {
-    locales_.push_back(locale_of(name));
-    return LXGetLocaleObject(locales_.back().get(), LX_CODEPAGE);
-  }
-
- private:
-  Session session_;
-  std::vector<Locale> locales_;
-};
-
-TEST_F(Primitives, Utf8IsDecodedByRuleAlone) {
-  const LXObjEntry* utf8 = page("UTF-8");
+TEST(Primitives, Utf8IsDecodedByRuleAlone) {
+  const Session session;
+  const Locale locale = locale_of("UTF-8");
+  const LXObjEntry* utf8 = LXGetLocaleObject(locale.get(), LX_CODEPAGE);
   const std::pair<std::string_view, int32_t> cases[] = {
       {"\x41\x42", 0x42},                    // no one-byte case
       {std::string_view("\x00\x00", 2), 0},  // whatever the lead byte
       {"\xC0\xAF", 0x2F},                    // overlong
-      {"\xDF\x41", 0x7C1},                   // continuation bytes are not looked at
-      {"\xED\xA0\x80", 0xD800},
-      {"\xF1\x80\x80", 0x1000},  // from E0 on three bytes
+      {"\xF1\x80\x80", 0x1000},              // from E0 on three bytes
       {"\xFF\xBF\xBF", 0xFFFF},
   };
   for (const auto& [text, unicode] : cases) {
@@ -43,115 +26,76 @@ TEST_F(Primitives, Utf8IsDecodedByRuleAlone) {
   EXPECT_EQ(LXCpMbToUnicodeW(utf8, 0x41), 0x40);  // 41 and the zero behind it
 }
 
-// A manager of that directory, beside that of the library.
-class Manager {
- public:
-  explicit Manager(const DataDirectory& directory) : manager_(LXInitObjManager(directory.path(), 0, nullptr)) {}
-  ~Manager() { LXTermObjManager(manager_); }
-  Manager(const Manager&) = delete;
-  Manager& operator=(const Manager&) = delete;
-
-  const LXObjEntry* page(uint16_t id) {
-    uint32_t rc = LX_OK;
-    const LXObjEntry* entry = LXGetObjFromID(manager_, LX_CODEPAGE, id, 0, &rc);
-    EXPECT_EQ(rc, LX_OK) << id;
-    return entry;
-  }
-
- private:
-  LXObjMgr* manager_;
-};
-
-std::string file_text(const std::string& path) {
-  std::ifstream in(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(in), {}};
-}
-
-constexpr size_t kPairCount = 6;
-constexpr size_t kPages = 2316;
-constexpr size_t kFullWidthOffset = 4366;
-constexpr size_t kPairsOffset = 4368;
-
-// JapanEUC with an unknown kind of page for U+30xx, a single pair of widths, and bytes that have its full-width form.
-TEST_F(Primitives, ChangedTables) {
-  std::string file = file_text(LEXARO_DATA "/cp_00954.nls");
-  auto get = [&](size_t at, size_t size) { return packed(std::string_view(file).substr(at, size)); };
-  size_t section = get(12, 4);
-  size_t pairs = section + get(section + kPairsOffset, 2);
-  LXWChar first = get(pairs, 4);
-  LXWChar full = get(pairs + 4, 4);
-  LXWChar second = get(pairs + 8, 4);
-  ASSERT_GT(get(section + kPairCount, 2), 1u);
-  EXPECT_EQ(LXCpFullToHalfW(page("JapanEUC"), full), first);
-  file[section + kPages + 8 * 0x30] = 5;
-  file.replace(section + kPairCount, 2, std::string("\0\1", 2));
-  for (char half : {'Q', 'R'}) {
-    file.replace(section + get(section + kFullWidthOffset, 2) + 4u * static_cast<uint8_t>(half), 4,
-                 std::string(2, '\0') + unpacked(full));
-  }
-  DataDirectory directory;
-  directory.write("cp_00954.nls", std::string_view(file));
-  directory.write("control.nls", std::string_view(file_text(LEXARO_DATA "/control.nls")));
-  Manager manager(directory);
-  const LXObjEntry* record = manager.page(954);
-
-  Guarded out(1);
-  EXPECT_EQ(LXCpUnicodeToChar(record, 0x3042, out.data()), 1);
-  EXPECT_EQ(out.data()[0], 0);
-  EXPECT_EQ(LXCpUnicodeToCharW(record, 0x3042), 0u);
-  EXPECT_EQ(LXCpUnicodeToCharW(record, 0x4E9C), 0xB0A1u);  // other pages are as before
-  EXPECT_EQ(LXCpMbHalfToFullW(record, first), full);       // one pair is compared too
-  EXPECT_EQ(LXCpMbHalfToFullW(record, second), 0u);
-  EXPECT_EQ(LXCpMbHalfToFullW(record, first - 1), 0u);
-  EXPECT_EQ(LXCpFullToHalfW(record, full), LXWChar{'Q'});  // the first single byte wins
-}
-
 // The minus sign and the wave dash are full-width forms on pages that read them so; what only looks alike is none.
-TEST_F(Primitives, FullWidthFormsOfTwoReadings) {
+TEST(Primitives, FullWidthFormsOfTwoReadings) {
+  const Session session;
   const struct {
     const char* name;
     LXWChar full, half;
   } cases[] = {{"IBM930", 0x4260, 0x60}, {"IBM930", 0x43A1, 0xA0}, {"IBM939", 0x4260, 0x60}, {"IBM939", 0x43A1, 0xA1},
                {"MS932", 0x817C, '-'},   {"IBM933", 0x43A1, 0},    {"MS950", 0xA1A8, 0}};
-  for (const auto& c : cases) EXPECT_EQ(LXCpFullToHalfW(page(c.name), c.full), c.half) << c.name << std::hex << c.full;
+  for (const auto& c : cases) {
+    const Locale locale = locale_of(c.name);
+    const LXObjEntry* page = LXGetLocaleObject(locale.get(), LX_CODEPAGE);
+    EXPECT_EQ(LXCpFullToHalfW(page, c.full), c.half) << c.name << std::hex << c.full;
+  }
 }
 
-class OlderLayout : public Primitives {
+class BuiltPages : public testing::Test {
  protected:
-  void SetUp() override {
-    std::string command = LEXAROC_PATH " data --layout=1 --only 970 '" LEXARO_SOURCE_DATA "' '";
-    ASSERT_EQ(std::system((command + directory.path() + "'").c_str()), 0);
+  BuiltPages() { write_small_directory(directory_); }
+
+  const LXObjEntry* page(uint16_t id) {
+    if (!session_) session_ = std::make_unique<Session>(directory_.path());
+    const LXObjEntry* entry = LXGetObjFromID(LXGetObjManager(), LX_CODEPAGE, id, 0, nullptr);
+    EXPECT_NE(entry, nullptr) << id;
+    return entry;
   }
 
-  DataDirectory directory;
+  DataDirectory directory_;
+
+ private:
+  std::unique_ptr<Session> session_;
 };
 
-// It has no bounds: every second byte reaches a value, by its low bits.
-TEST_F(OlderLayout, HasNoBounds) {
-  Manager manager(directory);
-  const LXObjEntry* older = manager.page(970);
-  const LXObjEntry* current = page("EUC-KR");
-  EXPECT_EQ(LXCpMbToUnicode(current, "\xB0\xA1"), 0xAC00);
-  EXPECT_EQ(LXCpMbToUnicode(older, "\xB0\xA1"), 0xAC00);
-  EXPECT_EQ(LXCpMbToUnicode(current, "\xB0\x21"), 0xFFFD);
-  EXPECT_EQ(LXCpMbToUnicode(older, "\xB0\x21"), 0xAC00);
-  for (uint32_t pair = 0; pair < 65536; ++pair) {  // none leaves the tables
-    char bytes[4] = {static_cast<char>(pair >> 8), static_cast<char>(pair)};
-    LXCpMbToUnicode(older, bytes);
-    LXGetMbCtype(older, bytes);
+// An unknown kind of page for U+30xx, a single pair of widths, and two bytes with one full-width form.
+TEST_F(BuiltPages, ChangedTables) {
+  constexpr size_t kSection = 76, kPages = kSection + 2316, kFullWidth = kSection + 4376;
+  Bytes file = multibyte_page_file();
+  file[kSection + 7] = 1;
+  file[kPages + 8 * 0x30] = 5;
+  file[kFullWidth + 4 * 'B' + 2] = 0x81;
+  file[kFullWidth + 4 * 'B' + 3] = 0x41;
+  directory_.write_object(LX_CODEPAGE, 900, file);
+  const LXObjEntry* changed = page(900);
+  Guarded out(1);
+  EXPECT_EQ(LXCpUnicodeToChar(changed, 0x3042, out.data()), 1);
+  EXPECT_EQ(out.data()[0], 0);
+  EXPECT_EQ(LXCpUnicodeToCharW(changed, 0x3042), 0u);
+  EXPECT_EQ(LXCpUnicodeToCharW(changed, 0x4E01), 0x8EA0A1u);  // other pages are as before
+  EXPECT_EQ(LXCpMbHalfToFullW(changed, 0x8142), 0x8EA0A0u);   // one pair is compared too
+  EXPECT_EQ(LXCpMbHalfToFullW(changed, 0x8143), 0u);
+  EXPECT_EQ(LXCpFullToHalfW(changed, 0x8141), LXWChar{'A'});  // the first single byte wins
+}
+
+// Every second byte reaches a value, by its low bits.
+TEST_F(BuiltPages, OlderLayoutHasNoBounds) {
+  for (uint16_t id : {uint16_t{900}, uint16_t{902}}) {
+    EXPECT_EQ(LXCpMbToUnicode(page(id), "\x81\x42"), 0x3042);
+    EXPECT_EQ(LXCpMbToUnicode(page(id), "\x81\x62"), id == 900 ? 0xFFFD : 0x3042);
   }
 }
 
 // Sections of one's own, at the edge of memory: without a section 2 none is made.
-TEST_F(OlderLayout, WithoutASecondSection) {
-  const std::string file = file_text(directory.file("cp_00970.nls"));
-  const std::string_view bytes(file);
-  Guarded section1(bytes.substr(packed(bytes.substr(12, 4)), packed(bytes.substr(10, 2))));
+TEST_F(BuiltPages, OlderLayoutWithoutASecondSection) {
+  const Bytes file = single_byte_page_file(true);
+  const auto size = static_cast<uint16_t>(file[10] << 8 | file[11]);
+  Guarded section1(std::string_view(reinterpret_cast<const char*>(file.data()) + 76, size));
   uint8_t* section2 = section1.as<uint8_t>();
-  uint8_t* made = LXCpV1toV2(section1.as<uint8_t>(), static_cast<uint16_t>(section1.size()), nullptr, 0, &section2);
+  uint8_t* made = LXCpV1toV2(section1.as<uint8_t>(), size, nullptr, 0, &section2);
   ASSERT_NE(made, nullptr);
   EXPECT_EQ(section2, nullptr);
-  EXPECT_EQ(hex({reinterpret_cast<char*>(made) + 4374, 2}), "0000") << "no table to Unicode";
+  EXPECT_EQ(made[4374] << 8 | made[4375], 0) << "no table to Unicode";
   LXUnloadFile(made);
 }
 

@@ -18,8 +18,7 @@ class TextRunner {
   LXLocale* locale(const PageSource& page, const TestLanguage& language = test_languages()[kEnglish]);
 
   // Compares the call with its model. Gives up after some differences: one fault makes many.
-  void check(const TextCall& call) { check(call, model(call)); }
-  void check(const TextCall& call, const Outcome& expected, const char* name = "");
+  void check(const TextCall& call);
 
   // `room`: units that cpy, cat and map have. Texts are mapped in place when `in_place`.
   Outcome run(const TextCall& call, size_t room, bool in_place = false);
