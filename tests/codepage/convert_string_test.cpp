@@ -139,7 +139,7 @@ class Check {
     bool counted = characters && function_.from.is_bytes();
     // Lengths in characters reach the last character, no further: nothing stands behind it.
     auto longest = static_cast<int32_t>(text.size());
-    if (counted) longest = byte_to_char_model(*function_.from.page, bytes_of_units(text), function_.from.state);
+    if (counted) longest = static_cast<int32_t>(characters_of(function_.from, text, 1).list.size());
     if (counted && function_.from.kind == Form::plain && function_.from.page->mixed()) return;
     for (int32_t length = 0; length < longest; ++length) {
       for (int32_t size : {0, 1, 2, 5, 10000}) one(text, {size, length, terminate, characters});
@@ -244,22 +244,28 @@ TEST_F(ConvertString, AsciiWithoutALocale) {
 }
 
 TEST_F(ConvertString, CountsCharactersAndBytes) {
+  EdgeBuffer edge(256);
   for (const Page& page : pages) {
     const LXObjEntry* record = LXGetLocaleObject(page.locale.get(), LX_CODEPAGE);
     for (const Side& side : page.sides()) {
+      const Form form = side.form(Form::shifted);
       for (const char16_t* text : kTexts) {
-        std::string whole = bytes_of_units(spelled(side.form(Form::shifted), text));
-        SCOPED_TRACE(page.source.name + " " + hex(whole) + " state " + std::to_string(side.state));
-        int32_t characters = byte_to_char_model(page.source, whole, side.state);
-        EXPECT_EQ(LXCpStrByteToCharLen(record, whole.c_str(), side.state, -1), characters);
-        for (size_t length = 0; length <= whole.size(); ++length) {
-          Guarded cut(std::string_view(whole).substr(0, length));
-          EXPECT_EQ(LXCpStrByteToCharLen(record, cut.data(), side.state, static_cast<int32_t>(length)),
-                    byte_to_char_model(page.source, cut.view(), side.state));
+        const Units whole = spelled(form, text);
+        SCOPED_TRACE(form.name() + " " + hex_units(whole));
+        auto characters_in = [&](const Units& part) {
+          return static_cast<int32_t>(characters_of(form, part, 1).list.size());
+        };
+        const char* at = place<char>(edge, whole, -1);
+        EXPECT_EQ(LXCpStrByteToCharLen(record, at, side.state, -1), characters_in(whole));
+        int32_t count = 0;
+        EXPECT_EQ(LXCpStrCharToByteLen(record, at, side.state, 0), 0);
+        for (const Character& character : characters_of(form, whole, 1).list) {
+          EXPECT_EQ(LXCpStrCharToByteLen(record, at, side.state, ++count), static_cast<int32_t>(character.end));
         }
-        for (int32_t count = 0; count <= characters; ++count) {
-          EXPECT_EQ(LXCpStrCharToByteLen(record, whole.c_str(), side.state, count),
-                    char_to_byte_model(page.source, whole, side.state, count));
+        for (size_t length = 0; length <= whole.size(); ++length) {
+          const Units cut = first_units(whole, length);
+          EXPECT_EQ(LXCpStrByteToCharLen(record, place<char>(edge, cut, 0), side.state, static_cast<int32_t>(length)),
+                    characters_in(cut));
         }
       }
     }

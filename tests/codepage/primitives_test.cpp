@@ -88,7 +88,7 @@ TEST_F(BuiltPages, OlderLayoutHasNoBounds) {
 
 // Sections of one's own, at the edge of memory: without a section 2 none is made.
 TEST_F(BuiltPages, OlderLayoutWithoutASecondSection) {
-  const Bytes file = single_byte_page_file(true);
+  const Bytes file = multibyte_page_file(true);
   const auto size = static_cast<uint16_t>(file[10] << 8 | file[11]);
   Guarded section1(std::string_view(reinterpret_cast<const char*>(file.data()) + 76, size));
   uint8_t* section2 = section1.as<uint8_t>();

@@ -83,14 +83,10 @@ const char* use_strings(LXLocale* locale) {
       const int32_t results[] = {
           LXStringToUnicode(locale, units.data(), room, text, length, 0),
           LXStringToUnicodeEx(locale, units.data(), room, text, state, length, LX_OPT_TERMINATE),
-          LXMbToWide(locale, wide.data(), room, text, length, 0),
           LXMbToWideEx(locale, wide.data(), room, text, state, length, LX_OPT_TERMINATE),
-          LXWideToMb(locale, bytes.data(), room, wide.data(), room, 0),
-          LXWideToMbEx(locale, bytes.data(), state, room, wide.data(), room, LX_OPT_TERMINATE),
-          LXUnicodeToString(locale, bytes.data(), room, given, count, LX_OPT_TERMINATE),
-          LXUnicodeToStringEx(locale, bytes.data(), state, room, given, count, 0),
-          LXUnicodeToStringW(locale, wide.data(), room, given, count, 0),
           LXStringToUnicodeW(locale, units.data(), room, wide.data(), room, 0),
+          LXWideToMbEx(locale, bytes.data(), state, room, wide.data(), room, LX_OPT_TERMINATE),
+          LXUnicodeToStringEx(locale, bytes.data(), state, room, given, count, 0),
       };
       for (int32_t result : results) {
         if (result < 0 || result > room) return "a result is larger than its room";

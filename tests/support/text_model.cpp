@@ -197,25 +197,6 @@ StringResult convert_model(const Form& to, const Form& from, const Units& text, 
   return result;
 }
 
-int32_t char_to_byte_model(const PageSource& page, std::string_view text, uint32_t state, int32_t chars) {
-  Form form = {Form::shifted, &page, state};
-  size_t at = 0;
-  auto take_shift = [&] {
-    if (at >= text.size() || !form.is_shift(static_cast<uint8_t>(text[at]))) return;
-    form.state = static_cast<uint8_t>(text[at++]) == page.enter;
-  };
-  for (int32_t i = 0; i < chars; ++i) {
-    take_shift();
-    at += form.length_of(at < text.size() ? static_cast<uint8_t>(text[at]) : 0, form.state);
-    take_shift();
-  }
-  return static_cast<int32_t>(at);
-}
-
-int32_t byte_to_char_model(const PageSource& page, std::string_view text, uint32_t state) {
-  return static_cast<int32_t>(characters_of({Form::shifted, &page, state}, units_of(text), 1).list.size());
-}
-
 // What is pending; false when the room does not do.
 bool BufferModel::deliver(std::string& out, size_t& room) {
   size_t count = std::min(room, pending_.size());

@@ -102,10 +102,6 @@ struct StringResult {
 StringResult convert_model(const Form& to, const Form& from, const Units& text, const StringOptions& options,
                            bool packed_transfer = false);
 
-// Bytes of the first characters, one shift byte looked at before and after each.
-int32_t char_to_byte_model(const PageSource& page, std::string_view text, uint32_t state, int32_t chars);
-int32_t byte_to_char_model(const PageSource& page, std::string_view text, uint32_t state);
-
 // A resumable conversion: what is left over on either side waits for the next call.
 class BufferModel {
  public:
@@ -114,9 +110,6 @@ class BufferModel {
 
   // Takes bytes from the front of `in` and appends at most `room` bytes to `out`.
   uint32_t convert(std::string& out, size_t room, std::string_view& in);
-  // Waiting inside.
-  size_t held() const { return held_.size(); }
-  size_t pending() const { return pending_.size(); }
 
  private:
   bool deliver(std::string& out, size_t& room);

@@ -14,15 +14,6 @@ void expect_conversion(const Arguments& arguments, const char* input, const char
   check_runs("convert", {{arguments, bytes(input), bytes(output), status, told}});
 }
 
-TEST_F(ConvertText, KnownTexts) {
-  expect_conversion("-f IBM037", "C8 85 93 93 96 5A 15", "48 65 6C 6C 6F 21 C2 85");
-  expect_conversion("-t IBM930", "41 E3 81 82 E3 81 84 42", "C1 0E 4481 4482 0F C2");
-  expect_conversion("-f IBM930", "C1 0E 4481 4482 0F C2", "41 E3 81 82 E3 81 84 42");
-  expect_conversion("-f IBM930 -t MS932", "C1 0E 4481 0F C2", "41 82A0 42");
-  expect_conversion("-f UTF-8 -t UTF-8", "E3 81 82 00 41", "E3 81 82 00 41");
-  expect_conversion("-f IBM930", "", "");
-}
-
 TEST_F(ConvertText, WhatCannotBeConverted) {
   expect_conversion("-t 37", "41 E2 82 AC 42", "C1 3F C2", 1, "1 character replaced (at byte 1: U+20AC");
   expect_conversion("-t 37 -s", "41 E2 82 AC 42", "C1 3F C2", 1);

@@ -2,7 +2,9 @@
 // The tools' own messages: the catalogs against the code, and what users of other languages see.
 #include <filesystem>
 #include <fstream>
+#include <regex>
 #include <set>
+#include <sstream>
 
 #include "tests/support/environment.hpp"
 #include "tests/tool/tool_runner.hpp"
@@ -44,66 +46,29 @@ std::string placeholders(const std::string& text) {
   return testing::PrintToString(found);
 }
 
-bool reports(const std::string& statement) {
-  for (const char* name :
-       {"error(", "fail(", "bad(", "need(", "require(", "word(", "check_alone(", "Fault(", "Error("}) {
-    const std::size_t at = statement.find(name);
-    if (at != std::string::npos && (at == 0 || statement[at - 1] != '_')) return true;
-  }
-  return false;
-}
-
-// A word before another one, or a value before a word.
-bool has_words(const std::string& text) {
-  for (std::size_t at = 0; (at = text.find(' ', at + 1)) != std::string::npos;) {
-    const char before = text[at - 1], after = text[at + 1];
-    if ((before >= 'a' && before <= 'z') || (before == '}' && after >= 'a' && after <= 'z')) return true;
-  }
-  return false;
-}
-
-std::string without_comments(const fs::path& file) {
-  std::ifstream in(file);
-  std::string code;
-  for (std::string line; std::getline(in, line);) {
-    const std::size_t start = line.find_first_not_of(' ');
-    if (start == std::string::npos || line.compare(start, 2, "//") != 0) code += line + "\n";
-  }
-  return code;
-}
-
 // All texts between quotes, neighbours joined, and those that are meant for people: the first argument of message(),
-// and what has blanks among the arguments of functions that report something.
+// and what has words among the arguments of functions that report something.
 void collect_literals(const fs::path& file, std::set<std::string>& all, std::set<std::string>& messages) {
-  const std::string code = without_comments(file);
-  std::string joined;
-  std::size_t end = 0;
+  static const std::regex comment(R"re((^|\n) *//[^\n]*)re"), words("[a-z}] [a-z]"), message(R"re(message\(\s*$)re"),
+      piece(R"re("((?:[^"\\]|\\.)*)")re"), literal(R"re(R"\(((?:.|\n)*?)\)"|'"'|(?:"(?:[^"\\]|\\.)*"\s*)+)re"),
+      report(R"re((^|[^_])(error|fail|bad|need|require|word|check_alone|Fault|Error)\()re");
+  std::ostringstream content;
+  content << std::ifstream(file).rdbuf();
+  const std::string code = std::regex_replace(content.str(), comment, "");
   std::string statement;  // up to here, without its texts
-  bool is_message = false;
-  bool is_reported = false;
-  const auto finish = [&] {
-    all.insert(joined);
-    is_message = is_message || (is_reported && has_words(joined));
-    if (is_message && !joined.empty()) messages.insert(joined);
-    joined.clear();
-  };
-  for (std::size_t at = code.find('"'); at != std::string::npos; at = code.find('"', end)) {
-    const bool raw = code.compare(at - 1, 3, "R\"(") == 0;
-    if (!raw && code[at - 1] == '\'' && (end = at + 1)) continue;  // the character '"'
-    if (code.find_first_not_of(" \n", end) != at || end == 0) {
-      finish();
-      statement += code.substr(end, at - end);
-      for (const char* begin : {";", "{\n", "}\n"}) statement.erase(0, statement.rfind(begin) + 1);
-      is_message = statement.substr(0, statement.find_last_not_of(" \n") + 1).ends_with("message(");
-      is_reported = reports(statement);
+  for (std::sregex_iterator at(code.begin(), code.end(), literal), end; at != end; ++at) {
+    statement += at->prefix();
+    for (const char* begin : {";", "{\n", "}\n"}) statement.erase(0, statement.rfind(begin) + 1);
+    const std::string pieces = at->str();
+    std::string text = (*at)[1];
+    const bool raw = (*at)[1].matched;
+    for (std::sregex_iterator one(pieces.begin(), pieces.end(), piece); !raw && one != end; ++one) {
+      text += unescaped((*one)[1]);
     }
-    end = raw ? code.find(")\"", at) + 1 : at + 1;
-    while (!raw && end < code.size() && code[end] != '"') end += code[end] == '\\' ? 2 : 1;
-    ASSERT_LT(end, code.size()) << file << ": a text without end";
-    joined += raw ? code.substr(at + 2, end - at - 3) : unescaped(code.substr(at + 1, end - at - 1));
-    ++end;
+    all.insert(text);
+    const bool is_reported = std::regex_search(statement, report) && std::regex_search(text, words);
+    if (is_reported || std::regex_search(statement, message)) messages.insert(text);
   }
-  finish();
 }
 
 // The texts in the help of a command and those below it: what it does, the lists' second column and the notes.
