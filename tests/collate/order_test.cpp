@@ -232,7 +232,6 @@ TEST_F(Order, TrailingBlanksOfEachForm) {
       {Form::plain, 819, u"ab", u"aB  ", 1, -1},
       {Form::plain, 819, u"ab  ", u"ab", LX_CMP_TRIM | 1, 0},
       {Form::plain, 819, u"b", u"a", LX_CMP_TRIM, 0, LX_E_ARGUMENT},
-      {Form::plain, 819, u"b", u"a", LX_CMP_TRIM | LX_CMP_NOCASE, 0, LX_E_ARGUMENT},
       {Form::plain, 819, u"b", u"a", 2, 0, LX_E_ARGUMENT},
       {Form::shifted, 930, u"b", u"a", LX_CMP_TRIM, 0, LX_E_ARGUMENT},
       {Form::wide, 930, u"ab  ", u"ab", LX_CMP_TRIM, 0},

@@ -8,9 +8,6 @@
 namespace lx::test {
 namespace {
 
-constexpr uint32_t kFull = 52;
-constexpr uint32_t kPartial = 53;
-
 // Zero bytes in the middle of a packed value are not written.
 std::string written_bytes(uint32_t value) {
   std::string bytes = unpacked(value);
@@ -195,44 +192,6 @@ StringResult convert_model(const Form& to, const Form& from, const Units& text, 
   }
   result.written = out.units;
   return result;
-}
-
-// What is pending; false when the room does not do.
-bool BufferModel::deliver(std::string& out, size_t& room) {
-  size_t count = std::min(room, pending_.size());
-  out += pending_.substr(0, count);
-  pending_.erase(0, count);
-  room -= count;
-  return pending_.empty();
-}
-
-uint32_t BufferModel::convert(std::string& out, size_t room, std::string_view& in) {
-  while (deliver(out, room)) {
-    if (held_.empty()) {
-      if (in.empty()) return 0;
-      // One shift byte before a character, also when the text is cut behind it.
-      if (!past_shift_ && source_.is_shift(static_cast<uint8_t>(in[0]))) {
-        source_.state = static_cast<uint8_t>(in[0]) == source_.page->enter;
-        in.remove_prefix(1);
-        past_shift_ = true;
-        if (in.empty()) return 0;
-      }
-      past_shift_ = false;
-    }
-    std::string character = held_ + std::string(in);
-    size_t length = source_.length_of(static_cast<uint8_t>(character[0]), source_.state);
-    if (character.size() < length) {
-      held_ = character;
-      in = {};
-      return kPartial;
-    }
-    in.remove_prefix(length - held_.size());
-    held_.clear();
-    Units piece = target_.piece(source_.page->decode(character.substr(0, length)));
-    target_.add(piece);
-    pending_ = bytes_of_units(piece);
-  }
-  return kFull;
 }
 
 }  // namespace lx::test

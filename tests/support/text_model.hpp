@@ -102,23 +102,4 @@ struct StringResult {
 StringResult convert_model(const Form& to, const Form& from, const Units& text, const StringOptions& options,
                            bool packed_transfer = false);
 
-// A resumable conversion: what is left over on either side waits for the next call.
-class BufferModel {
- public:
-  BufferModel(const PageSource& target, const PageSource& source)
-      : target_{{Form::shifted, &target}}, source_{Form::shifted, &source} {}
-
-  // Takes bytes from the front of `in` and appends at most `room` bytes to `out`.
-  uint32_t convert(std::string& out, size_t room, std::string_view& in);
-
- private:
-  bool deliver(std::string& out, size_t& room);
-
-  Writer target_;
-  Form source_;
-  std::string held_;
-  std::string pending_;
-  bool past_shift_ = false;  // which was the last byte; the next is text
-};
-
 }  // namespace lx::test
