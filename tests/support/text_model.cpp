@@ -8,13 +8,6 @@
 namespace lx::test {
 namespace {
 
-// Zero bytes in the middle of a packed value are not written.
-std::string written_bytes(uint32_t value) {
-  std::string bytes = unpacked(value);
-  std::erase(bytes, '\0');
-  return (value & 0xFF) != 0 ? bytes : bytes + '\0';
-}
-
 // Back to the single-byte state; false when nothing can make way for the leave byte.
 bool close(Writer& out, size_t size, size_t needed) {
   if (!out.inside) return true;
@@ -96,6 +89,12 @@ std::string bytes_of_code(uint32_t code, size_t size) {
   std::string bytes(size, '\0');
   for (; size != 0; code >>= 8) bytes[--size] = static_cast<char>(code);
   return bytes;
+}
+
+std::string written_bytes(uint32_t packed) {
+  std::string bytes = unpacked(packed);
+  std::erase(bytes, '\0');
+  return (packed & 0xFF) != 0 ? bytes : bytes + '\0';
 }
 
 char16_t unicode_of(const Form& form, const Character& c) {

@@ -63,6 +63,8 @@ struct Characters {
 Characters characters_of(const Form& form, const Units& text, size_t most_shifts = SIZE_MAX);
 // Bytes of a packed value with that many.
 std::string bytes_of_code(uint32_t code, size_t size);
+// Of one as it is written: zero bytes before the last are not.
+std::string written_bytes(uint32_t packed);
 char16_t unicode_of(const Form& form, const Character& character);
 
 // A text that grows by whole characters.

@@ -30,12 +30,8 @@ struct Meanings {
 
   bool ucs2() const { return form.kind == Form::ucs2; }
   bool one_byte(Glyph glyph) const { return glyph.size == 1 && glyph.code < 0x100; }
-  // As they are written: zero bytes behind the first are left out of packed values.
   std::string bytes_of(Glyph glyph) const {
-    if (form.kind != Form::wide) return bytes_of_code(glyph.code, glyph.size);
-    std::string bytes = unpacked(glyph.code);
-    std::erase(bytes, '\0');
-    return (glyph.code & 0xFF) != 0 ? bytes : bytes + '\0';
+    return form.kind == Form::wide ? written_bytes(glyph.code) : bytes_of_code(glyph.code, glyph.size);
   }
   Glyph spelled(uint32_t packed) const { return {packed, form.kind == Form::wide ? 1 : unpacked(packed).size()}; }
   Glyph glyph(uint16_t unicode) const {
