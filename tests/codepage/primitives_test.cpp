@@ -26,21 +26,6 @@ TEST(Primitives, Utf8IsDecodedByRuleAlone) {
   EXPECT_EQ(LXCpMbToUnicodeW(utf8, 0x41), 0x40);  // 41 and the zero behind it
 }
 
-// The minus sign and the wave dash are full-width forms on pages that read them so; what only looks alike is none.
-TEST(Primitives, FullWidthFormsOfTwoReadings) {
-  const Session session;
-  const struct {
-    const char* name;
-    LXWChar full, half;
-  } cases[] = {{"IBM930", 0x4260, 0x60}, {"IBM930", 0x43A1, 0xA0}, {"IBM939", 0x4260, 0x60}, {"IBM939", 0x43A1, 0xA1},
-               {"MS932", 0x817C, '-'},   {"IBM933", 0x43A1, 0},    {"MS950", 0xA1A8, 0}};
-  for (const auto& c : cases) {
-    const Locale locale = locale_of(c.name);
-    const LXObjEntry* page = LXGetLocaleObject(locale.get(), LX_CODEPAGE);
-    EXPECT_EQ(LXCpFullToHalfW(page, c.full), c.half) << c.name << std::hex << c.full;
-  }
-}
-
 class BuiltPages : public testing::Test {
  protected:
   BuiltPages() { write_small_directory(directory_); }
