@@ -1,12 +1,15 @@
 // SPDX-License-Identifier: Apache-2.0
-// The code pages beside those of the C library, both ways, all byte sequences and all of UCS-2. How often the two
-// differ on purpose, iconv_differences.txt says and why; more is a failure, and so is a difference that is gone.
+// The code pages beside those of the C library, both ways, all byte sequences and all of UCS-2. Where the two differ
+// on purpose, iconv_differences.txt says so and why; anything else is a failure, and so is a difference that is gone.
 #include <errno.h>
 #include <iconv.h>
 
+#include <algorithm>
 #include <fstream>
+#include <iterator>
 #include <map>
 #include <optional>
+#include <set>
 
 #include "support/page_source.hpp"
 #include "support/session.hpp"
@@ -19,6 +22,10 @@ std::string name_in_iconv(const PageSource& page) {
   if (page.id == 954) return "EUC-JP";
   if (page.id == 737) return "CP737";
   return page.name.substr(0, 2) == "MS" ? "CP" + page.name.substr(2) : page.name;
+}
+
+std::string unicode_text(uint32_t value) {
+  return hex(std::string{static_cast<char>(value >> 8), static_cast<char>(value)});
 }
 
 // One conversion of the C library, a character at a time.
@@ -46,31 +53,77 @@ class Iconv {
   iconv_t handle_;
 };
 
-// How often the two differ in one direction, and where first.
-struct Tally {
-  size_t both = 0, only_ours = 0, only_theirs = 0;
-  std::string first = {};
-
-  void add(uint32_t of, const std::string& ours, const std::string& theirs) {
-    if (ours == theirs) return;
-    ++(ours == "-" ? only_theirs : theirs == "-" ? only_ours : both);
-    if (first.size() < 200) first += "\n  " + hex(unpacked(of)) + ": " + ours + ", not " + theirs;
-  }
-  std::string numbers() const {
-    return std::to_string(both) + " " + std::to_string(only_ours) + " " + std::to_string(only_theirs);
-  }
+// What the two make of one key, as text; "-" for no character.
+struct Difference {
+  uint32_t key;
+  std::string ours;
+  std::string theirs;
 };
 
-// Numbers by page and direction.
-std::map<std::string, std::string> known_differences() {
+// Neighbouring keys whose values run on in step are one line.
+class Lines {
+ public:
+  Lines(uint16_t page, const std::string& way)
+      : head_(std::to_string(page) + " " + way + " "), from_unicode_(way == "from") {}
+
+  void add(const Difference& next) {
+    bool in_step = !run_.empty() && next.key == run_.back().key + 1 && follows(run_.back().ours, next.ours) &&
+                   follows(run_.back().theirs, next.theirs);
+    if (!in_step) end_run();
+    run_.push_back(next);
+  }
+  // More lines than anybody would read are merely counted.
+  std::set<std::string> take() {
+    static constexpr struct {
+      const char* what;
+      size_t most_lines;
+    } kSides[] = {{"both: ", 10}, {"only ours: ", 3}, {"only theirs: ", 3}};
+    end_run();
+    std::set<std::string> all;
+    for (size_t i = 0; i < 3; ++i) {
+      if (lines_[i].size() > kSides[i].most_lines) lines_[i] = {head_ + kSides[i].what + std::to_string(counts_[i])};
+      all.merge(lines_[i]);
+    }
+    return all;
+  }
+
+ private:
+  static bool follows(const std::string& last, const std::string& next) {
+    if (last == "-" || next == "-" || last == next) return last == next;
+    return std::stoul(next, nullptr, 16) == std::stoul(last, nullptr, 16) + 1;
+  }
+  static std::string range(const std::string& first, const std::string& last) {
+    return first == last ? first : first + ".." + last;
+  }
+  std::string key_text(uint32_t key) const { return from_unicode_ ? unicode_text(key) : hex(unpacked(key)); }
+
+  void end_run() {
+    if (run_.empty()) return;
+    const Difference& first = run_.front();
+    const Difference& last = run_.back();
+    std::string line = head_ + range(key_text(first.key), key_text(last.key)) + " " + range(first.ours, last.ours) +
+                       " " + range(first.theirs, last.theirs);
+    const size_t side = first.ours == "-" ? 2 : first.theirs == "-" ? 1 : 0;
+    lines_[side].insert(line);
+    counts_[side] += run_.size();
+    run_.clear();
+  }
+
+  std::string head_;
+  bool from_unicode_;
+  std::vector<Difference> run_;
+  std::set<std::string> lines_[3];  // in both; only ours; only theirs
+  size_t counts_[3] = {};
+};
+
+std::set<std::string> known_differences() {
   std::ifstream in(LEXARO_TEST_FOLDER "/iconv_differences.txt");
   EXPECT_TRUE(in.good());
-  std::map<std::string, std::string> known;
+  std::set<std::string> lines;
   for (std::string line; std::getline(in, line);) {
-    const size_t direction = line.find(' '), numbers = line.find(' ', direction + 1);
-    if (!line.empty() && line[0] != '#') known[line.substr(0, numbers)] = line.substr(numbers + 1);
+    if (!line.empty() && line[0] != '#') lines.insert(line);
   }
-  return known;
+  return lines;
 }
 
 class BesideIconv {
@@ -83,20 +136,32 @@ class BesideIconv {
         encode_(name_in_iconv(page_), "UTF-16LE") {
     EXPECT_EQ(decode_.ok() && encode_.ok(), page_.id != 838) << page_.name;  // which it does not have
   }
-  std::string number() const { return std::to_string(page_.id); }
   bool has_peer() const { return decode_.ok() && encode_.ok(); }
 
-  Tally to_unicode() {
-    Tally tally;
-    for (const std::string& bytes : sequences()) tally.add(packed(bytes), our_unicode(bytes), their_unicode(bytes));
-    return tally;
-  }
-  Tally from_unicode() {
-    Tally tally;
+  std::set<std::string> differences() {
+    std::vector<Difference> from;
+    std::map<std::string, std::string> only_ours;
     for (uint32_t unicode = 0; unicode < 65536; ++unicode) {
-      tally.add(unicode, our_bytes(unicode), their_bytes(unicode));
+      const Difference pair = {unicode, our_bytes(unicode), their_bytes(unicode)};
+      if (pair.ours != pair.theirs) from.push_back(pair);
+      if (pair.theirs == "-" && pair.ours != "-") only_ours[unicode_text(unicode)] = pair.ours;
     }
-    return tally;
+    Lines both_ways(page_.id, "round"), to_unicode(page_.id, "to"), from_unicode(page_.id, "from");
+    std::set<std::string> told;
+    for (const std::string& bytes : sequences()) {
+      const Difference pair = {packed(bytes), our_unicode(bytes), their_unicode(bytes)};
+      if (pair.ours == pair.theirs) continue;
+      const bool both = pair.theirs == "-" && only_ours[pair.ours] == hex(bytes);
+      if (both) told.insert(pair.ours);
+      (both ? both_ways : to_unicode).add(pair);
+    }
+    for (const Difference& pair : from) {
+      if (!told.contains(unicode_text(pair.key))) from_unicode.add(pair);
+    }
+    std::set<std::string> all = both_ways.take();
+    all.merge(to_unicode.take());
+    all.merge(from_unicode.take());
+    return all;
   }
 
  private:
@@ -133,14 +198,14 @@ class BesideIconv {
     } else {
       unicode = LXCpMbToUnicode(record_, bytes.data());
     }
-    return unicode == kNoCharacter ? "-" : hex(unpacked(static_cast<uint32_t>(unicode)));
+    return unicode == kNoCharacter ? "-" : unicode_text(static_cast<uint32_t>(unicode));
   }
   std::string their_unicode(const std::string& bytes) {
     bool shift = page_.mixed() && bytes.size() == 2;
     auto result =
         decode_.convert(shift ? static_cast<char>(page_.enter) + bytes + static_cast<char>(page_.leave) : bytes);
     if (!result || result->size() != 2) return "-";
-    return hex(unpacked(static_cast<uint8_t>((*result)[1]) * 256u + static_cast<uint8_t>((*result)[0])));
+    return unicode_text(static_cast<uint8_t>((*result)[1]) * 256u + static_cast<uint8_t>((*result)[0]));
   }
   std::string our_bytes(uint32_t unicode) const {
     char out[4];
@@ -165,16 +230,18 @@ class BesideIconv {
 
 TEST(BesideIconv, DiffersOnlyWhereMeantTo) {
   Session session;
-  std::map<std::string, std::string> known = known_differences();
+  std::set<std::string> found;
   for (const std::string& file : PageSource::all_files()) {
     BesideIconv pair(file);
     if (!pair.has_peer()) continue;
-    for (const auto& [direction, tally] : {std::pair(" to", pair.to_unicode()), {" from", pair.from_unicode()}}) {
-      const auto found = known.extract(pair.number() + direction);
-      EXPECT_EQ(tally.numbers(), found ? found.mapped() : "0 0 0") << pair.number() << direction << tally.first;
-    }
+    found.merge(pair.differences());
   }
-  for (const auto& [direction, numbers] : known) ADD_FAILURE() << "no such page or none to compare: " << direction;
+  std::set<std::string> known = known_differences();
+  std::vector<std::string> fresh, gone;
+  std::set_difference(found.begin(), found.end(), known.begin(), known.end(), std::back_inserter(fresh));
+  std::set_difference(known.begin(), known.end(), found.begin(), found.end(), std::back_inserter(gone));
+  for (const std::string& line : fresh) ADD_FAILURE() << "new: " << line;
+  for (const std::string& line : gone) ADD_FAILURE() << "gone: " << line;
 }
 
 }  // namespace

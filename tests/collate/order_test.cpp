@@ -3,6 +3,7 @@
 #include <random>
 
 #include "collate/sort_model.hpp"
+#include "support/trace_capture.hpp"
 
 namespace lx::test {
 namespace {
@@ -65,6 +66,28 @@ TEST_F(Order, OfLongerTexts) {
       expect_order(forms, texts[1], texts[0]);
       if (HasFatalFailure()) return;
     }
+  }
+}
+
+// Keys say the same as long as the primary weights stand in order, and what is left out of keys has no part. Here is
+// where they do not.
+TEST_F(Order, DiffersFromThatOfTheKeys) {
+  const struct {
+    const char* sort;
+    std::u16string_view a, b;
+    int direct, keys;
+  } cases[] = {
+      {"Plain", u"am", u"amd", -1, 0},       // a default weight at the end of a level
+      {"Plain", u"p", u"pa", -1, -1},        // not in order: the longer one goes on with the secondary weights
+      {"Plain", u"pm", u"pa", 1, -1},        // where the shorter one may be the greater
+      {"Plain", u"0-", u"-", 1, 0},          // alone, special weights have no positions in keys
+      {"Combining", u"a-b", u"ab-", 0, -1},  // characters looked at ahead are not counted
+  };
+  for (const auto& one : cases) {
+    Collation form(Form::plain, 819, one.sort);
+    Units a = form.store(one.a), b = form.store(one.b);
+    EXPECT_EQ(sign(form.compare(a, b)), one.direct) << hex_units(a) << hex_units(b);
+    EXPECT_EQ(sign(form.key(a).compare(form.key(b))), one.keys) << hex_units(a) << hex_units(b);
   }
 }
 
@@ -232,6 +255,7 @@ TEST_F(Order, TrailingBlanksOfEachForm) {
       {Form::plain, 819, u"ab", u"aB  ", 1, -1},
       {Form::plain, 819, u"ab  ", u"ab", LX_CMP_TRIM | 1, 0},
       {Form::plain, 819, u"b", u"a", LX_CMP_TRIM, 0, LX_E_ARGUMENT},
+      {Form::plain, 819, u"b", u"a", LX_CMP_TRIM | LX_CMP_NOCASE, 0, LX_E_ARGUMENT},
       {Form::plain, 819, u"b", u"a", 2, 0, LX_E_ARGUMENT},
       {Form::shifted, 930, u"b", u"a", LX_CMP_TRIM, 0, LX_E_ARGUMENT},
       {Form::wide, 930, u"ab  ", u"ab", LX_CMP_TRIM, 0},
@@ -336,6 +360,30 @@ TEST_F(Order, OfTextsInTexts) {
   Collation form(Form::ucs2, 819, "Combining");
   const LXUChar text[] = {'x', 'a', 'Z'}, wanted[] = {'A', '0'};
   EXPECT_EQ(LXStrstrU(form.locale(), text, 3, wanted, 2, LX_CMP_NOCASE), text + 1);
+}
+
+// ---- What comparisons of mixed text say about themselves ----
+
+TEST_F(Order, IsTraced) {
+  const struct {
+    std::string_view b;
+    uint32_t options;
+    std::vector<std::string> messages;  // between entry and exit
+  } cases[] = {
+      {"\x81", 2, {"Options = 00000002"}},
+      {"\x0E\x44\x81\x0F",
+       LX_CMP_NOCASE,
+       {"Options = 80000040", "len1 = 1, str1state = 0, len2 = 3, str2state = 1", "String1: 1 bytes",
+        "String2: 3 bytes", "Strings are unequal: len1 = 1, len2 = 3", "String1: 1 bytes", "String2: 3 bytes"}},
+  };
+  const Collation form(Form::shifted, 930, "BINARY");
+  for (const auto& one : cases) {
+    TraceCapture trace;
+    LXStrcmpEx(form.locale(), "\x81", 0, 1, one.b.data(), 0, static_cast<int32_t>(one.b.size()), one.options);
+    const auto& all = trace.messages();
+    ASSERT_GE(all.size(), 2u);
+    EXPECT_EQ(std::vector<std::string>(all.begin() + 1, all.end() - 1), one.messages) << trace.all();
+  }
 }
 
 }  // namespace

@@ -14,7 +14,7 @@ namespace {
 
 // ---- Unicode ----
 
-// What users have sorted and stored depends on these: they never change.
+// What users have sorted and stored depends on these: they never change. The tables have tests of their own.
 TEST(UnicodeCharacters, AreWhatTheyAlwaysWere) {
   const Session session;
   uint64_t types = 0, lower = 0, upper = 0, full = 0, half = 0, digits = 0;
