@@ -50,25 +50,18 @@ TEST_F(LookupTest, ByName) {
                         {LX_LANGUAGE, "eNGLISH", 7, 1, LX_OK},
                         {LX_LANGUAGE, "English\0"sv, 8, 1, LX_OK},
                         {LX_LANGUAGE, "EnglishX", 7, 1, LX_OK},
-                        {LX_LANGUAGE, "EnglishX", 8, 0, LX_E_NOTFOUND},
                         {LX_LANGUAGE, "English\0\0"sv, 9, 0, LX_E_NOTFOUND},
                         {LX_LANGUAGE, "English", 3, 0, LX_E_NOTFOUND},
-                        {LX_LANGUAGE, "English", 0, 0, LX_E_NOTFOUND},
                         {LX_LANGUAGE, "", -1, 0, LX_E_NOTFOUND},
                         {LX_TERRITORY, "English", -1, 0, LX_E_NOTFOUND},
-                        {LX_CODEPAGE, "us-ascii", -1, 367, LX_OK},
                         {LX_CODEPAGE, "ascii", -1, 0, LX_E_NOTFOUND},  // an alias is no name
                         {LX_SORT, "sorted", -1, 7, LX_OK},
-                        {4, "English", -1, 0, LX_E_NOTFOUND},
                         {255, "English", -1, 0, LX_E_NOTFOUND},
-                        {LX_SORT, "BINARY", -1, 0, LX_OK},
-                        {LX_SORT, "binary", 6, 0, LX_OK},
                         {LX_SORT, "Binary\0"sv, 7, 0, LX_OK},
                         {LX_SORT, "BINARYX", 6, 0, LX_OK},
                         {LX_SORT, "BINAR", 5, 0, LX_E_NOTFOUND},
                         {LX_SORT, "BINARY\0\0"sv, 8, 0, LX_E_NOTFOUND},
                         {LX_SORT, "BINARYX", 7, 0, LX_E_NOTFOUND},
-                        {LX_SORT, "BINARYX", -1, 0, LX_E_NOTFOUND},
                         {LX_LANGUAGE, "BINARY", -1, 0, LX_E_NOTFOUND}};
   for (const Case& one : cases) {
     SCOPED_TRACE(std::string(one.name) + " " + std::to_string(one.length));
