@@ -7,16 +7,15 @@
 
 #include "format/fixed_point.hpp"
 #include "support/counting_allocator.hpp"
-#include "support/edge_buffer.hpp"
-#include "support/page_source.hpp"
-#include "support/stored_unit.hpp"
+#include "support/text_calls.hpp"
 
 namespace lx::test {
 namespace {
 
-enum class Form { plain, shifted, wide, ucs2 };
-constexpr Form kForms[] = {Form::plain, Form::shifted, Form::wide, Form::ucs2};
-size_t unit_size(Form form) { return form == Form::wide ? 4 : form == Form::ucs2 ? 2 : 1; }
+constexpr Family<LXLongToString, LXLongToStringEx, LXLongToStringW, LXLongToStringU> kLongToString;
+constexpr Family<LXDoubleToString, LXDoubleToStringEx, LXDoubleToStringW, LXDoubleToStringU> kDoubleToString;
+constexpr Family<LXCurrencyToString, LXCurrencyToStringEx, LXCurrencyToStringW, LXCurrencyToStringU> kCurrencyToString;
+constexpr Form::Kind kKinds[] = {Form::plain, Form::shifted, Form::wide, Form::ucs2};
 constexpr uint16_t kUtf8 = 57352;
 const std::vector<uint16_t> kPages = {367, 37, 932, 930, kUtf8};
 enum class What { integer, number, money };
@@ -28,19 +27,14 @@ struct Job {
   uint32_t flags = 0;
 };
 
-int32_t write(Form form, LXLocale* locale, const Job& job, void* to, int32_t length, uint32_t more_flags = 0) {
-  auto call = [&](auto* buffer, auto write_integer, auto write_number, auto write_money, auto... state) {
+int32_t write(const Form& form, LXLocale* locale, const Job& job, void* to, int32_t length, uint32_t more_flags = 0) {
+  return with_calls(form, [&](auto call) {
+    auto* out = static_cast<typename decltype(call)::Unit*>(to);
     const uint32_t flags = job.flags | more_flags;
-    if (job.what == money) return write_money(locale, job.value, buffer, state..., length, flags);
-    if (job.what == number) return write_number(locale, job.value, buffer, state..., length, flags);
-    return write_integer(locale, static_cast<int32_t>(job.value), buffer, state..., length, flags);
-  };
-  auto* bytes = static_cast<char*>(to);
-  if (form == Form::plain) return call(bytes, LXLongToString, LXDoubleToString, LXCurrencyToString);
-  if (form == Form::shifted) return call(bytes, LXLongToStringEx, LXDoubleToStringEx, LXCurrencyToStringEx, 0u);
-  if (form == Form::ucs2)
-    return call(static_cast<LXUChar*>(to), LXLongToStringU, LXDoubleToStringU, LXCurrencyToStringU);
-  return call(static_cast<LXWChar*>(to), LXLongToStringW, LXDoubleToStringW, LXCurrencyToStringW);
+    if (job.what == money) return call(kCurrencyToString, locale, job.value, out, State{0}, length, flags);
+    if (job.what == number) return call(kDoubleToString, locale, job.value, out, State{0}, length, flags);
+    return call(kLongToString, locale, static_cast<int32_t>(job.value), out, State{0}, length, flags);
+  });
 }
 
 constexpr const char16_t* kNumber = nullptr;
@@ -58,21 +52,16 @@ void set(LXLocale* locale, const Setting& setting) {
             1);
 }
 
-// With room for all of it, as it stands in memory.
-std::string written(Form form, LXLocale* locale, const Job& job) {
-  static LXWChar buffer[12000];
-  int32_t count = write(form, locale, job, buffer, 12000);
-  return {reinterpret_cast<const char*>(buffer), static_cast<size_t>(count) * unit_size(form)};
-}
-
-// The same of what is expected, without shift bytes.
-std::string stored(Form form, const PageSource& page, std::u16string_view text) {
-  std::string raw;
-  for (char16_t c : text) {
-    const uint32_t unit = form == Form::ucs2 ? c : packed(page.encode(c));
-    raw += unit_size(form) == 1 ? page.encode(c) : stored_unit(unit, unit_size(form));
-  }
-  return raw;
+// With room for all of it.
+Units written(const Form& form, LXLocale* locale, const Job& job) {
+  return with_calls(form, [&](auto call) -> Units {
+    using Unit = typename decltype(call)::Unit;
+    static Unit buffer[12000];
+    const int32_t count = write(form, locale, job, buffer, 12000);
+    Units units;
+    for (int32_t i = 0; i < count; ++i) units.push_back(std::make_unsigned_t<Unit>(buffer[i]));
+    return units;
+  });
 }
 
 // In all forms of text, on these pages, of which there are all kinds.
@@ -84,9 +73,10 @@ void expect(const std::vector<Setting>& settings, const Job& job, const std::u16
     Locale locale(LXGetLocale((name + "." + page.name).c_str(), 0, nullptr));
     ASSERT_NE(locale, nullptr) << name;
     for (const Setting& setting : settings) set(locale.get(), setting);
-    for (Form form : kForms) {
-      EXPECT_EQ(written(form, locale.get(), job), stored(form, page, expected))
-          << name << "." << page.name << ", form " << static_cast<int>(form) << ", value " << job.value;
+    for (Form::Kind kind : kKinds) {
+      const Form form = {kind, &page};
+      EXPECT_EQ(written(form, locale.get(), job), spelled(form, expected))
+          << name << "." << form.name() << ", value " << job.value;
       EXPECT_EQ(LXGetError(locale.get()), LX_OK);
     }
   }
@@ -194,10 +184,11 @@ TEST(WrittenNumbers, CharactersAreCountedBehindTheResult) {
 TEST(WrittenNumbers, LengthsAndTextsFollowShiftStates) {
   Session session;
   Locale locale = locale_of("IBM930");
+  const Form form = {Form::shifted, &PageSource::of(930)};
   set(locale.get(), {LX_ITEM_CURRENCY, u"円"});
-  EXPECT_EQ(hex(written(Form::shifted, locale.get(), {money, 1})).substr(0, 10), "0E46450FF1");
+  EXPECT_EQ(written(form, locale.get(), {money, 1}), spelled(form, u"円1.00"));
   set(locale.get(), {LX_ITEM_POSITIVE_SIGN, u"円"});
-  EXPECT_EQ(hex(written(Form::shifted, locale.get(), {money, 1})).substr(0, 14), "0E464546450FF1");
+  EXPECT_EQ(written(form, locale.get(), {money, 1}), spelled(form, u"円円1.00"));
   static char buffer[1000];
   // Digits inside a double-byte run count in pairs; an integer's sign counts for itself.
   EXPECT_EQ(LXLongToStringEx(locale.get(), -123456, buffer, 1, 3, LX_NUM_CHARLEN), 5);
@@ -213,8 +204,8 @@ TEST(WrittenNumbers, RefuseOtherFlags) {
   constexpr uint32_t kAccepted[] = {0x4089, 0x4009, 0x4049};
   for (uint32_t i = 0; i < 96; ++i) {
     const bool good = (kAccepted[i / 32] & 1u << i % 32) != 0;
-    EXPECT_EQ(write(Form::plain, locale.get(), {static_cast<What>(i / 32), 1}, buffer, 8, 1u << i % 32) == -1, !good)
-        << i;
+    const Job job = {static_cast<What>(i / 32), 1};
+    EXPECT_EQ(write({Form::plain, nullptr}, locale.get(), job, buffer, 8, 1u << i % 32) == -1, !good) << i;
     EXPECT_EQ(LXGetError(locale.get()), good ? LX_OK : LX_E_ARGUMENT);
   }
   for (int32_t length : {0, -1}) {  // no room comes first here
@@ -227,7 +218,9 @@ TEST(WrittenNumbers, NeedNoMemory) {
   ASSERT_EQ(allocator.init(LEXARO_DATA), LX_OK);
   Locale locale = locale_of("IBM930");
   allocator.calls = 0;
-  for (int i = 0; i < 12; ++i) written(kForms[i / 3], locale.get(), {static_cast<What>(i % 3), -1e9});
+  for (int i = 0; i < 12; ++i) {
+    written({kKinds[i / 3], &PageSource::of(930)}, locale.get(), {static_cast<What>(i % 3), -1e9});
+  }
   EXPECT_EQ(allocator.calls, 0);
   locale.reset();
   LXTerm();
@@ -244,22 +237,12 @@ TEST(GroupingSizes, AreReadOneByOne) {
   }
 }
 
-// The first characters of an output, and how many it has when there are less. Double-byte runs end with their text.
-std::string first_characters(Form form, const PageSource& page, std::string_view text, size_t& count) {
-  const bool shifts = form == Form::shifted && page.mixed();
-  std::string first;
-  bool inside = false;
-  size_t characters = 0;
-  for (size_t at = 0, length; at < text.size() && characters < count; at += length) {
-    const auto lead = static_cast<uint8_t>(text[at]);
-    const bool shift = shifts && (lead == page.enter || lead == page.leave);
-    if (shift) inside = lead == page.enter;
-    length = unit_size(form) > 1 ? unit_size(form) : inside && !shift ? 2 : page.mixed() ? 1 : page.length_of(lead);
-    first += text.substr(at, length);
-    characters += shift ? 0 : 1;
-  }
-  count = characters;
-  return inside ? first + static_cast<char>(page.leave) : first;
+// Double-byte runs end with their text.
+Units first_characters(const Form& form, const Units& text, const std::vector<Character>& list, size_t count) {
+  if (count == 0) return {};
+  Units first = first_units(text, list[count - 1].own_end());
+  if (list[count - 1].state != 0) first.push_back(form.page->leave);
+  return first;
 }
 
 TEST(WrittenNumbers, FitTheRoom) {
@@ -268,7 +251,7 @@ TEST(WrittenNumbers, FitTheRoom) {
   EdgeBuffer edge(1024);
   for (int variant = 0; variant < 5 * 4 * 4 * 4; ++variant) {
     const PageSource& page = PageSource::of(kPages[static_cast<size_t>(variant) % 5]);
-    const Form form = kForms[variant / 5 % 4];
+    const Form form = {kKinds[variant / 5 % 4], &page};
     const Job& job = kJobs[variant / 20 % 4];
     const bool in_characters = variant / 80 % 2 != 0;
     const size_t ending = variant / 160 != 0 ? 1 : 0;
@@ -279,22 +262,26 @@ TEST(WrittenNumbers, FitTheRoom) {
     set(locale.get(), {LX_ITEM_N_CS_PRECEDES, kNumber, 0});
     set(locale.get(), {LX_ITEM_N_SIGN_POSN, kNumber, 4});
     set(locale.get(), {LX_ITEM_FRACTION_DIGITS, kNumber, 9});
-    const std::string all = written(form, locale.get(), job);
+    const Units all = written(form, locale.get(), job);
+    const std::vector<Character> list = characters_of(form, all).list;
 
-    for (size_t length = 0; length <= all.size() / unit_size(form) + 3; ++length) {
-      size_t count = in_characters ? std::max(length, ending) - ending : all.size();
-      std::string wanted = first_characters(form, page, all, count);
-      while (!in_characters && wanted.size() / unit_size(form) + ending > std::max(length, ending)) {
-        wanted = first_characters(form, page, all, --count);
-      }
+    for (size_t length = 0; length <= all.size() + 3; ++length) {
+      const size_t most = std::max(length, ending) - ending;
+      size_t count = in_characters ? std::min(most, list.size()) : list.size();
+      while (!in_characters && first_characters(form, all, list, count).size() > most) --count;
+      Units wanted = first_characters(form, all, list, count);
       const uint32_t status = length == 0 || wanted.size() < all.size() ? LX_E_BUFFER : LX_OK;
-      if (length != 0) wanted.append(ending * unit_size(form), '\0');
-      const size_t units = wanted.size() / unit_size(form);
-      char* room = edge.room((in_characters ? std::max(length, units) : length) * unit_size(form));
+      if (length != 0) wanted.resize(wanted.size() + ending);
+      const std::string expected = raw(form, wanted);
+      char* room =
+          edge.room(in_characters ? std::max(length * form.unit_size(), expected.size()) : length * form.unit_size());
       const int32_t result = write(form, locale.get(), job, room, static_cast<int32_t>(length), flags);
       EXPECT_EQ(LXGetError(locale.get()), status);
-      ASSERT_EQ(result, length == 0 ? 0 : in_characters ? count + ending : units) << variant << ", length " << length;
-      ASSERT_EQ(hex({room, wanted.size()}), hex(wanted)) << variant << ", length " << length;
+      ASSERT_EQ(result, length == 0     ? 0
+                        : in_characters ? count + ending
+                                        : wanted.size())
+          << variant << ", length " << length;
+      ASSERT_EQ(hex({room, expected.size()}), hex(expected)) << variant << ", length " << length;
     }
   }
 }
