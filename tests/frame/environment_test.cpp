@@ -90,7 +90,7 @@ TEST(Path, IsCutIntoItsParts) {
   } cases[] = {{"/Vantrel/locale/control.nls", "", "/Vantrel/locale/", "control", ".nls"},
                {"", "", "", "", ""},
                {"a/..", "", "a/..", "", "."},
-               {"..", "", "", "", "."},
+               {"a/.", "", "a/.", "", "."},
                {"a/.hidden", "", "a/", "", ""},
                {"c:/x/y.z", "c:", "/x/", "y", ".z"},
                {"ab:name", "ab:", "", "name", ""},
