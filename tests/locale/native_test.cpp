@@ -26,7 +26,8 @@ std::vector<NativeName> native_names(size_t most = SIZE_MAX) {
 
 // ---- From names of the system ---------------------------------------------------------------------------------------
 
-// Names that no locale has as its own, and what is no name. A name for each category is: code page, territory, language, sort.
+// Names of which not all come back, and what is no name. A name for each category is: code page, territory, language,
+// sort.
 TEST(NativeNames, Mapped) {
   const NativeName cases[] = {{"C", "English_UnitedStates.US-ASCII@Binary"},
                               {"en_US.utf-8", "English_UnitedStates.UTF-8@Default"},
