@@ -166,20 +166,21 @@ TEST(Translation, FollowsTheModel) {
   for (size_t pair = 0; pair < std::size(kPages) * std::size(kPages); ++pair) {
     const uint16_t to = kPages[pair / std::size(kPages)], from = kPages[pair % std::size(kPages)];
     const Form to_form = form_of(to), from_form = form_of(from);
-    for (size_t i = 0; i < 10; ++i) {
+    for (size_t i = 0; i < 9; ++i) {
       const bool is_short = i < 7;  // long ones are taken many characters at once
       std::string text = random_text(from_form, is_short ? i : 40, random);
       if (i == 7) text = spelled_bytes(from_form, std::u16string(100, u'A') + u"é" + std::u16string(30, u' '));
       const size_t most = std::get<1>(translate_model({to_form, from_form, text, false, 1000, 0})).size() + 4;
       const Units units = units_in(from_form, text);
       const bool has_zero = std::count(units.begin(), units.end(), 0u) != 0;
-      for (uint32_t flags = 0; flags <= kAllFlags; flags = ((flags | ~kAllFlags) + 1) & kAllFlags) {
-        for (size_t size = is_short ? 0 : most / 2; size <= most; size += is_short || size + 8 > most ? 1 : most / 3) {
+      for (uint32_t flags = kAllFlags;; flags = (flags - 1) & kAllFlags) {
+        for (size_t size = is_short ? 0 : most / 2; size <= most; ++size) {
+          if (!is_short && size > most / 2 + 2 && size + 6 < most) continue;
           compare(to, from, {to_form, from_form, text, false, size, flags});
           if (!has_zero) compare(to, from, {to_form, from_form, raw(from_form, units), true, size, flags});
-          if (HasFailure()) return;
+          if (HasFatalFailure()) return;
         }
-        if (flags == kAllFlags) break;
+        if (flags == 0) break;
       }
     }
   }
