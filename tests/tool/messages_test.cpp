@@ -38,7 +38,7 @@ Texts catalog(const std::string& language) {
   return texts;
 }
 
-std::string placeholders(const std::string& text) {
+std::string parts(const std::string& text) {
   std::set<std::string> found;
   for (std::size_t at = 0; (at = text.find('{', at)) != std::string::npos; ++at) {
     if (text.substr(at + 2, 1) == "}") found.insert(text.substr(at, 3));
@@ -116,8 +116,8 @@ TEST(MessageCatalogs, HoldTheTextsOfTheCodeInAllLanguages) {
     english.insert(text);
     const bool of_code = !number.starts_with("8 ");  // the others are the system's
     EXPECT_TRUE(!of_code || all.contains(text)) << number << " is not in the code: " << text;
-    EXPECT_EQ(placeholders(german[number]), placeholders(text)) << number;
-    EXPECT_EQ(placeholders(japanese[number]), placeholders(text)) << number;
+    EXPECT_EQ(parts(german[number]), parts(text)) << number;
+    EXPECT_EQ(parts(japanese[number]), parts(text)) << number;
     EXPECT_FALSE(german[number].empty() || japanese[number].empty()) << number;
   }
   for (const std::string& text : messages) EXPECT_TRUE(english.contains(text)) << "not in the catalogs: " << text;

@@ -14,10 +14,10 @@ using Form = std::string Message::*;
 std::string filled(std::string_view text, const std::vector<Message>& parts, Form form) {
   std::string result;
   for (std::size_t at = 0; at < text.size();) {
-    const std::size_t part = placeholder_at(text, at);
+    const std::size_t part = part_at(text, at);
     if (part < parts.size()) {
       result += parts[part].*form;
-      at += kPlaceholderSize;
+      at += kPartSize;
     } else {
       result += text[at++];
     }

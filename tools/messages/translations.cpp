@@ -22,7 +22,7 @@ namespace {
 
 constexpr char kCatalogName[] = "lexaro";
 constexpr std::size_t kMostUnits = 8192;  // of a message
-constexpr std::size_t kNoPlaceholder = 10;
+constexpr std::size_t kNoPart = 10;
 
 using Translations = std::unordered_map<std::string, Translation>;
 
@@ -99,11 +99,11 @@ std::vector<LXUChar> text_of(LXCatalog* catalog, uint32_t set, int32_t number) {
   return text;
 }
 
-bool same_placeholders(std::string_view a, std::string_view b) {
+bool same_parts(std::string_view a, std::string_view b) {
   const auto used = [](std::string_view text) {
-    std::array<bool, kNoPlaceholder + 1> found{};
-    for (std::size_t at = 0; at < text.size(); ++at) found[placeholder_at(text, at)] = true;
-    found[kNoPlaceholder] = true;
+    std::array<bool, kNoPart + 1> found{};
+    for (std::size_t at = 0; at < text.size(); ++at) found[part_at(text, at)] = true;
+    found[kNoPart] = true;
     return found;
   };
   return used(a) == used(b);
@@ -112,7 +112,7 @@ bool same_placeholders(std::string_view a, std::string_view b) {
 // A text that the terminal cannot show, or that lacks a part of the message, is worse than the English one.
 void add(Translations& all, const std::string& english, const std::vector<LXUChar>& text, const Terminal& terminal) {
   Translation translation{utf8_of(text), ""};
-  if (text.empty() || !same_placeholders(english, translation.utf8)) return;
+  if (text.empty() || !same_parts(english, translation.utf8)) return;
   translation.terminal = terminal.encode(translation.utf8);
   const auto marks = [](const std::string& bytes) { return std::count(bytes.begin(), bytes.end(), '?'); };
   if (marks(translation.terminal) == marks(translation.utf8)) all[english] = std::move(translation);
@@ -172,11 +172,11 @@ const Translation* find_translation(std::string_view english) {
 
 bool has_translations() { return !translations().empty(); }
 
-std::size_t placeholder_at(std::string_view text, std::size_t at) {
-  const std::string_view field = text.substr(at, kPlaceholderSize);
-  const bool is_one = field.size() == kPlaceholderSize && field[0] == '{' && field[2] == '}' &&
+std::size_t part_at(std::string_view text, std::size_t at) {
+  const std::string_view field = text.substr(at, kPartSize);
+  const bool is_one = field.size() == kPartSize && field[0] == '{' && field[2] == '}' &&
                       std::isdigit(static_cast<unsigned char>(field[1])) != 0;
-  return is_one ? static_cast<std::size_t>(field[1] - '0') : kNoPlaceholder;
+  return is_one ? static_cast<std::size_t>(field[1] - '0') : kNoPart;
 }
 
 }  // namespace lx::tool

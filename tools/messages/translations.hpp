@@ -17,8 +17,8 @@ struct Translation {
 const Translation* find_translation(std::string_view english);
 bool has_translations();
 
-inline constexpr std::size_t kPlaceholderSize = 3;
+inline constexpr std::size_t kPartSize = 3;
 // The number of the part that stands here as "{0}" to "{9}"; otherwise one that no message has.
-std::size_t placeholder_at(std::string_view text, std::size_t at);
+std::size_t part_at(std::string_view text, std::size_t at);
 
 }  // namespace lx::tool
